@@ -1,0 +1,50 @@
+# SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+# SPDX-License-Identifier: LGPL-2.1-or-later
+#
+# What every target of the project is built with, and how a test is registered.
+
+add_library(kavell_options INTERFACE)
+target_compile_options(kavell_options INTERFACE -Wall -Wextra -Werror -Wshadow
+                       "$<$<COMPILE_LANGUAGE:CXX>:-Wnon-virtual-dtor>"
+                       "$<$<COMPILE_LANGUAGE:CXX>:-Woverloaded-virtual>"
+                       "$<$<CXX_COMPILER_ID:GNU>:-fno-semantic-interposition>")
+target_include_directories(kavell_options INTERFACE "$<BUILD_INTERFACE:${PROJECT_SOURCE_DIR}/include>"
+                           "$<BUILD_INTERFACE:${PROJECT_SOURCE_DIR}>")
+target_link_options(kavell_options INTERFACE -Wl,--as-needed)
+if(KAVELL_SANITIZE)
+    target_compile_options(kavell_options INTERFACE -fsanitize=${KAVELL_SANITIZE} -fno-omit-frame-pointer
+                           -fno-sanitize-recover=all)
+    target_link_options(kavell_options INTERFACE -fsanitize=${KAVELL_SANITIZE})
+endif()
+
+# kavell_add_test(NAME SOURCES file… [LIBRARIES target…] [TIMEOUT seconds] [LABELS label…] [SHARED])
+#
+# A GoogleTest program, run by ctest in a scratch home with its own XDG directories, session bus and IPC namespace. It is
+# linked with the library's objects, so that it sees internals; SHARED links the shared library as a client would.
+function(kavell_add_test name)
+    cmake_parse_arguments(ARG "SHARED" "TIMEOUT" "SOURCES;LIBRARIES;LABELS" ${ARGN})
+    add_executable(${name} ${ARG_SOURCES})
+    if(ARG_SHARED)
+        target_link_libraries(${name} PRIVATE kavellstore)
+    else()
+        target_link_libraries(${name} PRIVATE kavellstore_internal)
+    endif()
+    target_link_libraries(${name} PRIVATE kavell_options kavell_test_support ${ARG_LIBRARIES} GTest::gtest_main
+                          GTest::gmock)
+    set_target_properties(${name} PROPERTIES RUNTIME_OUTPUT_DIRECTORY "${PROJECT_BINARY_DIR}/tests")
+    kavell_register_test(${name} COMMAND $<TARGET_FILE:${name}> TIMEOUT "${ARG_TIMEOUT}" LABELS ${ARG_LABELS})
+endfunction()
+
+# kavell_register_test(NAME COMMAND word… [TIMEOUT seconds] [LABELS label…]): any command, isolated in the same way.
+function(kavell_register_test name)
+    cmake_parse_arguments(ARG "" "TIMEOUT" "COMMAND;LABELS" ${ARGN})
+    if(NOT ARG_TIMEOUT)
+        set(ARG_TIMEOUT 120)
+    endif()
+    if(NOT ARG_LABELS)
+        set(ARG_LABELS unit)
+    endif()
+    add_test(NAME ${name} COMMAND "${PROJECT_SOURCE_DIR}/tests/support/run_isolated" ${ARG_COMMAND})
+    set_tests_properties(${name} PROPERTIES TIMEOUT "${ARG_TIMEOUT}" LABELS "${ARG_LABELS}" ENVIRONMENT
+        "KAVELL_SOURCE_DIR=${PROJECT_SOURCE_DIR};KAVELL_BUILD_DIR=${PROJECT_BINARY_DIR};TSAN_OPTIONS=halt_on_error=1 suppressions=${PROJECT_SOURCE_DIR}/tests/support/tsan.supp")
+endfunction()
