@@ -31,6 +31,12 @@ CSKAVELL_EXPORT CSKavellTypeID CSKavellGetTypeID(CSKavellTypeRef object);
 /// The name under which a type was registered, borrowed for the life of the process; NULL for an unknown identifier.
 CSKAVELL_EXPORT const char *CSKavellTypeIDGetName(CSKavellTypeID typeID);
 
+/// A copy in memory of the allocator (caller owns), by the copy operation of its type; an object of a type without one,
+/// which includes every immutable type, is retained instead. Settings copy to settings with the same effective
+/// attributes, containers to mutable containers that share their values. None for none.
+CSKAVELL_EXPORT CSKavellTypeRef CSKavellCreateCopy(const CSKavellAllocator *allocator,
+                                                   CSKavellTypeRef object) CSKAVELL_NODISCARD;
+
 /// A text for people and logs (caller owns): values are written out, containers as {key = value; …} with sorted keys
 /// and (a, b), records as <TypeName 0xADDRESS>; "(null)" for none. The form is not meant to be parsed.
 CSKAVELL_EXPORT CSKavellStringRef CSKavellCopyDescription(CSKavellTypeRef object) CSKAVELL_NODISCARD;

@@ -138,8 +138,8 @@ std::string readFile(const std::string &path)
 void writeFile(const std::string &path, std::string_view contents)
 {
     std::filesystem::create_directories(std::filesystem::path(path).parent_path());
-    std::ofstream(path, std::ios::binary | std::ios::trunc).write(contents.data(),
-                                                                  static_cast<std::streamsize>(contents.size()));
+    std::ofstream(path, std::ios::binary | std::ios::trunc)
+        .write(contents.data(), static_cast<std::streamsize>(contents.size()));
 }
 
 std::string dataFilePath(std::string_view providerType, std::string_view loginName)

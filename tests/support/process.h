@@ -33,8 +33,8 @@ public:
 
     void signal(int number) const;
 
-    /// The exit status once the child has ended: its exit code, or 128 plus the signal that ended it; -1 when it had to be
-    /// killed because `bound` had passed.
+    /// The exit status once the child has ended: its exit code, or 128 plus the signal that ended it; -1 when it had to
+    /// be killed because `bound` had passed.
     [[nodiscard]] int wait(std::chrono::milliseconds bound = std::chrono::seconds(60));
 
 private:
