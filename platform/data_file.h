@@ -1,0 +1,69 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+//
+// Reading, replacing and deleting one small file so that a crash or a power cut at any moment leaves it as before or as
+// after. Knows paths and bytes, not what they mean. Called by the store inside the file's semaphore; any thread may
+// call.
+//
+// An existing file keeps its inode (its semaphore is found through it), so it is rewritten in place, under the
+// protection of a redo record (redo_record.h). Every call takes a flock on the file, because two programs may come with
+// different semaphores; that wait is bounded, and the call fails when the bound has passed.
+
+#ifndef KAVELL_PLATFORM_DATA_FILE_H
+#define KAVELL_PLATFORM_DATA_FILE_H
+
+#include <cstdint>
+#include <ctime>
+#include <string>
+#include <string_view>
+
+namespace kavell {
+
+/// A file's modification time.
+struct FileTime {
+    int64_t seconds = 0;
+    int64_t nanoseconds = 0;
+
+    friend bool operator==(const FileTime &, const FileTime &) = default;
+};
+
+/// The largest file that is read or written, in bytes. A larger one counts as damaged.
+inline constexpr size_t kLargestDataFile = size_t{32} << 20;
+
+enum class FileRead {
+    Done,      ///< the contents are there
+    Failed,    ///< it could not be opened, locked or read
+    TooLarge,  ///< it is larger than kLargestDataFile and was not read
+};
+
+/// Reads a whole regular file into `contents`, after finishing a replacement that somebody could not finish.
+/// `expectedSize` is a hint.
+[[nodiscard]] FileRead readDataFile(const char *path, size_t expectedSize, std::string &contents) noexcept;
+
+/// Says whether bytes are what this kind of file should hold.
+using IntactCheck = bool (*)(std::string_view contents) noexcept;
+
+/// Makes `contents` the file's whole contents, durably, with permissions 0600; creates the file if need be, but not its
+/// directory. A file that `isIntact` does not accept is first kept beside it (damagedCopyPath); when that fails, or
+/// anything else, the file is as before and the result is false.
+[[nodiscard]] bool writeDataFile(const char *path, std::string_view contents, IntactCheck isIntact) noexcept;
+
+/// Deletes the file, durably; false when it could not be deleted.
+[[nodiscard]] bool removeDataFile(const char *path) noexcept;
+
+/// Creates each missing directory above the path, with permissions 0700. Failures show when the file is written.
+void createDirectoriesAbove(const char *path) noexcept;
+
+/// What the names begin with that this code gives to files beside a data file; none of them ends in ".plist". Each is
+/// followed by 16 hexadecimal digits, the hash of the data file's name.
+inline constexpr std::string_view kRedoRecordPrefix = ".redo-";
+inline constexpr std::string_view kNewFilePrefix = ".new-";
+/// Followed by the hash, "-", and the time of keeping, as in damaged-0123456789abcdef-20260131T100000Z.
+inline constexpr std::string_view kDamagedCopyPrefix = "damaged-";
+
+/// The path beside a data file that consists of the prefix and the hash of the file's name.
+[[nodiscard]] std::string siblingPath(std::string_view path, std::string_view prefix);
+
+}  // namespace kavell
+
+#endif

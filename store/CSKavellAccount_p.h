@@ -1,0 +1,78 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+//
+// The structure of an account record, and the operations on it that its source files share. All expect the record's
+// lock to be held by the caller unless they say otherwise.
+
+#ifndef KAVELL_STORE_CSKAVELLACCOUNT_P_H
+#define KAVELL_STORE_CSKAVELLACCOUNT_P_H
+
+#include <cstdlib>
+#include <memory>
+
+#include <kavellaccounts/CSKavellAccount.h>
+#include <kavellaccounts/Ref.h>
+
+#include "platform/data_file.h"
+#include "runtime/object_p.h"
+#include "store/CSKavellAccountSettings_p.h"
+#include "store/collection_helpers.h"
+#include "store/record_lock.h"
+
+namespace kavell {
+
+/// Frees what malloc gave.
+struct FreeDeleter {
+    void operator()(void *memory) const noexcept { std::free(memory); }
+};
+
+using OwnedCString = std::unique_ptr<char, FreeDeleter>;
+
+}  // namespace kavell
+
+struct CSKavellAccount : kavell::Object {
+    /// Both are fixed at creation and may be read without the lock.
+    kavell::Ref<CSKavellStringRef> providerType{};
+    kavell::Ref<CSKavellStringRef> loginName{};
+    /// The committed UUID, and the one that the next commit makes committed.
+    kavell::Ref<CSKavellStringRef> uuidString{};
+    kavell::Ref<CSKavellStringRef> newUUIDString{};
+    kavell::Ref<CSKavellAccountSettingsRef> accountSettings{};
+    /// Service identifier to CSKavellAccountSettings.
+    kavell::DictionarySlot services{};
+    kavell::RecordLock lock{};
+    /// The data file's semaphore set; 0 until it is first needed, then kept for the record's life.
+    int32_t semaphoreID = 0;
+    kavell::OwnedCString dataFilePath{};
+    /// When this record last saved the file; never set by a read.
+    kavell::FileTime dataFileModTime{};
+    bool hasChanges = false;
+    bool pendingRemove = false;
+};
+
+namespace kavell {
+
+/// The string as NUL-terminated UTF-8; none for none and for text that holds a NUL itself.
+[[nodiscard]] OwnedCString CreateUTF8CString(CSKavellStringRef string) noexcept;
+
+/// The absolute path of the directory that holds all accounts, without a closing "/".
+[[nodiscard]] std::string dataRootPath();
+
+/// Brings the committed side up to what the data file says. False on a real error, after its message.
+bool ReadAccountData(CSKavellAccount &account) noexcept;
+
+/// Replaces the committed side of every service by what the file's "Services" dictionary (may be none) says.
+void UpdateServiceAttributes(CSKavellAccount &account, CSKavellDictionaryRef fileServices) noexcept;
+
+/// Takes the semaphore of the data file, waiting for as long as it takes; false when it cannot be taken.
+[[nodiscard]] bool LockDatafileAccess(CSKavellAccount &account) noexcept;
+
+/// Gives the semaphore back.
+void UnlockDatafileAccess(CSKavellAccount &account) noexcept;
+
+/// Saves the pending changes or deletes the data file.
+void commitAccount(CSKavellAccount &account) noexcept;
+
+}  // namespace kavell
+
+#endif
