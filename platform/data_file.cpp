@@ -1,0 +1,321 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+
+#include "platform/data_file.h"
+
+#include <algorithm>
+#include <array>
+#include <atomic>
+#include <chrono>
+#include <cstdio>
+#include <ctime>
+#include <fcntl.h>
+#include <sys/file.h>
+#include <sys/stat.h>
+#include <thread>
+
+#include "platform/checksum.h"
+#include "platform/damaged_copy.h"
+#include "platform/file_io.h"
+#include "platform/redo_record.h"
+#include "runtime/object_p.h"
+
+namespace kavell {
+
+namespace {
+
+constexpr auto kLongestFlockWait = std::chrono::seconds(10);
+// Beyond both contents in a record there is only its small frame.
+constexpr size_t kLargestRedoRecord = 2 * kLargestDataFile + 64;
+// How often a file may come and go under a writer before it gives up.
+constexpr int kMostAttempts = 16;
+
+/// Waits for the flock for a bounded time. It is free nearly always: whoever holds it also holds the semaphore that the
+/// caller has just taken, unless their records found different ones.
+bool lockFile(int file) noexcept
+{
+    const auto deadline = std::chrono::steady_clock::now() + kLongestFlockWait;
+    auto pause = std::chrono::microseconds(50);
+    while (flock(file, LOCK_EX | LOCK_NB) != 0) {
+        if (errno != EWOULDBLOCK && errno != EINTR)
+            return false;
+        if (std::chrono::steady_clock::now() > deadline)
+            return false;
+        std::this_thread::sleep_for(pause);
+        pause = std::min(pause * 2, std::chrono::microseconds(5000));
+    }
+    return true;
+}
+
+/// Opens a file and takes its flock; none, with errno, when either fails. Opening never waits, whatever the path names.
+FileDescriptor openLocked(const char *path, int access) noexcept
+{
+    FileDescriptor file(withoutInterruption([&] { return open(path, access | O_CLOEXEC | O_NONBLOCK | O_NOCTTY); }));
+    if (file && !lockFile(file.get()))
+        return FileDescriptor();
+    return file;
+}
+
+/// Puts the new contents over the old, which are never cut off first: a full disk must not cost them.
+bool overwrite(int file, std::string_view contents, off_t oldSize) noexcept
+{
+    if (!writeWhole(file, contents))
+        return false;
+    const auto newSize = static_cast<off_t>(contents.size());
+    return oldSize <= newSize || withoutInterruption([&] { return ftruncate(file, newSize); }) == 0;
+}
+
+bool syncData(int file) noexcept
+{
+    return withoutInterruption([&] { return fdatasync(file); }) == 0;
+}
+
+/// A redo record that was found, read and judged.
+struct FoundRecord {
+    std::string bytes;
+    std::string_view newContents;
+    RedoVerdict verdict = RedoVerdict::Discard;
+};
+
+/// Judges the record at `recordPath` against the file; none when there is no record or it cannot be read.
+std::optional<FoundRecord> findRecord(int file, const std::string &recordPath)
+{
+    const FileDescriptor record(open(recordPath.c_str(), O_RDONLY | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK));
+    FoundRecord found;
+    if (!record || !readWhole(record.get(), 0, kLargestRedoRecord, found.bytes))
+        return std::nullopt;
+    const auto decoded = decodeRedoRecord(found.bytes);
+    struct stat status;
+    std::string contents;
+    if (!decoded || fstat(file, &status) != 0)
+        return found;
+    if (!readWhole(file, static_cast<size_t>(status.st_size), kLargestDataFile, contents))
+        return std::nullopt;
+    found.newContents = decoded->newContents;
+    found.verdict = judgeRedoRecord(*decoded, status.st_ino, contents);
+    return found;
+}
+
+bool hasRecord(const std::string &recordPath) noexcept
+{
+    return access(recordPath.c_str(), F_OK) == 0;
+}
+
+/// Settles a redo record, if there is one, on a file that is open for writing. False when that could not be done.
+bool settleRecord(int file, const std::string &recordPath)
+{
+    if (!hasRecord(recordPath))
+        return true;
+    const auto found = findRecord(file, recordPath);
+    if (!found)
+        return false;
+    struct stat status;
+    if (found->verdict == RedoVerdict::Finish &&
+        (fstat(file, &status) != 0 || !overwrite(file, found->newContents, status.st_size) || !syncData(file)))
+        return false;
+    return unlink(recordPath.c_str()) == 0;
+}
+
+/// Writes a file that must not exist yet, durably except for its name.
+bool writeNewFile(const std::string &path, std::string_view contents) noexcept
+{
+    const FileDescriptor file(open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC | O_NOFOLLOW, 0600));
+    if (!file)
+        return false;
+    if (fchmod(file.get(), 0600) == 0 && writeWhole(file.get(), contents) && syncData(file.get()))
+        return true;
+    unlink(path.c_str());
+    return false;
+}
+
+/// Gives the file a modification time of its own. The kernel's default is as coarse as its tick on many systems, and
+/// two programs that save within one tick must not be taken for one.
+bool stampFile(int file) noexcept
+{
+    std::array<timespec, 2> times{};
+    times[0].tv_nsec = UTIME_OMIT;
+    return clock_gettime(CLOCK_REALTIME, &times[1]) == 0 && futimens(file, times.data()) == 0;
+}
+
+/// Makes sure that the longer contents have room on the disk before a byte of the old ones changes.
+bool reserveRoom(int file, size_t size) noexcept
+{
+    const int result = withoutInterruption(
+        [&] { return fallocate(file, FALLOC_FL_KEEP_SIZE, 0, static_cast<off_t>(std::max<size_t>(size, 1))); });
+    return result == 0 || errno == EOPNOTSUPP;
+}
+
+bool replaceInPlace(int file, const char *path, std::string_view contents, IntactCheck isIntact)
+{
+    const std::string recordPath = siblingPath(path, kRedoRecordPrefix);
+    struct stat status;
+    std::string oldContents;
+    if (!settleRecord(file, recordPath) || fstat(file, &status) != 0 || !S_ISREG(status.st_mode) ||
+        !readWhole(file, static_cast<size_t>(status.st_size), kLargestDataFile, oldContents))
+        return false;
+    RedoRecord record;
+    record.inode = status.st_ino;
+    record.newContents = contents;
+    if (oldContents.size() <= kLargestDataFile)
+        record.oldContents = oldContents;
+    if ((!record.oldContents || !isIntact(oldContents)) && !keepDamagedCopy(file, path))
+        return false;
+    const bool isProtected = (contents.size() <= oldContents.size() || reserveRoom(file, contents.size())) &&
+                             writeNewFile(recordPath, encodeRedoRecord(record)) && syncDirectoryOf(path);
+    if (!isProtected) {
+        unlink(recordPath.c_str());
+        return false;
+    }
+    if (overwrite(file, contents, status.st_size) && fchmod(file, 0600) == 0 && stampFile(file) && syncData(file))
+        return unlink(recordPath.c_str()) == 0 || errno == ENOENT;
+    // Back to the old contents where they are known and can be put back; else the record stays and is finished later.
+    if (record.oldContents && overwrite(file, oldContents, static_cast<off_t>(contents.size())) && syncData(file))
+        unlink(recordPath.c_str());
+    return false;
+}
+
+enum class Creation { Done, Exists, Failed };
+
+/// Gives a finished file its name unless something has that name already.
+Creation publish(const char *newPath, const char *path) noexcept
+{
+    if (renameat2(AT_FDCWD, newPath, AT_FDCWD, path, RENAME_NOREPLACE) == 0)
+        return Creation::Done;
+    // Some file systems cannot rename without replacing; a second name that must be new does the same in two steps.
+    if ((errno == EINVAL || errno == ENOSYS) && link(newPath, path) == 0) {
+        unlink(newPath);
+        return Creation::Done;
+    }
+    const bool exists = errno == EEXIST;
+    unlink(newPath);
+    return exists ? Creation::Exists : Creation::Failed;
+}
+
+Creation createWhole(const char *path, std::string_view contents)
+{
+    static std::atomic<unsigned> counter{0};
+    const std::string newPath = siblingPath(path, kNewFilePrefix) + "-" + std::to_string(getpid()) + "-" +
+                                std::to_string(counter.fetch_add(1, std::memory_order_relaxed));
+    if (!writeNewFile(newPath, contents)) {
+        // A process of this number may have died here before.
+        if (errno != EEXIST || unlink(newPath.c_str()) != 0 || !writeNewFile(newPath, contents))
+            return Creation::Failed;
+    }
+    const Creation creation = publish(newPath.c_str(), path);
+    if (creation == Creation::Done)
+        return syncDirectoryOf(path) ? Creation::Done : Creation::Failed;
+    return creation;
+}
+
+bool wasUnlinked(int file) noexcept
+{
+    struct stat status;
+    return fstat(file, &status) == 0 && status.st_nlink == 0;
+}
+
+/// The contents of a file that has a redo record, settling the record where this process may write.
+FileRead readWithRecord(const char *path, const std::string &recordPath, std::string &contents)
+{
+    if (const FileDescriptor writable = openLocked(path, O_RDWR); writable) {
+        if (!settleRecord(writable.get(), recordPath))
+            return FileRead::Failed;
+        return readWhole(writable.get(), 0, kLargestDataFile, contents) ? FileRead::Done : FileRead::Failed;
+    }
+    const FileDescriptor file = openLocked(path, O_RDONLY);
+    if (!file)
+        return FileRead::Failed;
+    const auto found = findRecord(file.get(), recordPath);
+    if (found && found->verdict == RedoVerdict::Finish) {
+        contents = found->newContents;
+        return FileRead::Done;
+    }
+    return readWhole(file.get(), 0, kLargestDataFile, contents) ? FileRead::Done : FileRead::Failed;
+}
+
+}  // namespace
+
+std::string siblingPath(std::string_view path, std::string_view prefix)
+{
+    const size_t nameStart = path.rfind('/') + 1;
+    std::array<char, 17> hash;
+    std::snprintf(hash.data(), hash.size(), "%016llx",
+                  static_cast<unsigned long long>(checksumOf(path.substr(nameStart))));
+    std::string sibling;
+    sibling.reserve(nameStart + prefix.size() + hash.size() + 32);
+    sibling.append(path.substr(0, nameStart)).append(prefix).append(hash.data(), hash.size() - 1);
+    return sibling;
+}
+
+FileRead readDataFile(const char *path, size_t expectedSize, std::string &contents) noexcept
+{
+    return guarded(FileRead::Failed, [&] {
+        FileDescriptor file = openLocked(path, O_RDONLY);
+        if (!file)
+            return FileRead::Failed;
+        const std::string recordPath = siblingPath(path, kRedoRecordPrefix);
+        FileRead result;
+        if (hasRecord(recordPath)) {
+            file = FileDescriptor();
+            result = readWithRecord(path, recordPath, contents);
+        } else {
+            result =
+                readWhole(file.get(), expectedSize, kLargestDataFile, contents) ? FileRead::Done : FileRead::Failed;
+        }
+        return result == FileRead::Done && contents.size() > kLargestDataFile ? FileRead::TooLarge : result;
+    });
+}
+
+bool writeDataFile(const char *path, std::string_view contents, IntactCheck isIntact) noexcept
+{
+    if (!path || contents.size() > kLargestDataFile)
+        return false;
+    return guarded(false, [&] {
+        for (int attempt = 0; attempt < kMostAttempts; ++attempt) {
+            const FileDescriptor file = openLocked(path, O_RDWR);
+            if (file && !wasUnlinked(file.get()))
+                return replaceInPlace(file.get(), path, contents, isIntact);
+            if (!file && errno != ENOENT)
+                return false;
+            if (!file) {
+                const Creation creation = createWhole(path, contents);
+                if (creation != Creation::Exists)
+                    return creation == Creation::Done;
+            }
+        }
+        return false;
+    });
+}
+
+bool removeDataFile(const char *path) noexcept
+{
+    if (!path)
+        return false;
+    return guarded(false, [&] {
+        // Not while somebody is in the middle of replacing it, if that can be helped.
+        const FileDescriptor file = openLocked(path, O_RDONLY);
+        unlink(siblingPath(path, kRedoRecordPrefix).c_str());
+        if (std::remove(path) != 0)
+            return false;
+        // The file is gone for every program; that a power cut may bring it back is no failure of the removal.
+        static_cast<void>(syncDirectoryOf(path));
+        return true;
+    });
+}
+
+void createDirectoriesAbove(const char *path) noexcept
+{
+    guarded([&] {
+        const std::string_view view(path);
+        for (size_t slash = view.find('/', 1); slash != std::string_view::npos; slash = view.find('/', slash + 1)) {
+            const std::string directory(view.substr(0, slash));
+            struct stat status;
+            if (stat(directory.c_str(), &status) == 0 || mkdir(directory.c_str(), 0700) != 0)
+                continue;
+            // The process's file mode mask may have taken bits away.
+            chmod(directory.c_str(), 0700);
+            static_cast<void>(syncDirectoryOf(directory.c_str()));
+        }
+    });
+}
+
+}  // namespace kavell

@@ -1,0 +1,62 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+//
+// Owned descriptors and whole reads and writes. Used by platform/; any thread may call.
+
+#ifndef KAVELL_PLATFORM_FILE_IO_H
+#define KAVELL_PLATFORM_FILE_IO_H
+
+#include <cerrno>
+#include <string>
+#include <string_view>
+#include <unistd.h>
+#include <utility>
+
+namespace kavell {
+
+/// Owns a descriptor, or none (-1).
+class FileDescriptor {
+public:
+    FileDescriptor() noexcept = default;
+    explicit FileDescriptor(int descriptor) noexcept : m_descriptor(descriptor) {}
+    FileDescriptor(FileDescriptor &&other) noexcept : m_descriptor(std::exchange(other.m_descriptor, -1)) {}
+    FileDescriptor &operator=(FileDescriptor &&other) noexcept
+    {
+        std::swap(m_descriptor, other.m_descriptor);
+        return *this;
+    }
+    ~FileDescriptor()
+    {
+        if (m_descriptor >= 0)
+            close(m_descriptor);
+    }
+
+    [[nodiscard]] int get() const noexcept { return m_descriptor; }
+    explicit operator bool() const noexcept { return m_descriptor >= 0; }
+
+private:
+    int m_descriptor = -1;
+};
+
+/// Repeats a system call that a signal interrupted.
+template <typename Call> auto withoutInterruption(Call &&call) noexcept
+{
+    auto result = call();
+    while (result < 0 && errno == EINTR)
+        result = call();
+    return result;
+}
+
+/// Writes all bytes at an offset; false, with errno, when that fails part way.
+[[nodiscard]] bool writeWhole(int descriptor, std::string_view bytes, off_t offset = 0) noexcept;
+
+/// Reads from the start to the end of the file, at most `limit` bytes; false, with errno, on failure. A file that is
+/// longer gives `limit` + 1 bytes. `expectedSize` is a hint that saves a system call.
+[[nodiscard]] bool readWhole(int descriptor, size_t expectedSize, size_t limit, std::string &contents);
+
+/// Makes names created, renamed and deleted in the directory of a path durable.
+[[nodiscard]] bool syncDirectoryOf(const char *path) noexcept;
+
+}  // namespace kavell
+
+#endif

@@ -1,0 +1,33 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+//
+// XML property lists (format version 1.0) to objects and back, through libplist behind a guard. Used for data files and
+// for notifications between processes. Any thread may call; nothing here blocks.
+
+#ifndef KAVELL_PLATFORM_PROPERTY_LIST_H
+#define KAVELL_PLATFORM_PROPERTY_LIST_H
+
+#include <string>
+#include <string_view>
+
+#include <kavellaccounts/CSKavellDictionary.h>
+#include <kavellaccounts/Ref.h>
+
+namespace kavell {
+
+/// The dictionary that the XML text describes, with mutable containers; none when the text is not a property list that
+/// can be trusted (property_list_guard.h) or its top level is not a dictionary.
+[[nodiscard]] Ref<CSKavellMutableDictionaryRef> parsePropertyList(std::string_view xml) noexcept;
+
+/// Whether parsePropertyList would answer a dictionary.
+[[nodiscard]] bool isPropertyList(std::string_view xml) noexcept;
+
+/// Writes a dictionary as XML. False, with `xml` as it was, when a value cannot be kept by a property list: an object
+/// of another type, a key that is no string, text with control characters, a real that is no number, an integer above
+/// INT64_MAX, a date out of range, containers deeper than the guard allows or holding themselves, or more than the
+/// largest file.
+[[nodiscard]] bool writePropertyList(CSKavellDictionaryRef dictionary, std::string &xml) noexcept;
+
+}  // namespace kavell
+
+#endif

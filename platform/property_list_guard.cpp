@@ -1,0 +1,221 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+
+#include "platform/property_list_guard.h"
+
+#include <algorithm>
+#include <array>
+#include <charconv>
+#include <chrono>
+
+#include "runtime/utf8.h"
+
+namespace kavell {
+
+namespace {
+
+constexpr std::string_view kBlanks = " \t\r\n";
+
+constexpr bool isDigit(char character) noexcept
+{
+    return character >= '0' && character <= '9';
+}
+
+std::string_view trimmed(std::string_view text) noexcept
+{
+    const size_t first = text.find_first_not_of(kBlanks);
+    if (first == std::string_view::npos)
+        return {};
+    return text.substr(first, text.find_last_not_of(kBlanks) - first + 1);
+}
+
+/// A decimal integer from -2^63 to 2^63 - 1: what can be read and written again unchanged.
+bool isIntegerText(std::string_view text) noexcept
+{
+    text = trimmed(text);
+    if (text.starts_with('+'))
+        text.remove_prefix(1);
+    int64_t value;
+    const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), value);
+    return error == std::errc() && end == text.data() + text.size();
+}
+
+bool isRealText(std::string_view text) noexcept
+{
+    text = trimmed(text);
+    if (text.starts_with('+'))
+        text.remove_prefix(1);
+    double value;
+    const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), value);
+    return error == std::errc() && end == text.data() + text.size() && value - value == 0;
+}
+
+/// YYYY-MM-DDTHH:MM:SSZ, an existing date within the range.
+bool isDateText(std::string_view text) noexcept
+{
+    constexpr std::string_view kForm = "dddd-dd-ddTdd:dd:ddZ";
+    text = trimmed(text);
+    if (text.size() != kForm.size())
+        return false;
+    for (size_t place = 0; place < kForm.size(); ++place) {
+        if (kForm[place] == 'd' ? !isDigit(text[place]) : text[place] != kForm[place])
+            return false;
+    }
+    const auto number = [text](size_t place, size_t length) {
+        int value = 0;
+        std::from_chars(text.data() + place, text.data() + place + length, value);
+        return value;
+    };
+    const std::chrono::year_month_day date{std::chrono::year(number(0, 4)),
+                                           std::chrono::month(static_cast<unsigned>(number(5, 2))),
+                                           std::chrono::day(static_cast<unsigned>(number(8, 2)))};
+    if (!date.ok() || number(11, 2) > 23 || number(14, 2) > 59 || number(17, 2) > 59)
+        return false;
+    const int64_t days = std::chrono::sys_days(date).time_since_epoch().count();
+    const int64_t seconds = days * 86400 + number(11, 2) * 3600 + number(14, 2) * 60 + number(17, 2);
+    return seconds >= kEarliestDate && seconds <= kLatestDate;
+}
+
+/// Base64 (RFC 4648, section 4), with blanks anywhere.
+bool isBase64Text(std::string_view text) noexcept
+{
+    size_t digits = 0, padding = 0;
+    for (const char character : text) {
+        if (kBlanks.find(character) != std::string_view::npos)
+            continue;
+        if (character == '=') {
+            ++padding;
+            continue;
+        }
+        const bool isDigit64 = isDigit(character) || (character >= 'A' && character <= 'Z') ||
+                               (character >= 'a' && character <= 'z') || character == '+' || character == '/';
+        if (!isDigit64 || padding > 0)
+            return false;
+        ++digits;
+    }
+    return padding <= 2 && (digits + padding) % 4 == 0;
+}
+
+struct ScalarElement {
+    std::string_view name;
+    bool (*isText)(std::string_view) noexcept;
+};
+
+constexpr std::array kScalarElements{
+    ScalarElement{"integer", isIntegerText},
+    ScalarElement{"real", isRealText},
+    ScalarElement{"date", isDateText},
+    ScalarElement{"data", isBase64Text},
+};
+
+/// Walks the markup of a document, counting depth the way the parser recurses. It never takes for a comment or a
+/// section what the parser does not, so that no nesting stays hidden from it.
+class MarkupWalk {
+public:
+    explicit MarkupWalk(std::string_view xml) noexcept : m_rest(xml) {}
+
+    [[nodiscard]] bool isSafe() noexcept
+    {
+        for (size_t next; (next = m_rest.find('<')) != std::string_view::npos;) {
+            m_rest.remove_prefix(next + 1);
+            if (!passMarkup())
+                return false;
+        }
+        return true;
+    }
+
+private:
+    /// Passes what begins after a "<".
+    bool passMarkup() noexcept
+    {
+        if (m_rest.starts_with("!--"))
+            return passThrough("-->", 3);
+        if (m_rest.starts_with("![CDATA["))
+            return m_depth > 0 && passThrough("]]>", 8);
+        // A declaration is legal before the first element only, where quotes cannot make the parser and this code
+        // disagree about depth; a subset of declarations inside a document type is not needed by any property list.
+        if (m_rest.starts_with('?'))
+            return !m_sawElement && passThrough("?>", 1);
+        if (m_rest.starts_with("!DOCTYPE"))
+            return !m_sawElement && passDocumentType();
+        if (m_rest.starts_with('!'))
+            return false;
+        return passTag();
+    }
+
+    bool passThrough(std::string_view end, size_t from) noexcept
+    {
+        const size_t found = m_rest.find(end, from);
+        if (found == std::string_view::npos)
+            return false;
+        m_rest.remove_prefix(found + end.size());
+        return true;
+    }
+
+    bool passDocumentType() noexcept
+    {
+        const size_t end = m_rest.find('>');
+        if (end == std::string_view::npos || m_rest.substr(0, end).find_first_of("[<") != std::string_view::npos)
+            return false;
+        m_rest.remove_prefix(end + 1);
+        return true;
+    }
+
+    bool passTag() noexcept
+    {
+        m_sawElement = true;
+        const size_t end = m_rest.find('>');
+        if (end == std::string_view::npos)
+            return false;
+        const std::string_view tag = m_rest.substr(0, end);
+        m_rest.remove_prefix(end + 1);
+        if (tag.starts_with('/'))
+            return --m_depth >= 0;
+        if (tag.ends_with('/'))
+            return true;
+        const std::string_view name = tag.substr(0, tag.find_first_of(kBlanks));
+        return ++m_depth <= kDeepestPropertyList && scalarIsWellFormed(name);
+    }
+
+    /// Whether the text that follows an opened element fits it.
+    [[nodiscard]] bool scalarIsWellFormed(std::string_view name) const noexcept
+    {
+        const auto *element = std::find_if(kScalarElements.begin(), kScalarElements.end(),
+                                           [name](const ScalarElement &each) { return each.name == name; });
+        if (element == kScalarElements.end())
+            return true;
+        const size_t end = m_rest.find('<');
+        return end != std::string_view::npos && m_rest.substr(end).starts_with("</") &&
+               element->isText(m_rest.substr(0, end));
+    }
+
+    std::string_view m_rest;
+    int m_depth = 0;
+    bool m_sawElement = false;
+};
+
+bool hasControlCharacter(std::string_view text) noexcept
+{
+    // Without an early end the compiler checks many bytes at a time.
+    bool found = false;
+    for (const char character : text) {
+        const auto byte = static_cast<unsigned char>(character);
+        found |= (byte < 0x20) & (byte != '\t') & (byte != '\n') & (byte != '\r');
+    }
+    return found;
+}
+
+}  // namespace
+
+bool isSafePropertyList(std::string_view xml) noexcept
+{
+    return !hasControlCharacter(xml) && isUTF8(xml) && MarkupWalk(xml).isSafe();
+}
+
+bool isXMLText(std::string_view text) noexcept
+{
+    return !hasControlCharacter(text) && text.find("\xEF\xBF\xBE") == std::string_view::npos &&
+           text.find("\xEF\xBF\xBF") == std::string_view::npos;
+}
+
+}  // namespace kavell

@@ -1,0 +1,36 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+//
+// What must hold of an XML property list before the parser may see it. The parser trusts its input: a million unclosed
+// tags exhaust its stack, a number followed by letters reads as the number, a broken date as 1970. Pure functions; any
+// thread may call.
+
+#ifndef KAVELL_PLATFORM_PROPERTY_LIST_GUARD_H
+#define KAVELL_PLATFORM_PROPERTY_LIST_GUARD_H
+
+#include <cstddef>
+#include <cstdint>
+#include <string_view>
+
+namespace kavell {
+
+/// How deep elements may stand in one another. The writer's recursion needs about 256 bytes of stack a level; this
+/// leaves room on the smallest thread stacks in use.
+inline constexpr int kDeepestPropertyList = 256;
+
+/// The first and the last second since 1970 that a property list keeps: 32-bit seconds around 2001-01-01.
+inline constexpr int64_t kPropertyListEpoch = 978307200;
+inline constexpr int64_t kEarliestDate = kPropertyListEpoch + INT32_MIN;
+inline constexpr int64_t kLatestDate = kPropertyListEpoch + INT32_MAX;
+
+/// Whether the text may be handed to the parser: UTF-8 without control characters, elements no deeper than
+/// kDeepestPropertyList, no document-type subset, and only well-formed numbers, dates and data within their ranges.
+[[nodiscard]] bool isSafePropertyList(std::string_view xml) noexcept;
+
+/// Whether a string can stand in an XML document: without control characters but for tab, line feed and carriage
+/// return, and without U+FFFE and U+FFFF (XML 1.0, production 2). The string is UTF-8.
+[[nodiscard]] bool isXMLText(std::string_view text) noexcept;
+
+}  // namespace kavell
+
+#endif
