@@ -13,9 +13,10 @@
 namespace kavell {
 
 /// Queues a copy of a notification for the session bus and returns at once; nothing happens when no session bus stands
-/// (one is never started). A worker thread of this process sends it; at the process's end the queue gets a short, bounded
-/// time to drain. `object` and `userInformation` may be none.
-void mirrorToSessionBus(CSKavellStringRef name, CSKavellStringRef object, CSKavellDictionaryRef userInformation) noexcept;
+/// (one is never started). A worker thread of this process sends it; at the process's end the queue gets a short,
+/// bounded time to drain. `object` and `userInformation` may be none.
+void mirrorToSessionBus(CSKavellStringRef name, CSKavellStringRef object,
+                        CSKavellDictionaryRef userInformation) noexcept;
 
 }  // namespace kavell
 

@@ -11,7 +11,8 @@
 //
 // Every function here that asks the store may block while the store works or the user answers a prompt, but for a
 // bounded time: 5 seconds a question, and 60 seconds for an unlocking prompt (KAVELL_CREDENTIAL_TIMEOUT and
-// KAVELL_UNLOCK_TIMEOUT, in milliseconds, change these). Any thread may call.
+// KAVELL_UNLOCK_TIMEOUT, in milliseconds, change these). One that finds its store locked asks for the store to be
+// unlocked and tries once more, unless it says that it does not prompt. Any thread may call.
 
 #ifndef KAVELLACCOUNTS_CSKAVELLCOFFEREL_H
 #define KAVELLACCOUNTS_CSKAVELLCOFFEREL_H
@@ -66,11 +67,13 @@ CSKAVELL_EXPORT CSKavellCofferelStatus CSKavellCofferelStoreFindItem(CSKavellStr
                                                                      CSKavellStringRef accountName,
                                                                      CSKavellCofferelItemRef *item);
 
-/// All items that this library has stored (caller owns), in no particular order; on Stored `*items` receives them.
+/// All items that this library has stored (caller owns), in no particular order; on Stored `*items` receives them. Does
+/// not prompt.
 CSKAVELL_EXPORT CSKavellCofferelStatus CSKavellCofferelStoreCopyItems(CSKavellArrayRef *items);
 
 /// The item of a persistent reference made by CSKavellCofferelItemCopyPersistentReference, in any process and after a
-/// restart. On Stored `*item` receives it (caller owns).
+/// restart. On Stored `*item` receives it (caller owns). Absent for what is no such reference; Unreachable for a
+/// reference into a store that this process may not use.
 CSKAVELL_EXPORT CSKavellCofferelStatus CSKavellCofferelItemResolve(CSKavellDataRef persistentReference,
                                                                    CSKavellCofferelItemRef *item);
 
@@ -88,6 +91,15 @@ CSKAVELL_EXPORT CSKavellCofferelStatus CSKavellCofferelItemCopySecret(CSKavellCo
 
 /// Deletes the item from the store.
 CSKAVELL_EXPORT CSKavellCofferelStatus CSKavellCofferelItemDelete(CSKavellCofferelItemRef item);
+
+/// The access object that is kept with the item. On Stored `*access` receives it (caller owns); one that was never set
+/// is empty. Unsupported where the store keeps none.
+CSKAVELL_EXPORT CSKavellCofferelStatus CSKavellCofferelItemCopyAccess(CSKavellCofferelItemRef item,
+                                                                      CSKavellCofferelAccessRef *access);
+
+/// Replaces the access object that is kept with the item. Unsupported where the store keeps none.
+CSKAVELL_EXPORT CSKavellCofferelStatus CSKavellCofferelItemSetAccess(CSKavellCofferelItemRef item,
+                                                                     CSKavellCofferelAccessRef access);
 
 /// An access object (caller owns) with a description and an array of group names; none for a none operand.
 CSKAVELL_EXPORT CSKavellCofferelAccessRef CSKavellCofferelAccessCreate(CSKavellStringRef description,

@@ -1,0 +1,129 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+
+#include "platform/services/user_files.h"
+
+#include <cerrno>
+#include <cstdio>
+#include <cstdlib>
+#include <fcntl.h>
+#include <pwd.h>
+#include <sys/file.h>
+#include <sys/stat.h>
+#include <vector>
+
+namespace kavell {
+
+namespace {
+
+std::string homeDirectory()
+{
+    if (const char *home = std::getenv("HOME"); home && home[0] == '/')
+        return home;
+    std::vector<char> buffer(16384);
+    passwd entry{};
+    passwd *found = nullptr;
+    getpwuid_r(getuid(), &entry, buffer.data(), buffer.size(), &found);
+    return found && found->pw_dir ? found->pw_dir : "";
+}
+
+std::string dataDirectory()
+{
+    // A relative path there is to be ignored, as the base directory rules say.
+    const char *data = std::getenv("XDG_DATA_HOME");
+    return data && data[0] == '/' ? std::string(data) : homeDirectory() + "/.local/share";
+}
+
+bool writeAll(int file, std::string_view bytes)
+{
+    while (!bytes.empty()) {
+        const ssize_t count = ::write(file, bytes.data(), bytes.size());
+        if (count < 0 && errno != EINTR)
+            return false;
+        bytes.remove_prefix(count > 0 ? static_cast<size_t>(count) : 0);
+    }
+    return true;
+}
+
+bool syncDirectory(const std::string &path)
+{
+    const Descriptor directory(::open(path.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
+    return directory && fsync(directory.get()) == 0;
+}
+
+}  // namespace
+
+std::string credentialDirectory()
+{
+    return dataDirectory() + "/kavell-accounts";
+}
+
+bool makeCredentialDirectory()
+{
+    const std::string path = credentialDirectory();
+    for (size_t slash = path.find('/', 1); slash != std::string::npos; slash = path.find('/', slash + 1))
+        ::mkdir(path.substr(0, slash).c_str(), 0700);
+    if (::mkdir(path.c_str(), 0700) == 0)
+        return true;
+    struct stat status {};
+    return errno == EEXIST && ::stat(path.c_str(), &status) == 0 && S_ISDIR(status.st_mode);
+}
+
+FileLock::FileLock(const std::string &name, const Deadline &deadline)
+{
+    if (!makeCredentialDirectory())
+        return;
+    const std::string path = credentialDirectory() + "/" + name;
+    m_file = Descriptor(::open(path.c_str(), O_RDWR | O_CREAT | O_CLOEXEC | O_NOFOLLOW, 0600));
+    if (!m_file)
+        return;
+    int error = 0;
+    const bool taken = waitUntil(deadline, [&] {
+        error = flock(m_file.get(), LOCK_EX | LOCK_NB) == 0 ? 0 : errno;
+        return error != EWOULDBLOCK && error != EINTR;
+    });
+    m_state = !taken ? State::timedOut : error == 0 ? State::held : State::failed;
+}
+
+FileContents readWholeFile(const std::string &path, size_t most)
+{
+    // Not blocking: what stands there may be a pipe.
+    const Descriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK));
+    if (!file)
+        return {errno == ENOENT ? FileContents::State::absent : FileContents::State::failed, {}};
+    struct stat status {};
+    if (fstat(file.get(), &status) != 0 || !S_ISREG(status.st_mode) || static_cast<size_t>(status.st_size) > most)
+        return {};
+    FileContents contents{FileContents::State::read, std::string(static_cast<size_t>(status.st_size), '\0')};
+    size_t done = 0;
+    while (done < contents.bytes.size()) {
+        const ssize_t count = ::read(file.get(), contents.bytes.data() + done, contents.bytes.size() - done);
+        if (count < 0 && errno == EINTR)
+            continue;
+        if (count <= 0)
+            return {};
+        done += static_cast<size_t>(count);
+    }
+    return contents;
+}
+
+bool replaceFile(const std::string &name, std::string_view bytes)
+{
+    const std::string directory = credentialDirectory();
+    const std::string path = directory + "/" + name;
+    const std::string fresh = path + ".new";
+    // A leftover of a process that was killed here; the lock's holder is its only user.
+    ::unlink(fresh.c_str());
+    const Descriptor file(::open(fresh.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC | O_NOFOLLOW, 0600));
+    if (!file)
+        return false;
+    if (!writeAll(file.get(), bytes) || fsync(file.get()) != 0 || std::rename(fresh.c_str(), path.c_str()) != 0) {
+        ::unlink(fresh.c_str());
+        return false;
+    }
+    // The new file stands either way; a directory that cannot be synced only weakens what a power cut leaves.
+    static_cast<void>(syncDirectory(directory));
+    return true;
+}
+
+}  // namespace kavell
