@@ -3,12 +3,12 @@
 //
 // kavell-accounts list: the accounts in a table. Touches no credentials, so that it starts as fast as a program can.
 
-#include <array>
 #include "tools/account_json.h"
 #include "tools/command_line.h"
 #include "tools/commands.h"
 #include "tools/names.h"
 #include "tools/text.h"
+#include <array>
 
 namespace kavell::tools {
 

@@ -1,0 +1,222 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+
+#include <algorithm>
+#include <array>
+#include <cerrno>
+#include <chrono>
+#include <cstring>
+#include <ctime>
+#include <endian.h>
+#include <fcntl.h>
+#include <filesystem>
+#include <map>
+#include <sys/file.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include "platform/data_file.h"
+#include "tools/doctor.h"
+#include "tools/files.h"
+#include "tools/names.h"
+#include "tools/text.h"
+
+namespace kavell::tools {
+
+namespace {
+
+constexpr mode_t directoryMode = 0700;
+constexpr mode_t fileMode = 0600;
+
+/// A new file exists under its temporary name for milliseconds; one older than this was left over.
+constexpr time_t longestCreation = 60;
+
+/// Where a redo record names the inode of its data file (platform/redo_record.h).
+constexpr off_t redoInodeOffset = 8;
+
+std::string octal(mode_t mode)
+{
+    std::array<char, 16> buffer;
+    std::snprintf(buffer.data(), buffer.size(), "%04o", static_cast<unsigned>(mode));
+    return buffer.data();
+}
+
+void examineMode(const std::string &path, const struct stat &status, mode_t wanted, Findings &findings)
+{
+    const mode_t mode = status.st_mode & 07777U;
+    if (status.st_uid != geteuid())
+        findings.problem("foreign-owner", path, escaped(path) + " belongs to another user; give it back with chown");
+    else if (mode != wanted)
+        findings.mendable("wrong-permissions", path,
+                          escaped(path) + " has the permissions " + octal(mode) + " and should have " + octal(wanted),
+                          [&] { return chmod(path.c_str(), wanted) == 0; });
+}
+
+/// The account whose data file the redo record was made for; none when that file is gone.
+const Address *accountOfRedoRecord(const std::string &path, const std::map<ino_t, Address> &accountsByInode)
+{
+    uint64_t inode = 0;
+    const FileDescriptor file(open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NOFOLLOW));
+    if (file.get() < 0 || pread(file.get(), &inode, sizeof inode, redoInodeOffset) != sizeof inode)
+        return nullptr;
+    const auto found = accountsByInode.find(static_cast<ino_t>(le64toh(inode)));
+    return found == accountsByInode.end() ? nullptr : &found->second;
+}
+
+/// Waits until nobody is inside the data file: a redo record that is still there then belongs to nobody.
+void waitForWriters(const Address &address)
+{
+    const FileDescriptor file(open(dataFileOf(address).c_str(), O_RDONLY | O_CLOEXEC));
+    if (file.get() >= 0)
+        (void)flock(file.get(), LOCK_SH);
+}
+
+bool exists(const std::string &path)
+{
+    struct stat status;
+    return lstat(path.c_str(), &status) == 0;
+}
+
+void examineRedoRecord(const std::string &path, const std::map<ino_t, Address> &accountsByInode, Findings &findings)
+{
+    const Address *account = accountOfRedoRecord(path, accountsByInode);
+    if (account && !findings.untouchable.contains(*account))
+        waitForWriters(*account);
+    if (!exists(path))
+        return;
+    if (!account) {
+        findings.mendable("left-over-record", path, escaped(path) + " is the record of a save whose file is gone",
+                          [&] { return unlink(path.c_str()) == 0; });
+        return;
+    }
+    const bool canOpen = !findings.untouchable.contains(*account);
+    findings.mendable("unfinished-save", path, "a save of " + account->text() + " was interrupted and is not finished",
+                      [&] {
+                          const QuietStandardError quiet;
+                          if (canOpen)
+                              (void)openAccount(*account);
+                          return !exists(path);
+                      });
+    if (!findings.all.back().mended)
+        findings.untouchable.insert(*account);
+}
+
+void examineTemporaryFile(const std::string &path, const struct stat &status, Findings &findings)
+{
+    if (time(nullptr) - status.st_mtime > longestCreation)
+        findings.mendable("left-over-file", path, escaped(path) + " was left over when an account was being added",
+                          [&] { return unlink(path.c_str()) == 0; });
+}
+
+void examineDataFile(const std::string &path, const std::string &name, const struct stat &status, Findings &findings)
+{
+    const std::string login = name.substr(0, name.size() - strlen(".plist"));
+    if (!S_ISREG(status.st_mode))
+        findings.problem("no-regular-file", path,
+                         escaped(path) + " is no regular file, so it is not read as an account; move it away");
+    else if (const std::string problem = nameProblem(login); !problem.empty())
+        findings.problem("unusable-name", path,
+                         "the login name of " + escaped(path) + " " + problem + "; rename the file");
+    else
+        examineMode(path, status, fileMode, findings);
+}
+
+void examineEntry(const std::string &directory, const std::string &name,
+                  const std::map<ino_t, Address> &accountsByInode, Findings &findings)
+{
+    const std::string path = directory + "/" + name;
+    struct stat status;
+    if (lstat(path.c_str(), &status) != 0)
+        return;
+    if (name.size() > strlen(".plist") && name.ends_with(".plist"))
+        examineDataFile(path, name, status, findings);
+    else if (name.starts_with(kRedoRecordPrefix))
+        examineRedoRecord(path, accountsByInode, findings);
+    else if (name.starts_with(kNewFilePrefix))
+        examineTemporaryFile(path, status, findings);
+    else if (name.starts_with(kDamagedCopyPrefix))
+        findings.note("damaged-copy", path,
+                      escaped(path) + " is a damaged data file that was kept when its account was saved anew; take "
+                                      "from it what you need and delete it");
+}
+
+void examineDirectory(const std::string &path, Findings &findings)
+{
+    struct stat status;
+    if (lstat(path.c_str(), &status) == 0 && S_ISDIR(status.st_mode))
+        examineMode(path, status, directoryMode, findings);
+}
+
+std::vector<std::string> namesIn(const std::string &directory)
+{
+    std::vector<std::string> names;
+    std::error_code error;
+    for (std::filesystem::directory_iterator entry(directory, error), end; !error && entry != end;
+         entry.increment(error))
+        names.push_back(entry->path().filename().string());
+    std::sort(names.begin(), names.end());
+    return names;
+}
+
+std::map<ino_t, Address> inodesOf(const std::vector<Address> &accounts)
+{
+    std::map<ino_t, Address> inodes;
+    for (const Address &address : accounts) {
+        struct stat status;
+        if (lstat(dataFileOf(address).c_str(), &status) == 0)
+            inodes[status.st_ino] = address;
+    }
+    return inodes;
+}
+
+}  // namespace
+
+void examineDirectories(const std::vector<Address> &accounts, Findings &findings)
+{
+    const std::map<ino_t, Address> accountsByInode = inodesOf(accounts);
+    const std::string root = dataRoot();
+    examineDirectory(std::filesystem::path(root).parent_path().string(), findings);
+    examineDirectory(root, findings);
+    for (const std::string &provider : namesIn(root)) {
+        const std::string directory = root + "/" + provider;
+        if (!std::filesystem::is_directory(std::filesystem::symlink_status(directory)))
+            continue;
+        examineDirectory(directory, findings);
+        for (const std::string &name : namesIn(directory))
+            examineEntry(directory, name, accountsByInode, findings);
+    }
+}
+
+void examineContents(const std::vector<Address> &accounts, Findings &findings)
+{
+    for (const Address &address : accounts) {
+        const std::string path = dataFileOf(address);
+        if (findings.untouchable.contains(address)) {
+            findings.note("not-examined", path, address.text() + " was not opened because of the problem above");
+            continue;
+        }
+        struct stat status;
+        if (lstat(path.c_str(), &status) != 0)
+            continue;  // removed meanwhile
+        bool readable = false;
+        {
+            const QuietStandardError quiet;
+            readable = openAccount(address).readable;
+        }
+        if (readable)
+            continue;
+        if (access(path.c_str(), R_OK) != 0)
+            findings.problem("unreadable-file", path,
+                             "the data file of " + address.text() + " cannot be read: " + std::strerror(errno) +
+                                 "; check the permissions of " + escaped(path));
+        else if (status.st_size > static_cast<off_t>(kLargestDataFile))
+            findings.problem("damaged-file", path,
+                             "the data file of " + address.text() + " is too large to be one: " + escaped(path));
+        else
+            findings.problem("damaged-file", path,
+                             "the data file of " + address.text() + " is damaged: " + escaped(path) +
+                                 "; put a good copy in its place, or remove the account");
+    }
+}
+
+}  // namespace kavell::tools

@@ -1,0 +1,108 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+
+#include <chrono>
+#include <fstream>
+#include <map>
+#include <thread>
+
+#include "tools/doctor.h"
+#include "tools/semaphore_repair.h"
+#include "tools/text.h"
+
+namespace kavell::tools {
+
+namespace {
+
+/// How long a living holder may take before it is worth a word. A save takes milliseconds.
+constexpr std::chrono::seconds patience{2};
+
+/// A set and the accounts that share it: keys are made of a few bits of a file's inode, so files do collide.
+struct SharedSet {
+    SemaphoreReport report;
+    std::vector<Address> accounts;
+    bool isOfMissingFiles = false;
+};
+
+std::map<int, SharedSet> setsOf(const std::vector<Address> &accounts)
+{
+    std::map<int, SharedSet> sets;
+    for (const Address &address : accounts)
+        if (const auto report = inspectSemaphore(dataFileOf(address))) {
+            sets[report->id].report = *report;
+            sets[report->id].accounts.push_back(address);
+        }
+    if (const auto report = inspectSemaphore({})) {
+        sets[report->id].report = *report;
+        sets[report->id].isOfMissingFiles = true;
+    }
+    return sets;
+}
+
+std::string subjectOf(const SharedSet &set)
+{
+    std::string subject = set.accounts.empty() ? "accounts that were just being added" : set.accounts.front().text();
+    if (set.accounts.size() > 1)
+        subject += " and " + std::to_string(set.accounts.size() - 1) + " more";
+    return subject;
+}
+
+/// "process 123 (name)".
+std::string processText(pid_t process)
+{
+    if (process == 0)
+        return "a process of another container";
+    std::string name;
+    std::ifstream command("/proc/" + std::to_string(process) + "/comm");
+    std::getline(command, name);
+    return "process " + std::to_string(process) + (name.empty() ? "" : " (" + escaped(name) + ")");
+}
+
+/// Gives a living holder the time to finish.
+SemaphoreReport afterPatience(SemaphoreReport report)
+{
+    const auto end = std::chrono::steady_clock::now() + patience;
+    while (report.state == SemaphoreState::Held && std::chrono::steady_clock::now() < end) {
+        std::this_thread::sleep_for(std::chrono::milliseconds(10));
+        if (const auto again = inspectSemaphoreSet(report.id))
+            report = *again;
+    }
+    return report;
+}
+
+void examineSet(SharedSet &set, Findings &findings)
+{
+    const SemaphoreReport report = afterPatience(set.report);
+    const std::string path = set.accounts.empty() ? std::string() : dataFileOf(set.accounts.front());
+    const std::string lock = "the lock of " + subjectOf(set);
+    const size_t before = findings.all.size();
+    const auto mend = [&] {
+        return repairSemaphore(report, dataRoot());
+    };
+    if (report.state == SemaphoreState::Held)
+        findings.problem("held-lock", path,
+                         lock + " is held by " + processText(report.lastOperator) +
+                             ", and everyone else waits for it; let that finish, or end it and run this again");
+    else if (report.state == SemaphoreState::HeldByDead)
+        findings.mendable("stuck-lock", path,
+                          lock + " was left taken by process " + std::to_string(report.lastOperator) +
+                              ", which is dead, and everyone waits for it",
+                          mend);
+    else if (report.state == SemaphoreState::AdmitsSeveral)
+        findings.mendable("open-lock", path, lock + " lets " + std::to_string(report.value) + " programs in at once",
+                          mend);
+    const bool stuck = report.state == SemaphoreState::Held || report.state == SemaphoreState::HeldByDead;
+    if (stuck && !(findings.all.size() > before && findings.all.back().mended))
+        findings.untouchable.insert(set.accounts.begin(), set.accounts.end());
+}
+
+}  // namespace
+
+void examineLocks(const std::vector<Address> &accounts, Findings &findings)
+{
+    std::map<int, SharedSet> sets = setsOf(accounts);
+    for (auto &[id, set] : sets)
+        examineSet(set, findings);
+}
+
+}  // namespace kavell::tools

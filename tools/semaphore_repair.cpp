@@ -1,0 +1,91 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+
+#include "tools/semaphore_repair.h"
+
+#include <array>
+#include <cerrno>
+#include <csignal>
+#include <fcntl.h>
+#include <sys/file.h>
+#include <sys/ipc.h>
+#include <sys/sem.h>
+
+#include "tools/files.h"
+
+namespace kavell::tools {
+
+namespace {
+
+/// A pid of 0 belongs to a process in another pid namespace, of which nothing can be known.
+bool isDead(pid_t process)
+{
+    return process > 0 && kill(process, 0) != 0 && errno == ESRCH;
+}
+
+SemaphoreState stateOf(int value, pid_t lastOperator)
+{
+    if (value > 1)
+        return SemaphoreState::AdmitsSeveral;
+    if (value == 1)
+        return SemaphoreState::Free;
+    return isDead(lastOperator) ? SemaphoreState::HeldByDead : SemaphoreState::Held;
+}
+
+/// Steps into the dead holder's place and gives the semaphore back as that holder would have. The first operation waits
+/// for nothing: it succeeds at once if the value is still 0, and leaves this process, which lives, as the last
+/// operator. No value above 1 can come of it, at whatever moment other programs wait, and if this process is killed
+/// between the two, the next repair finds a dead holder again.
+bool takeOverAndGive(int id)
+{
+    std::array<sembuf, 3> takeOver{{{0, 0, IPC_NOWAIT}, {0, 1, 0}, {0, -1, 0}}};
+    if (semop(id, takeOver.data(), takeOver.size()) != 0)
+        return false;
+    sembuf give{0, 1, 0};
+    return semop(id, &give, 1) == 0;
+}
+
+/// Takes the surplus away. Where one of those admitted is still inside, its own release restores the 1.
+bool takeSurplus(int id, int value)
+{
+    sembuf take{0, static_cast<short>(1 - value), IPC_NOWAIT};
+    return semop(id, &take, 1) == 0;
+}
+
+}  // namespace
+
+std::optional<SemaphoreReport> inspectSemaphoreSet(int id)
+{
+    // The pid is read before the value: a holder that gives back in between leaves the value 1, which is "free".
+    const int lastOperator = semctl(id, 0, GETPID);
+    const int value = lastOperator < 0 ? -1 : semctl(id, 0, GETVAL);
+    if (value < 0)
+        return std::nullopt;
+    return SemaphoreReport{id, stateOf(value, lastOperator), value, lastOperator};
+}
+
+std::optional<SemaphoreReport> inspectSemaphore(const std::string &path)
+{
+    const key_t key = path.empty() ? -1 : ftok(path.c_str(), 0);
+    if (key == -1 && !path.empty())
+        return std::nullopt;
+    const int id = semget(key, 0, 0);
+    return id > 0 ? inspectSemaphoreSet(id) : std::nullopt;
+}
+
+bool repairSemaphore(const SemaphoreReport &report, const std::string &lockDirectory)
+{
+    const FileDescriptor directory(open(lockDirectory.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
+    if (directory.get() < 0 || flock(directory.get(), LOCK_EX) != 0)
+        return false;
+    const std::optional<SemaphoreReport> before = inspectSemaphoreSet(report.id);
+    if (!before || before->state != report.state || before->lastOperator != report.lastOperator)
+        return false;
+    if (before->state == SemaphoreState::AdmitsSeveral)
+        return takeSurplus(report.id, before->value);
+    // The dead holder must still be the last operator after the value was seen to be 0.
+    const bool unchanged = semctl(report.id, 0, GETPID) == report.lastOperator;
+    return before->state == SemaphoreState::HeldByDead && unchanged && takeOverAndGive(report.id);
+}
+
+}  // namespace kavell::tools
