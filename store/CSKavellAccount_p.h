@@ -9,11 +9,13 @@
 
 #include <cstdlib>
 #include <memory>
+#include <string>
 
 #include <kavellaccounts/CSKavellAccount.h>
 #include <kavellaccounts/Ref.h>
 
 #include "platform/data_file.h"
+#include "runtime/dictionary_p.h"
 #include "runtime/object_p.h"
 #include "store/CSKavellAccountSettings_p.h"
 #include "store/collection_helpers.h"
@@ -51,6 +53,17 @@ struct CSKavellAccount : kavell::Object {
 };
 
 namespace kavell {
+
+/// Calls `body(service identifier, settings)` for each service of the account.
+template <typename Body> void forEachService(const CSKavellAccount &account, Body &&body)
+{
+    if (!account.services)
+        return;
+    account.services->forEach([&](CSKavellTypeRef serviceID, CSKavellTypeRef settings) {
+        body(static_cast<CSKavellStringRef>(serviceID),
+             const_cast<CSKavellAccountSettingsRef>(static_cast<const CSKavellAccountSettings *>(settings)));
+    });
+}
 
 /// The string as NUL-terminated UTF-8; none for none and for text that holds a NUL itself.
 [[nodiscard]] OwnedCString CreateUTF8CString(CSKavellStringRef string) noexcept;

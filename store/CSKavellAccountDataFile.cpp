@@ -1,0 +1,249 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+//
+// The data file of an account: reading it, saving pending changes over what it holds now, deleting it, and announcing
+// that. Everything here runs under the record's lock.
+//
+//     top level of the file    "UUID"             string
+//                              "AccountSettings"  dictionary, only when not empty
+//                              "Services"         dictionary of dictionaries, only when not empty
+//
+// One change's way:   commit -> re-read under the semaphore -> fold the pending changes in -> write under the semaphore
+//                     -> post. The two holds of the semaphore are separate, by contract: it orders whole reads and
+//                     writes, not the step from one to the other.
+
+#include <sys/stat.h>
+
+#include <kavellaccounts/CSKavellAccountConstants.h>
+#include <kavellaccounts/CSKavellNotification.h>
+#include <kavellaccounts/CSKavellType.h>
+
+#include "platform/file_semaphore.h"
+#include "platform/property_list.h"
+#include "runtime/string_p.h"
+#include "store/CSKavellAccount_p.h"
+#include "store/error_message.h"
+
+namespace kavell {
+
+namespace {
+
+constinit ConstantString uuidKey("UUID");
+constinit ConstantString accountSettingsKey("AccountSettings");
+constinit ConstantString servicesKey("Services");
+
+CSKavellDictionaryRef asDictionary(CSKavellTypeRef value) noexcept
+{
+    return cast<CSKavellDictionaryRef>(value, CSKavellDictionaryGetTypeID());
+}
+
+/// Queries the status of the data file; false, with errno, when it cannot be had. An account whose name cannot be a
+/// path has no file to query.
+bool queryStatus(const CSKavellAccount &account, struct stat &status) noexcept
+{
+    errno = EINVAL;
+    return account.dataFilePath && stat(account.dataFilePath.get(), &status) == 0;
+}
+
+FileTime modificationTime(const struct stat &status) noexcept
+{
+    return {status.st_mtim.tv_sec, status.st_mtim.tv_nsec};
+}
+
+/// Reads the whole file under the semaphore; Failed when the semaphore could not be taken.
+FileRead readUnderSemaphore(CSKavellAccount &account, const struct stat &status, std::string &contents) noexcept
+{
+    if (!LockDatafileAccess(account))
+        return FileRead::Failed;
+    // A pipe or a device would never end; only files hold accounts.
+    const FileRead result = S_ISREG(status.st_mode) ? readDataFile(account.dataFilePath.get(),
+                                                                   static_cast<size_t>(status.st_size), contents)
+                                                    : FileRead::Failed;
+    UnlockDatafileAccess(account);
+    return result;
+}
+
+void updateFromPropertyList(CSKavellAccount &account, CSKavellDictionaryRef propertyList) noexcept
+{
+    // A value of the wrong type counts as absent.
+    if (const auto uuidString =
+            cast<CSKavellStringRef>(GetDictValue(propertyList, &uuidKey.header), CSKavellStringGetTypeID()))
+        account.uuidString = retain(uuidString);
+    CSKavellAccountSettingsUpdateAttributes(account.accountSettings.get(),
+                                            asDictionary(GetDictValue(propertyList, &accountSettingsKey.header)));
+    UpdateServiceAttributes(account, asDictionary(GetDictValue(propertyList, &servicesKey.header)));
+}
+
+/// Gives one service its committed side out of the working copy, and takes it out of there.
+void UpdateServiceAttributesAux(CSKavellStringRef serviceID, CSKavellAccountSettingsRef settings,
+                                CSKavellMutableDictionaryRef working) noexcept
+{
+    CSKavellAccountSettingsUpdateAttributes(settings, asDictionary(GetDictValue(working, serviceID)));
+    CSKavellDictionaryRemoveValue(working, serviceID);
+}
+
+void dropServicesWithoutAttributes(CSKavellAccount &account) noexcept
+{
+    ArraySlot withoutAttributes;
+    forEachService(account, [&](CSKavellStringRef serviceID, CSKavellAccountSettingsRef settings) {
+        if (!CSKavellAccountSettingsHasAttributes(settings))
+            AddArrayValue(withoutAttributes, serviceID);
+    });
+    RemoveDictKeys(account.services, withoutAttributes.get());
+}
+
+/// Folds the pending changes of one attribute set in, and puts the result into the property list unless it is empty.
+void CommitChangesToPropList(CSKavellStringRef key, CSKavellAccountSettingsRef settings,
+                             DictionarySlot &target) noexcept
+{
+    CSKavellAccountSettingsCommitChanges(settings);
+    const auto attributes = adopt(CSKavellAccountSettingsCopyAttributes(settings));
+    if (CSKavellDictionaryGetCount(attributes.get()) > 0)
+        SetDictKey(target, key, attributes.get());
+}
+
+/// The account as its file shall hold it; none when it holds nothing.
+DictionarySlot makePropertyList(CSKavellAccount &account) noexcept
+{
+    DictionarySlot propertyList, services;
+    if (account.newUUIDString)
+        account.uuidString = std::move(account.newUUIDString);
+    SetDictKey(propertyList, &uuidKey.header, account.uuidString.get());
+    CommitChangesToPropList(&accountSettingsKey.header, account.accountSettings.get(), propertyList);
+    forEachService(account, [&](CSKavellStringRef serviceID, CSKavellAccountSettingsRef settings) {
+        CommitChangesToPropList(serviceID, settings, services);
+    });
+    SetDictKey(propertyList, &servicesKey.header, services.get());
+    return propertyList;
+}
+
+void NotifySendMsg(const CSKavellAccount &account) noexcept
+{
+    DictionarySlot userInformation;
+    SetDictKey(userInformation, kCSKavellAccountProviderName, account.providerType.get());
+    SetDictKey(userInformation, kCSKavellAccountUserLoginName, account.loginName.get());
+    CSKavellNotificationPost(kCSKavellAccountNotificationSender, kCSKavellAccountProviderSettingsChangedNotification,
+                             userInformation.get());
+}
+
+void deleteDataFile(const CSKavellAccount &account) noexcept
+{
+    if (removeDataFile(account.dataFilePath.get()))
+        NotifySendMsg(account);
+}
+
+/// Writes the file under the semaphore. When the semaphore cannot be taken nothing is written and nothing more is said.
+void writeUnderSemaphore(CSKavellAccount &account, std::string_view contents) noexcept
+{
+    if (!LockDatafileAccess(account))
+        return;
+    if (writeDataFile(account.dataFilePath.get(), contents, isPropertyList)) {
+        struct stat status;
+        if (queryStatus(account, status))
+            account.dataFileModTime = modificationTime(status);
+        account.hasChanges = false;
+    } else {
+        writeError("Error: failed to save Kavell Settings datafile\n");
+    }
+    UnlockDatafileAccess(account);
+}
+
+void saveDataFile(CSKavellAccount &account, CSKavellDictionaryRef propertyList) noexcept
+{
+    struct stat status;
+    if (account.dataFilePath && !queryStatus(account, status))
+        createDirectoriesAbove(account.dataFilePath.get());
+    std::string contents;
+    if (writePropertyList(propertyList, contents))
+        writeUnderSemaphore(account, contents);
+    else
+        writeError("Error: unable to create XML property list for Kavell Accounts settings - save failed\n");
+    // Announced after every attempt, also one that failed: observers reload, and find what there is.
+    NotifySendMsg(account);
+}
+
+}  // namespace
+
+bool ReadAccountData(CSKavellAccount &account) noexcept
+{
+    struct stat status;
+    if (!queryStatus(account, status)) {
+        const bool isMissing = errno == ENOENT;
+        // The number is the call's result, not the system's error; programs compare the line as it is.
+        if (!isMissing)
+            writeError("Error %d: failed to stat kavell account datafile\n", -1);
+        CSKavellAccountSettingsUpdateAttributes(account.accountSettings.get(), nullptr);
+        UpdateServiceAttributes(account, nullptr);
+        return isMissing;
+    }
+    // Only what this record has just written itself is known without reading.
+    if (modificationTime(status) == account.dataFileModTime)
+        return true;
+    std::string contents;
+    const FileRead result = readUnderSemaphore(account, status, contents);
+    if (result == FileRead::Failed)
+        return true;
+    const auto propertyList = result == FileRead::Done ? parsePropertyList(contents) : nullptr;
+    if (!propertyList) {
+        writeError("Error: failed to load Kavell Accounts settings\n");
+        return false;
+    }
+    updateFromPropertyList(account, propertyList.get());
+    return true;
+}
+
+void UpdateServiceAttributes(CSKavellAccount &account, CSKavellDictionaryRef fileServices) noexcept
+{
+    const DictionarySlot working =
+        fileServices ? adopt(CSKavellDictionaryCreateMutableCopy(fileServices)) : NewMutableDictionary();
+    forEachService(account, [&](CSKavellStringRef serviceID, CSKavellAccountSettingsRef settings) {
+        UpdateServiceAttributesAux(serviceID, settings, working.get());
+    });
+    if (working) {
+        working->forEach([&](CSKavellTypeRef serviceID, CSKavellTypeRef attributes) {
+            const auto settings = adopt(CSKavellAccountSettingsCreate(nullptr));
+            CSKavellAccountSettingsUpdateAttributes(settings.get(), asDictionary(attributes));
+            SetDictKey(account.services, serviceID, settings.get());
+        });
+    }
+    dropServicesWithoutAttributes(account);
+}
+
+bool LockDatafileAccess(CSKavellAccount &account) noexcept
+{
+    if (account.semaphoreID == 0) {
+        const auto semaphoreID = obtainFileSemaphore(account.dataFilePath.get());
+        if (!semaphoreID) {
+            writeError("Error: unable to initialize Kavell Accounts data semaphore\n");
+            return false;
+        }
+        account.semaphoreID = *semaphoreID;
+    }
+    return account.semaphoreID != 0 && takeFileSemaphore(account.semaphoreID);
+}
+
+void UnlockDatafileAccess(CSKavellAccount &account) noexcept
+{
+    // Programs compare this line too; it ends without a line feed.
+    if (account.semaphoreID != 0 && !giveFileSemaphore(account.semaphoreID))
+        writeError("Error %d: failed to release Kavell Accounts data lock", errno);
+}
+
+void commitAccount(CSKavellAccount &account) noexcept
+{
+    if (account.pendingRemove) {
+        deleteDataFile(account);
+        account.pendingRemove = false;
+        return;
+    }
+    if (!account.hasChanges)
+        return;
+    ReadAccountData(account);
+    const DictionarySlot propertyList = makePropertyList(account);
+    if (!propertyList)
+        deleteDataFile(account);
+    else
+        saveDataFile(account, propertyList.get());
+}
+
+}  // namespace kavell
