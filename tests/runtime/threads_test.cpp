@@ -1,0 +1,103 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+//
+// What many threads may do at once with the runtime. A program of its own, so that the types are not registered yet
+// when the threads ask for them.
+
+#include <array>
+#include <barrier>
+#include <thread>
+#include <vector>
+
+#include "tests/runtime/values.h"
+
+using namespace kavell;
+using namespace kavell::test;
+
+namespace {
+
+constexpr int kThreads = 16;
+
+/// Runs `body(index)` on all threads, which start together.
+template <typename Body> void onAllThreads(Body body)
+{
+    std::barrier start(kThreads);
+    std::vector<std::jthread> threads;
+    for (int index = 0; index < kThreads; ++index)
+        threads.emplace_back([&, index] {
+            start.arrive_and_wait();
+            body(index);
+        });
+}
+
+}  // namespace
+
+TEST(Threads, ATypeAskedForByAllAtOnceIsRegisteredOnce)
+{
+    using Identifiers = std::array<CSKavellTypeID, 5>;
+    std::array<Identifiers, kThreads> answers;
+    onAllThreads([&](int index) {
+        answers[static_cast<size_t>(index)] = {_CSKavellAccountGetTypeID(), _CSKavellAccountProviderGetTypeID(),
+                                               _CSKavellAccountSettingsGetTypeID(), CSKavellNotificationGetTypeID(),
+                                               CSKavellCofferelItemGetTypeID()};
+    });
+    for (const Identifiers &answer : answers)
+        EXPECT_EQ(answer, answers[0]);
+    EXPECT_STREQ(CSKavellTypeIDGetName(answers[0][0]), "CSKavellAccount");
+    EXPECT_STREQ(CSKavellTypeIDGetName(answers[0][1]), "CSKavellAccountProvider");
+    EXPECT_STREQ(CSKavellTypeIDGetName(answers[0][2]), "CSKavellAccountSettings");
+}
+
+TEST(Threads, RetainAndReleaseFromAllThreadsLoseNoReference)
+{
+    CountingAllocator allocator;
+    String shared = watchedText(allocator, "shared");
+    const CSKavellStringRef bare = shared.get();
+    onAllThreads([bare](int) {
+        for (int round = 0; round < 20000; ++round) {
+            CSKavellRetain(bare);
+            CSKavellRelease(bare);
+        }
+    });
+    EXPECT_EQ(allocator.deallocated(), 0);
+    EXPECT_EQ(toStringView(shared.get()), "shared");
+    shared = nullptr;
+    EXPECT_EQ(allocator.deallocated(), 1);
+}
+
+TEST(Threads, TheLastOfManyReleasesFreesAContainerOnce)
+{
+    CountingAllocator allocator;
+    for (int round = 0; round < 200; ++round) {
+        const CSKavellDictionaryRef pairs = dictionary({{"key", watchedText(allocator, "value")}}).leak();
+        for (int index = 1; index < kThreads; ++index)
+            CSKavellRetain(pairs);
+        onAllThreads([pairs](int) {
+            EXPECT_TRUE(CSKavellEqual(valueOf(pairs, "key"), text("value").get()));
+            CSKavellRelease(pairs);
+        });
+    }
+    EXPECT_EQ(allocator.deallocated(), 200);
+}
+
+TEST(Threads, ConstantsAndSharedStringsHashAlikeOnAllThreads)
+{
+    const String shared = text("com.corvane.account.mail");
+    const uint64_t expected = CSKavellHash(text("com.corvane.account.mail").get());
+    onAllThreads([&](int) {
+        EXPECT_EQ(CSKavellHash(shared.get()), expected);
+        EXPECT_EQ(CSKavellHash(kCSKavellAccountProviderMail), expected);
+        EXPECT_TRUE(CSKavellEqual(shared.get(), kCSKavellAccountProviderMail));
+    });
+}
+
+TEST(Threads, OneDictionaryIsReadByAllAtOnce)
+{
+    const auto pairs = adopt(CSKavellDictionaryCreateMutable());
+    for (int index = 0; index < 1000; ++index)
+        CSKavellDictionarySetValue(pairs.get(), text(std::to_string(index)).get(), integer(index).get());
+    onAllThreads([&](int) {
+        for (int index = 0; index < 1000; ++index)
+            ASSERT_TRUE(same(valueOf(pairs.get(), std::to_string(index)), integer(index).get()));
+    });
+}

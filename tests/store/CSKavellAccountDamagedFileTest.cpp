@@ -1,0 +1,288 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+//
+// Damaged and hostile data files: no crash, no hang, no account emptied, and no damaged file lost to a save.
+
+#include <fcntl.h>
+#include <functional>
+#include <regex>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include "tests/store/store_test.h"
+
+using namespace kavell;
+using namespace kavell::test;
+
+namespace {
+
+/// A record that has read a good file, whose file is then damaged.
+class DamagedFile : public StoreTest {
+protected:
+    DamagedFile()
+    {
+        writeFile(fileOf("ada"),
+                  accountFile("<key>a</key><integer>1</integer>",
+                              "<key>com.corvane.service.Mail</key><dict><key>port</key><integer>25</integer></dict>"));
+        m_account = openAccount("ada");
+    }
+
+    void expectUnchanged() const
+    {
+        EXPECT_TRUE(same(attributes(m_account), dictionary({{"a", integer(1)}})));
+        EXPECT_TRUE(
+            same(serviceAttributes(m_account, kCSKavellAccountServiceMail), dictionary({{"port", integer(25)}})));
+        EXPECT_EQ(uuidOf(m_account), kUUID);
+        EXPECT_FALSE(hasPendingChanges(m_account));
+    }
+
+    void expectRefused(std::string_view contents) const
+    {
+        writeFile(fileOf("ada"), contents);
+        StandardErrorCapture capture;
+        EXPECT_FALSE(CSKavellAccountLoadData(m_account.get()));
+        EXPECT_EQ(capture.take(), kLoadMessage);
+        expectUnchanged();
+    }
+
+    Account m_account;
+};
+
+std::string repeated(std::string_view part, int count)
+{
+    std::string whole;
+    for (int index = 0; index < count; ++index)
+        whole += part;
+    return whole;
+}
+
+}  // namespace
+
+TEST_F(DamagedFile, AnEmptyFileIsRefused)
+{
+    expectRefused("");
+}
+
+TEST_F(DamagedFile, TextThatIsNoPropertyListIsRefused)
+{
+    expectRefused("hello");
+    expectRefused("<html><body>no</body></html>");
+    expectRefused("{\"UUID\": \"json\"}");
+    expectRefused(std::string(100, ' '));
+}
+
+TEST_F(DamagedFile, BinaryGarbageIsRefused)
+{
+    std::string bytes;
+    uint32_t state = 1;
+    for (int index = 0; index < 5000; ++index) {
+        state = state * 1664525 + 1013904223;
+        bytes += static_cast<char>(state >> 24);
+    }
+    expectRefused(bytes);
+    expectRefused(std::string(4096, '\0'));
+}
+
+TEST_F(DamagedFile, AFileCutOffAtAnyByteIsRefused)
+{
+    const std::string whole = accountFile("<key>b</key><array><data>AAEC</data><true/></array>");
+    const size_t end = whole.find("</plist>") + 8;
+    for (size_t length = 0; length < end; ++length) {
+        SCOPED_TRACE(whole.substr(0, length));
+        expectRefused(std::string_view(whole).substr(0, length));
+        if (HasFailure())
+            return;
+    }
+}
+
+TEST_F(DamagedFile, BytesThatAreNotUTF8AreRefused)
+{
+    expectRefused(accountFile("<key>a</key><string>\xFF\xFE</string>"));
+    expectRefused(accountFile("<key>\xC0\xAF</key><string>a</string>"));
+}
+
+TEST_F(DamagedFile, AMillionLevelsAreRefused)
+{
+    expectRefused(propertyList("<key>AccountSettings</key>" + repeated("<array>", 1000000)));
+    expectRefused(repeated("<dict><key>a</key>", 1000000));
+    expectRefused(propertyList("<key>a</key>" + repeated("<array>", 1000000) + repeated("</array>", 1000000)));
+}
+
+TEST_F(DamagedFile, AnEntityThatGrowsWithoutBoundIsRefused)
+{
+    std::string entities = "<?xml version=\"1.0\"?>\n<!DOCTYPE plist [\n<!ENTITY a0 \"aaaaaaaaaa\">\n";
+    for (int level = 1; level < 12; ++level) {
+        const std::string reference = "&a" + std::to_string(level - 1) + ";";
+        entities += "<!ENTITY a" + std::to_string(level) + " \"" + repeated(reference, 10) + "\">\n";
+    }
+    expectRefused(entities + "]>\n<plist version=\"1.0\"><dict><key>UUID</key><string>&a11;</string></dict></plist>");
+}
+
+TEST_F(DamagedFile, AGigabyteIsRefusedWithoutReadingItAll)
+{
+    ASSERT_EQ(truncate(fileOf("ada").c_str(), off_t{1} << 30), 0);
+    StandardErrorCapture capture;
+    EXPECT_FALSE(CSKavellAccountLoadData(m_account.get()));
+    EXPECT_EQ(capture.take(), kLoadMessage);
+    expectUnchanged();
+}
+
+TEST_F(DamagedFile, ATopLevelThatIsNoDictionaryIsRefused)
+{
+    expectRefused("<?xml version=\"1.0\"?><plist version=\"1.0\"><array><string>a</string></array></plist>");
+    expectRefused("<?xml version=\"1.0\"?><plist version=\"1.0\"><string>a</string></plist>");
+    expectRefused("<?xml version=\"1.0\"?><plist version=\"1.0\"></plist>");
+}
+
+TEST_F(DamagedFile, ABinaryPropertyListNeitherCrashesNorEmptiesTheAccount)
+{
+    // {"UUID": "x"} in the binary form, with its offset table and trailer.
+    const std::string binary("bplist00\xD1\x01\x02TUUIDQx\x08\x0B\x10\0\0\0\0\0\0\x01\x01\0\0\0\0\0\0\0\x03"
+                             "\0\0\0\0\0\0\0\0\0\0\0\0\0\0\0\x12",
+                             8 + 3 + 5 + 2 + 3 + 32);
+    for (size_t length : {binary.size(), binary.size() - 1, size_t{8}}) {
+        writeFile(fileOf("ada"), std::string_view(binary).substr(0, length));
+        StandardErrorCapture capture;
+        const bool accepted = CSKavellAccountLoadData(m_account.get());
+        EXPECT_EQ(capture.take(), accepted ? "" : kLoadMessage);
+        if (!accepted)
+            expectUnchanged();
+    }
+}
+
+TEST_F(DamagedFile, ControlCharactersNeitherCrashNorEmptyTheAccount)
+{
+    writeFile(fileOf("ada"), accountFile("<key>a</key><string>x\x01y\x1Bz</string>"));
+    StandardErrorCapture capture;
+    if (CSKavellAccountLoadData(m_account.get())) {
+        EXPECT_EQ(capture.take(), "");
+        EXPECT_TRUE(same(attribute(m_account, "a"), text("x\x01y\x1Bz")));
+    } else {
+        EXPECT_EQ(capture.take(), kLoadMessage);
+        expectUnchanged();
+    }
+}
+
+TEST_F(DamagedFile, AWrongTypeOfServicesCountsAsAbsent)
+{
+    writeFile(fileOf("ada"), propertyList("<key>UUID</key><string>" + std::string(kUUID) +
+                                          "</string><key>AccountSettings</key><dict><key>b</key><true/></dict>"
+                                          "<key>Services</key><string>none</string>"));
+    StandardErrorCapture capture;
+    EXPECT_TRUE(CSKavellAccountLoadData(m_account.get()));
+    EXPECT_EQ(capture.take(), "");
+    EXPECT_TRUE(same(attributes(m_account), dictionary({{"b", boolean(true)}})));
+    EXPECT_EQ(ServiceForID(m_account.get(), kCSKavellAccountServiceMail, false), nullptr);
+}
+
+TEST_F(DamagedFile, AWrongTypeOfAccountSettingsCountsAsAbsent)
+{
+    writeFile(fileOf("ada"),
+              propertyList("<key>AccountSettings</key><array/><key>Services</key><dict>"
+                           "<key>com.corvane.service.LDAP</key><dict><key>b</key><true/></dict></dict>"));
+    StandardErrorCapture capture;
+    EXPECT_TRUE(CSKavellAccountLoadData(m_account.get()));
+    EXPECT_EQ(capture.take(), "");
+    EXPECT_EQ(CSKavellDictionaryGetCount(attributes(m_account).get()), 0u);
+    EXPECT_TRUE(same(serviceAttributes(m_account, kCSKavellAccountServiceLDAP), dictionary({{"b", boolean(true)}})));
+    EXPECT_EQ(uuidOf(m_account), kUUID);
+}
+
+TEST_F(DamagedFile, AWrongTypeOfUUIDCountsAsAbsent)
+{
+    writeFile(fileOf("ada"), propertyList("<key>UUID</key><integer>5</integer>"));
+    EXPECT_TRUE(CSKavellAccountLoadData(m_account.get()));
+    EXPECT_EQ(uuidOf(m_account), kUUID);
+    const Account fresh = openAccount("ada");
+    EXPECT_TRUE(hasPendingChanges(fresh));
+    EXPECT_EQ(uuidOf(fresh).size(), 36u);
+}
+
+TEST_F(DamagedFile, AWrongTypeOfOneServiceLeavesTheOthers)
+{
+    writeFile(fileOf("ada"), accountFile("", "<key>com.corvane.service.Mail</key><string>none</string>"
+                                             "<key>com.corvane.service.LDAP</key><dict><key>b</key><true/></dict>"
+                                             "<key>com.corvane.service.CalDAV</key><array/>"));
+    StandardErrorCapture capture;
+    EXPECT_TRUE(CSKavellAccountLoadData(m_account.get()));
+    EXPECT_EQ(capture.take(), "");
+    EXPECT_EQ(CSKavellDictionaryGetCount(serviceAttributes(m_account, kCSKavellAccountServiceMail).get()), 0u);
+    EXPECT_EQ(CSKavellDictionaryGetCount(serviceAttributes(m_account, kCSKavellAccountServiceCalDAV).get()), 0u);
+    EXPECT_TRUE(same(serviceAttributes(m_account, kCSKavellAccountServiceLDAP), dictionary({{"b", boolean(true)}})));
+}
+
+TEST_F(DamagedFile, ADirectoryInItsPlaceLeavesTheRecord)
+{
+    std::filesystem::remove(fileOf("ada"));
+    std::filesystem::create_directory(fileOf("ada"));
+    StandardErrorCapture capture;
+    EXPECT_TRUE(CSKavellAccountLoadData(m_account.get()));
+    EXPECT_EQ(capture.take(), "");
+    expectUnchanged();
+}
+
+TEST_F(DamagedFile, AFifoInItsPlaceNeitherHangsNorEmptiesTheRecord)
+{
+    std::filesystem::remove(fileOf("ada"));
+    ASSERT_EQ(mkfifo(fileOf("ada").c_str(), 0600), 0);
+    StandardErrorCapture capture;
+    const bool loaded = CSKavellAccountLoadData(m_account.get());
+    EXPECT_EQ(capture.take(), loaded ? "" : kLoadMessage);
+    expectUnchanged();
+    setAttribute(m_account, "b", integer(2));
+    commit(m_account);
+    EXPECT_EQ(capture.take(), kSaveMessage);
+    EXPECT_TRUE(hasPendingChanges(m_account));
+}
+
+TEST_F(DamagedFile, ADamagedFileAboutToBeReplacedIsKeptBesideIt)
+{
+    writeFile(fileOf("ada"), "damaged, but perhaps worth something");
+    setAttribute(m_account, "b", integer(2));
+    StandardErrorCapture capture;
+    commit(m_account);
+    EXPECT_EQ(capture.take(), kLoadMessage);
+    EXPECT_FALSE(hasPendingChanges(m_account));
+    const Names kept = entriesBeginningWith("damaged");
+    ASSERT_EQ(kept.size(), 1u);
+    EXPECT_TRUE(std::regex_match(kept[0], std::regex("damaged-[0-9a-f]{16}-[0-9]{8}T[0-9]{6}Z.*"))) << kept[0];
+    EXPECT_FALSE(kept[0].ends_with(".plist"));
+    EXPECT_EQ(readFile(providerDirectory() + "/" + kept[0]), "damaged, but perhaps worth something");
+    EXPECT_EQ(permissionsOf(providerDirectory() + "/" + kept[0]), 0600u);
+    // What the record last read well is still its committed side, and is saved with the change.
+    EXPECT_TRUE(same(attributes(openAccount("ada")), dictionary({{"a", integer(1)}, {"b", integer(2)}})));
+}
+
+TEST_F(DamagedFile, EachDamagedFileIsKeptForItself)
+{
+    for (int round = 0; round < 3; ++round) {
+        writeFile(fileOf("ada"), "damaged " + std::to_string(round));
+        setAttribute(m_account, "b", integer(round));
+        StandardErrorCapture capture;
+        commit(m_account);
+        EXPECT_EQ(capture.take(), kLoadMessage);
+    }
+    Names contents;
+    for (const std::string &name : entriesBeginningWith("damaged"))
+        contents.push_back(readFile(providerDirectory() + "/" + name));
+    std::sort(contents.begin(), contents.end());
+    EXPECT_EQ(contents, (Names{"damaged 0", "damaged 1", "damaged 2"}));
+}
+
+TEST_F(DamagedFile, AGoodFileIsNotKeptBesideItself)
+{
+    setAttribute(m_account, "b", integer(2));
+    commit(m_account);
+    EXPECT_EQ(entriesBeginningWith("damaged"), Names{});
+}
+
+TEST_F(DamagedFile, ADamagedFileOfANewRecordIsAnAccountOfItsOwn)
+{
+    writeFile(fileOf("ada"), "damaged");
+    StandardErrorCapture capture;
+    const Account account = openAccount("ada");
+    EXPECT_EQ(capture.take(), kLoadMessage);
+    EXPECT_TRUE(hasPendingChanges(account));
+    EXPECT_NE(uuidOf(account), kUUID);
+    EXPECT_EQ(CSKavellDictionaryGetCount(attributes(account).get()), 0u);
+}
