@@ -162,8 +162,7 @@ bool looksLikeType(std::string_view word)
         known.push_back(each.word);
     const std::string_view near = nearestWord(type, known);
     refuse("unknown type " + inQuotes(type) + " in " + inQuotes(word) +
-           (near.empty() ? "" : ", did you mean " + inQuotes(near) + "?") + (near.empty() ? "; " : " ") + "known are " +
-           joined(known, ", "));
+           (near.empty() ? "" : " (did you mean " + inQuotes(near) + "?)") + "; known are " + joined(known, ", "));
 }
 
 std::string dataText(std::string_view key, CSKavellDataRef data)

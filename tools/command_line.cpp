@@ -48,7 +48,7 @@ private:
 
 std::string sentenceOf(const CLI::ParseError &error, const Words &words)
 {
-    if (error.get_name() == "ExtrasError")
+    if (error.get_exit_code() == static_cast<int>(CLI::ExitCodes::ExtrasError))
         for (const std::string &word : words)
             if (word.size() > 1 && word.starts_with('-') &&
                 std::string_view(error.what()).find(word) != std::string_view::npos)

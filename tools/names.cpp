@@ -70,20 +70,26 @@ bool equalInAnyCase(std::string_view left, std::string_view right)
                       [](char one, char other) { return lowered(one) == lowered(other); });
 }
 
+/// How many letters have to be added, dropped, replaced or swapped with their neighbour (optimal string alignment).
 size_t editDistance(std::string_view from, std::string_view to)
 {
-    std::vector<size_t> row(to.size() + 1);
-    for (size_t column = 0; column < row.size(); ++column)
-        row[column] = column;
-    for (size_t line = 1; line <= from.size(); ++line) {
-        size_t diagonal = row[0]++;
-        for (size_t column = 1; column < row.size(); ++column) {
-            const size_t replaced = diagonal + (lowered(from[line - 1]) == lowered(to[column - 1]) ? 0 : 1);
-            diagonal = row[column];
-            row[column] = std::min({replaced, row[column] + 1, row[column - 1] + 1});
+    std::vector<std::vector<size_t>> distance(from.size() + 1, std::vector<size_t>(to.size() + 1));
+    for (size_t line = 0; line <= from.size(); ++line)
+        for (size_t column = 0; column <= to.size(); ++column) {
+            if (line == 0 || column == 0) {
+                distance[line][column] = line + column;
+                continue;
+            }
+            const auto same = [&](size_t one, size_t other) {
+                return lowered(from[one - 1]) == lowered(to[other - 1]);
+            };
+            const size_t replaced = distance[line - 1][column - 1] + (same(line, column) ? 0 : 1);
+            size_t best = std::min({replaced, distance[line - 1][column] + 1, distance[line][column - 1] + 1});
+            if (line > 1 && column > 1 && same(line, column - 1) && same(line - 1, column))
+                best = std::min(best, distance[line - 2][column - 2] + 1);
+            distance[line][column] = best;
         }
-    }
-    return row.back();
+    return distance.back().back();
 }
 
 /// Whether a word reads like a full name, such as "org.example.account.forum": parts that are not empty between dots.
@@ -110,9 +116,8 @@ std::string valueOf(std::string_view word, std::span<const ShortName> table, con
         return std::string(word);
     const std::vector<std::string_view> known = wordsOf(table);
     const std::string_view near = nearestWord(word, known);
-    refuse("unknown " + what + " " + inQuotes(word) + (near.empty() ? "" : ", did you mean " + inQuotes(near) + "?") +
-           (near.empty() ? "; " : " ") + "known are " + joined(known, ", ") + ", or a full name such as " +
-           std::string(table.front().value));
+    refuse("unknown " + what + " " + inQuotes(word) + (near.empty() ? "" : " (did you mean " + inQuotes(near) + "?)") +
+           "; known are " + joined(known, ", ") + ", or a full name such as " + std::string(table.front().value));
 }
 
 std::string_view shortOf(std::string_view value, std::span<const ShortName> table)
