@@ -19,6 +19,10 @@ namespace kavell {
 
 namespace {
 
+// Searches go by the application and never by the schema: gnome-keyring keeps hashes of a locked collection's
+// attributes to search by, but none of the schema.
+constexpr const char *kApplicationAttribute = "application";
+constexpr const char *kApplication = "com.corvane.KavellAccounts";
 constexpr const char *kSchemaAttribute = "xdg:schema";
 constexpr const char *kSchema = "com.corvane.KavellAccounts.Password";
 constexpr const char *kServiceAttribute = "service";
@@ -170,8 +174,7 @@ CredentialStatus SecretService::placeOf(const CredentialItem &item, const Deadli
     if (item.identifier.empty())
         return CredentialStatus::absent;
     std::vector<Place> places;
-    const CredentialStatus status =
-        search({{kSchemaAttribute, kSchema}, {kIdentifierAttribute, item.identifier}}, deadline, places);
+    const CredentialStatus status = search({{kIdentifierAttribute, item.identifier}}, deadline, places);
     if (status == CredentialStatus::stored)
         place = places.front();
     return status;
@@ -213,14 +216,15 @@ CredentialStatus SecretService::describe(const Place &place, const Deadline &dea
             identifier.clear();
     }
     item = {std::string(name()), identifier, attributes[kServiceAttribute], attributes[kAccountAttribute]};
-    return CredentialStatus::stored;
+    // A collection that was never unlocked keeps its attributes to itself.
+    return identifier.empty() && place.isLocked ? CredentialStatus::locked : CredentialStatus::stored;
 }
 
 CredentialStatus SecretService::findPlace(std::string_view serviceName, std::string_view accountName,
                                           const Deadline &deadline, Place &place, CredentialItem &item)
 {
     std::vector<Place> places;
-    CredentialStatus status = search({{kSchemaAttribute, kSchema},
+    CredentialStatus status = search({{kApplicationAttribute, kApplication},
                                       {kServiceAttribute, std::string(serviceName)},
                                       {kAccountAttribute, std::string(accountName)}},
                                      deadline, places);
@@ -244,19 +248,19 @@ CredentialStatus SecretService::resolve(std::string_view identifier, CredentialI
         return status;
     CredentialItem found;
     status = describe(place, deadline, found);
-    if (status != CredentialStatus::stored)
+    if (status != CredentialStatus::stored && status != CredentialStatus::locked)
         return status;
     item = found;
-    // A locked collection may keep its attributes to itself; the identifier is what was searched for.
+    // The item is there, even where its names cannot be read before it is unlocked.
     item.identifier = identifier;
-    return status;
+    return CredentialStatus::stored;
 }
 
 CredentialStatus SecretService::list(std::vector<CredentialItem> &items)
 {
     const Deadline deadline = credentialDeadline();
     std::vector<Place> places;
-    CredentialStatus status = search({{kSchemaAttribute, kSchema}}, deadline, places);
+    CredentialStatus status = search({{kApplicationAttribute, kApplication}}, deadline, places);
     if (status == CredentialStatus::absent)
         status = CredentialStatus::stored;
     if (status != CredentialStatus::stored)
@@ -292,6 +296,7 @@ CredentialStatus SecretService::add(std::string_view serviceName, std::string_vi
         if (found.identifier.empty())
             return CredentialStatus::failed;
         status = create({{kSchemaAttribute, kSchema},
+                         {kApplicationAttribute, kApplication},
                          {kServiceAttribute, found.serviceName},
                          {kAccountAttribute, found.accountName},
                          {kIdentifierAttribute, found.identifier}},

@@ -10,6 +10,8 @@ namespace kavell {
 namespace {
 
 constexpr const char *kServiceName = "org.freedesktop.secrets";
+constexpr const char *kBusInterface = "org.freedesktop.DBus";  // the bus's name and its interface
+constexpr const char *kBusPath = "/org/freedesktop/DBus";
 constexpr const char *kPromptInterface = "org.freedesktop.Secret.Prompt";
 
 struct ErrorMeaning {
@@ -122,9 +124,17 @@ CredentialStatus SecretServiceConnection::probe(const Deadline &deadline)
     if (const CredentialStatus status = connected(deadline, connection); status != CredentialStatus::stored)
         return status;
     OwnedError error;
-    const ServiceCall start{"/org/freedesktop/DBus", "org.freedesktop.DBus", "StartServiceByName",
-                            g_variant_new("(su)", kServiceName, 0U), "(u)"};
-    if (callBounded(connection.get(), start, deadline, error, "org.freedesktop.DBus"))
+    const ServiceCall ask{kBusPath, kBusInterface, "NameHasOwner", g_variant_new("(s)", kServiceName), "(b)"};
+    if (const OwnedVariant reply = callBounded(connection.get(), ask, deadline, error, kBusInterface)) {
+        gboolean isOwned = FALSE;
+        g_variant_get(reply.get(), "(b)", &isOwned);
+        if (isOwned)
+            return CredentialStatus::stored;
+    }
+    // Not running; the bus may know how to start it. It answers this only for services that it could start.
+    const ServiceCall start{kBusPath, kBusInterface, "StartServiceByName", g_variant_new("(su)", kServiceName, 0U),
+                            "(u)"};
+    if (callBounded(connection.get(), start, deadline, error, kBusInterface))
         return CredentialStatus::stored;
     // An answer, whatever its reason, says that there is no such service; silence says nothing.
     const OwnedText remote(g_dbus_error_get_remote_error(error.get()));

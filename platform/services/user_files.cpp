@@ -85,16 +85,16 @@ FileLock::FileLock(const std::string &name, const Deadline &deadline)
     m_state = !taken ? State::timedOut : error == 0 ? State::held : State::failed;
 }
 
-FileContents readWholeFile(const std::string &path, size_t most)
+StoredFile readWholeFile(const std::string &path, size_t most)
 {
     // Not blocking: what stands there may be a pipe.
     const Descriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK));
     if (!file)
-        return {errno == ENOENT ? FileContents::State::absent : FileContents::State::failed, {}};
+        return {errno == ENOENT ? StoredFile::State::absent : StoredFile::State::failed, {}};
     struct stat status {};
     if (fstat(file.get(), &status) != 0 || !S_ISREG(status.st_mode) || static_cast<size_t>(status.st_size) > most)
         return {};
-    FileContents contents{FileContents::State::read, std::string(static_cast<size_t>(status.st_size), '\0')};
+    StoredFile contents{StoredFile::State::read, std::string(static_cast<size_t>(status.st_size), '\0')};
     size_t done = 0;
     while (done < contents.bytes.size()) {
         const ssize_t count = ::read(file.get(), contents.bytes.data() + done, contents.bytes.size() - done);

@@ -63,14 +63,14 @@ private:
 };
 
 /// A file's contents, or why there are none.
-struct FileContents {
+struct StoredFile {
     enum class State { read, absent, failed };
     State state = State::failed;
     std::string bytes;
 };
 
 /// Reads a regular file of at most `most` bytes.
-[[nodiscard]] FileContents readWholeFile(const std::string &path, size_t most);
+[[nodiscard]] StoredFile readWholeFile(const std::string &path, size_t most);
 
 /// Replaces a file in the credential directory so that a crash at any moment leaves the old or the new one, readable by
 /// its owner only. For holders of the lock that guards it; false leaves the old file as it was.

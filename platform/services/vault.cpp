@@ -54,13 +54,13 @@ std::string makeIdentifier()
 }
 
 /// Reads the file and its header: stored, absent when there is no file, failed when it is not a vault.
-CredentialStatus readFile(FileContents &file, VaultHeader &header)
+CredentialStatus readFile(StoredFile &file, VaultHeader &header)
 {
     file = readWholeFile(credentialDirectory() + "/" + kFileName, kLargestVault);
-    if (file.state == FileContents::State::absent)
+    if (file.state == StoredFile::State::absent)
         return CredentialStatus::absent;
-    return file.state == FileContents::State::read && readVaultHeader(file.bytes, header) ? CredentialStatus::stored
-                                                                                          : CredentialStatus::failed;
+    return file.state == StoredFile::State::read && readVaultHeader(file.bytes, header) ? CredentialStatus::stored
+                                                                                        : CredentialStatus::failed;
 }
 
 bool write(const OpenVault &vault)
@@ -162,7 +162,7 @@ CredentialStatus Vault::open(OpenVault &vault)
 {
     if (sodium_init() < 0)
         return CredentialStatus::failed;
-    FileContents file;
+    StoredFile file;
     if (const CredentialStatus status = readFile(file, vault.header); status != CredentialStatus::stored)
         return status;
     if (const CredentialStatus status = m_key.find(vault.header, vault.key); status != CredentialStatus::stored)
@@ -261,7 +261,7 @@ CredentialStatus Vault::createOrOpen(const Deadline &deadline)
     const FileLock lock(kLockName, credentialDeadline());
     if (lock.state() != FileLock::State::held)
         return lock.state() == FileLock::State::timedOut ? CredentialStatus::unreachable : CredentialStatus::failed;
-    FileContents file;
+    StoredFile file;
     OpenVault vault;
     CredentialStatus status = readFile(file, vault.header);
     // Another process was quicker; its vault is opened with the passphrase given here, or not at all.
@@ -281,7 +281,7 @@ CredentialStatus Vault::unlock(const CredentialItem *)
     std::unique_lock asking(m_asking, std::defer_lock);
     if (!waitUntil(deadline, [&] { return asking.try_lock(); }))
         return CredentialStatus::locked;
-    FileContents file;
+    StoredFile file;
     OpenVault vault;
     const CredentialStatus status = readFile(file, vault.header);
     if (status == CredentialStatus::absent)
