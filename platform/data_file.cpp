@@ -10,6 +10,7 @@
 #include <cstdio>
 #include <ctime>
 #include <fcntl.h>
+#include <optional>
 #include <sys/file.h>
 #include <sys/stat.h>
 #include <thread>
@@ -34,12 +35,12 @@ constexpr int kMostAttempts = 16;
 /// caller has just taken, unless their records found different ones.
 bool lockFile(int file) noexcept
 {
+    if (flock(file, LOCK_EX | LOCK_NB) == 0)
+        return true;
     const auto deadline = std::chrono::steady_clock::now() + kLongestFlockWait;
     auto pause = std::chrono::microseconds(50);
     while (flock(file, LOCK_EX | LOCK_NB) != 0) {
-        if (errno != EWOULDBLOCK && errno != EINTR)
-            return false;
-        if (std::chrono::steady_clock::now() > deadline)
+        if ((errno != EWOULDBLOCK && errno != EINTR) || std::chrono::steady_clock::now() > deadline)
             return false;
         std::this_thread::sleep_for(pause);
         pause = std::min(pause * 2, std::chrono::microseconds(5000));
@@ -72,8 +73,7 @@ bool syncData(int file) noexcept
 
 /// A redo record that was found, read and judged.
 struct FoundRecord {
-    std::string bytes;
-    std::string_view newContents;
+    std::string newContents;
     RedoVerdict verdict = RedoVerdict::Discard;
 };
 
@@ -81,18 +81,16 @@ struct FoundRecord {
 std::optional<FoundRecord> findRecord(int file, const std::string &recordPath)
 {
     const FileDescriptor record(open(recordPath.c_str(), O_RDONLY | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK));
-    FoundRecord found;
-    if (!record || !readWhole(record.get(), 0, kLargestRedoRecord, found.bytes))
-        return std::nullopt;
-    const auto decoded = decodeRedoRecord(found.bytes);
+    FileContents bytes, contents;
     struct stat status;
-    std::string contents;
-    if (!decoded || fstat(file, &status) != 0)
-        return found;
-    if (!readWhole(file, static_cast<size_t>(status.st_size), kLargestDataFile, contents))
+    if (!record || !bytes.read(record.get(), kLargestRedoRecord) || !contents.read(file, kLargestDataFile) ||
+        fstat(file, &status) != 0)
         return std::nullopt;
-    found.newContents = decoded->newContents;
-    found.verdict = judgeRedoRecord(*decoded, status.st_ino, contents);
+    FoundRecord found;
+    if (const auto decoded = decodeRedoRecord(bytes.view())) {
+        found.verdict = judgeRedoRecord(*decoded, status.st_ino, contents.view());
+        found.newContents = decoded->newContents;
+    }
     return found;
 }
 
@@ -149,10 +147,11 @@ bool replaceInPlace(int file, const char *path, std::string_view contents, Intac
 {
     const std::string recordPath = siblingPath(path, kRedoRecordPrefix);
     struct stat status;
-    std::string oldContents;
+    FileContents old;
     if (!settleRecord(file, recordPath) || fstat(file, &status) != 0 || !S_ISREG(status.st_mode) ||
-        !readWhole(file, static_cast<size_t>(status.st_size), kLargestDataFile, oldContents))
+        !old.read(file, kLargestDataFile))
         return false;
+    const std::string_view oldContents = old.view();
     RedoRecord record;
     record.inode = status.st_ino;
     record.newContents = contents;
@@ -214,39 +213,41 @@ bool wasUnlinked(int file) noexcept
 }
 
 /// The contents of a file that has a redo record, settling the record where this process may write.
-FileRead readWithRecord(const char *path, const std::string &recordPath, std::string &contents)
+FileRead readWithRecord(const char *path, const std::string &recordPath, FileContents &contents)
 {
     if (const FileDescriptor writable = openLocked(path, O_RDWR); writable) {
         if (!settleRecord(writable.get(), recordPath))
             return FileRead::Failed;
-        return readWhole(writable.get(), 0, kLargestDataFile, contents) ? FileRead::Done : FileRead::Failed;
+        return contents.read(writable.get(), kLargestDataFile) ? FileRead::Done : FileRead::Failed;
     }
     const FileDescriptor file = openLocked(path, O_RDONLY);
     if (!file)
         return FileRead::Failed;
     const auto found = findRecord(file.get(), recordPath);
     if (found && found->verdict == RedoVerdict::Finish) {
-        contents = found->newContents;
+        contents.assign(found->newContents);
         return FileRead::Done;
     }
-    return readWhole(file.get(), 0, kLargestDataFile, contents) ? FileRead::Done : FileRead::Failed;
+    return contents.read(file.get(), kLargestDataFile) ? FileRead::Done : FileRead::Failed;
 }
 
 }  // namespace
 
 std::string siblingPath(std::string_view path, std::string_view prefix)
 {
+    constexpr char kDigits[] = "0123456789abcdef";
     const size_t nameStart = path.rfind('/') + 1;
-    std::array<char, 17> hash;
-    std::snprintf(hash.data(), hash.size(), "%016llx",
-                  static_cast<unsigned long long>(checksumOf(path.substr(nameStart))));
+    const uint64_t hash = checksumOf(path.substr(nameStart));
     std::string sibling;
-    sibling.reserve(nameStart + prefix.size() + hash.size() + 32);
-    sibling.append(path.substr(0, nameStart)).append(prefix).append(hash.data(), hash.size() - 1);
+    // Room for what callers append.
+    sibling.reserve(nameStart + prefix.size() + 48);
+    sibling.append(path.substr(0, nameStart)).append(prefix);
+    for (int shift = 60; shift >= 0; shift -= 4)
+        sibling += kDigits[(hash >> shift) & 15];
     return sibling;
 }
 
-FileRead readDataFile(const char *path, size_t expectedSize, std::string &contents) noexcept
+FileRead readDataFile(const char *path, FileContents &contents) noexcept
 {
     return guarded(FileRead::Failed, [&] {
         FileDescriptor file = openLocked(path, O_RDONLY);
@@ -258,10 +259,9 @@ FileRead readDataFile(const char *path, size_t expectedSize, std::string &conten
             file = FileDescriptor();
             result = readWithRecord(path, recordPath, contents);
         } else {
-            result =
-                readWhole(file.get(), expectedSize, kLargestDataFile, contents) ? FileRead::Done : FileRead::Failed;
+            result = contents.read(file.get(), kLargestDataFile) ? FileRead::Done : FileRead::Failed;
         }
-        return result == FileRead::Done && contents.size() > kLargestDataFile ? FileRead::TooLarge : result;
+        return result == FileRead::Done && contents.view().size() > kLargestDataFile ? FileRead::TooLarge : result;
     });
 }
 

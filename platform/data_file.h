@@ -17,6 +17,8 @@
 #include <string>
 #include <string_view>
 
+#include "platform/file_io.h"
+
 namespace kavell {
 
 /// A file's modification time.
@@ -37,8 +39,7 @@ enum class FileRead {
 };
 
 /// Reads a whole regular file into `contents`, after finishing a replacement that somebody could not finish.
-/// `expectedSize` is a hint.
-[[nodiscard]] FileRead readDataFile(const char *path, size_t expectedSize, std::string &contents) noexcept;
+[[nodiscard]] FileRead readDataFile(const char *path, FileContents &contents) noexcept;
 
 /// Says whether bytes are what this kind of file should hold.
 using IntactCheck = bool (*)(std::string_view contents) noexcept;

@@ -21,23 +21,44 @@ bool writeWhole(int descriptor, std::string_view bytes, off_t offset) noexcept
     return true;
 }
 
-bool readWhole(int descriptor, size_t expectedSize, size_t limit, std::string &contents)
+namespace {
+
+ssize_t readAt(int descriptor, char *bytes, size_t length, size_t offset) noexcept
 {
-    // One byte more than expected: a read that leaves room has seen the end of a regular file.
-    contents.resize(std::min(std::max<size_t>(expectedSize, 4095), limit) + 1);
-    for (size_t length = 0;;) {
-        const ssize_t count = withoutInterruption([&] {
-            return pread(descriptor, contents.data() + length, contents.size() - length, static_cast<off_t>(length));
-        });
+    return withoutInterruption([&] { return pread(descriptor, bytes, length, static_cast<off_t>(offset)); });
+}
+
+}  // namespace
+
+bool FileContents::read(int descriptor, size_t limit)
+{
+    m_large.clear();
+    const ssize_t first = readAt(descriptor, m_small.data(), m_small.size(), 0);
+    if (first < 0)
+        return false;
+    m_smallLength = static_cast<size_t>(first);
+    // A read of a regular file that leaves room has seen its end.
+    if (m_smallLength < m_small.size())
+        return true;
+    m_large.assign(m_small.data(), m_small.size());
+    for (size_t length = m_large.size(); length <= limit;) {
+        m_large.resize(length * 2);
+        const ssize_t count = readAt(descriptor, m_large.data() + length, length, length);
         if (count < 0)
             return false;
+        const bool isEnd = static_cast<size_t>(count) < length;
         length += static_cast<size_t>(count);
-        if (length < contents.size() || length > limit) {
-            contents.resize(length);
-            return true;
-        }
-        contents.resize(std::min(contents.size() * 2, limit + 1));
+        m_large.resize(length);
+        if (isEnd)
+            break;
     }
+    return true;
+}
+
+void FileContents::assign(std::string_view bytes)
+{
+    m_large.assign(bytes);
+    m_smallLength = 0;
 }
 
 bool syncDirectoryOf(const char *path) noexcept

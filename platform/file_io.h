@@ -6,6 +6,7 @@
 #ifndef KAVELL_PLATFORM_FILE_IO_H
 #define KAVELL_PLATFORM_FILE_IO_H
 
+#include <array>
 #include <cerrno>
 #include <string>
 #include <string_view>
@@ -50,9 +51,25 @@ template <typename Call> auto withoutInterruption(Call &&call) noexcept
 /// Writes all bytes at an offset; false, with errno, when that fails part way.
 [[nodiscard]] bool writeWhole(int descriptor, std::string_view bytes, off_t offset = 0) noexcept;
 
-/// Reads from the start to the end of the file, at most `limit` bytes; false, with errno, on failure. A file that is
-/// longer gives `limit` + 1 bytes. `expectedSize` is a hint that saves a system call.
-[[nodiscard]] bool readWhole(int descriptor, size_t expectedSize, size_t limit, std::string &contents);
+/// The contents of a file in memory. A small file, as nearly all are, takes no memory from the heap.
+class FileContents {
+public:
+    /// Reads from the start to the end of the file; false, with errno, on failure. Of a file longer than `limit` it
+    /// reads just more than that.
+    [[nodiscard]] bool read(int descriptor, size_t limit);
+
+    void assign(std::string_view bytes);
+
+    [[nodiscard]] std::string_view view() const noexcept
+    {
+        return m_large.empty() ? std::string_view(m_small.data(), m_smallLength) : std::string_view(m_large);
+    }
+
+private:
+    std::array<char, 8192> m_small;
+    size_t m_smallLength = 0;
+    std::string m_large;  ///< instead of m_small, when it is not empty
+};
 
 /// Makes names created, renamed and deleted in the directory of a path durable.
 [[nodiscard]] bool syncDirectoryOf(const char *path) noexcept;

@@ -51,14 +51,13 @@ FileTime modificationTime(const struct stat &status) noexcept
 }
 
 /// Reads the whole file under the semaphore; Failed when the semaphore could not be taken.
-FileRead readUnderSemaphore(CSKavellAccount &account, const struct stat &status, std::string &contents) noexcept
+FileRead readUnderSemaphore(CSKavellAccount &account, const struct stat &status, FileContents &contents) noexcept
 {
     if (!LockDatafileAccess(account))
         return FileRead::Failed;
     // A pipe or a device would never end; only files hold accounts.
-    const FileRead result = S_ISREG(status.st_mode) ? readDataFile(account.dataFilePath.get(),
-                                                                   static_cast<size_t>(status.st_size), contents)
-                                                    : FileRead::Failed;
+    const FileRead result =
+        S_ISREG(status.st_mode) ? readDataFile(account.dataFilePath.get(), contents) : FileRead::Failed;
     UnlockDatafileAccess(account);
     return result;
 }
@@ -69,8 +68,9 @@ void updateFromPropertyList(CSKavellAccount &account, CSKavellDictionaryRef prop
     if (const auto uuidString =
             cast<CSKavellStringRef>(GetDictValue(propertyList, &uuidKey.header), CSKavellStringGetTypeID()))
         account.uuidString = retain(uuidString);
-    CSKavellAccountSettingsUpdateAttributes(account.accountSettings.get(),
-                                            asDictionary(GetDictValue(propertyList, &accountSettingsKey.header)));
+    // The property list was just made for this, and is let go after it: its dictionaries need no copying.
+    TakeAttributes(*account.accountSettings.get(),
+                   asDictionary(GetDictValue(propertyList, &accountSettingsKey.header)));
     UpdateServiceAttributes(account, asDictionary(GetDictValue(propertyList, &servicesKey.header)));
 }
 
@@ -78,7 +78,7 @@ void updateFromPropertyList(CSKavellAccount &account, CSKavellDictionaryRef prop
 void UpdateServiceAttributesAux(CSKavellStringRef serviceID, CSKavellAccountSettingsRef settings,
                                 CSKavellMutableDictionaryRef working) noexcept
 {
-    CSKavellAccountSettingsUpdateAttributes(settings, asDictionary(GetDictValue(working, serviceID)));
+    TakeAttributes(*settings, asDictionary(GetDictValue(working, serviceID)));
     CSKavellDictionaryRemoveValue(working, serviceID);
 }
 
@@ -179,11 +179,11 @@ bool ReadAccountData(CSKavellAccount &account) noexcept
     // Only what this record has just written itself is known without reading.
     if (modificationTime(status) == account.dataFileModTime)
         return true;
-    std::string contents;
+    FileContents contents;
     const FileRead result = readUnderSemaphore(account, status, contents);
     if (result == FileRead::Failed)
         return true;
-    const auto propertyList = result == FileRead::Done ? parsePropertyList(contents) : nullptr;
+    const auto propertyList = result == FileRead::Done ? parsePropertyList(contents.view()) : nullptr;
     if (!propertyList) {
         writeError("Error: failed to load Kavell Accounts settings\n");
         return false;
@@ -202,7 +202,9 @@ void UpdateServiceAttributes(CSKavellAccount &account, CSKavellDictionaryRef fil
     if (working) {
         working->forEach([&](CSKavellTypeRef serviceID, CSKavellTypeRef attributes) {
             const auto settings = adopt(CSKavellAccountSettingsCreate(nullptr));
-            CSKavellAccountSettingsUpdateAttributes(settings.get(), asDictionary(attributes));
+            if (!settings)
+                return;
+            TakeAttributes(*settings.get(), asDictionary(attributes));
             SetDictKey(account.services, serviceID, settings.get());
         });
     }

@@ -5,6 +5,8 @@
 
 #include <kavellaccounts/CSKavellType.h>
 
+#include "runtime/dictionary_p.h"
+
 using namespace kavell;
 
 namespace {
@@ -162,4 +164,12 @@ void CSKavellAccountSettingsUpdateAttributes(CSKavellAccountSettingsRef settings
 {
     if (settings)
         settings->attributes = adopt(CSKavellDictionaryCreateMutableCopy(attributes));
+}
+
+void kavell::TakeAttributes(CSKavellAccountSettings &settings, CSKavellDictionaryRef attributes) noexcept
+{
+    if (attributes && (attributes->flags & kObjectIsMutable))
+        settings.attributes = retain(const_cast<CSKavellMutableDictionaryRef>(attributes));
+    else
+        CSKavellAccountSettingsUpdateAttributes(&settings, attributes);
 }

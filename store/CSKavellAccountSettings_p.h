@@ -20,4 +20,12 @@ struct CSKavellAccountSettings : kavell::Object {
     kavell::ArraySlot removedKeys{};
 };
 
+namespace kavell {
+
+/// CSKavellAccountSettingsUpdateAttributes for a dictionary that nobody else will use again: it is taken over instead
+/// of copied.
+void TakeAttributes(CSKavellAccountSettings &settings, CSKavellDictionaryRef attributes) noexcept;
+
+}  // namespace kavell
+
 #endif

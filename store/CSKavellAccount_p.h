@@ -74,7 +74,8 @@ template <typename Body> void forEachService(const CSKavellAccount &account, Bod
 /// Brings the committed side up to what the data file says. False on a real error, after its message.
 bool ReadAccountData(CSKavellAccount &account) noexcept;
 
-/// Replaces the committed side of every service by what the file's "Services" dictionary (may be none) says.
+/// Replaces the committed side of every service by what the file's "Services" dictionary (may be none) says, taking its
+/// dictionaries over.
 void UpdateServiceAttributes(CSKavellAccount &account, CSKavellDictionaryRef fileServices) noexcept;
 
 /// Takes the semaphore of the data file, waiting for as long as it takes; false when it cannot be taken.
