@@ -9,11 +9,47 @@
 #include "tests/platform/credential_fixture.h"
 
 #include <csignal>
+#include <gio/gio.h>
 #include <kavellaccounts/Ref.h>
+#include <stdexcept>
 
 namespace kavell::test {
 
 namespace {
+
+/// The test's own connection to its bus.
+class BusClient {
+public:
+    BusClient()
+    {
+        GError *error = nullptr;
+        m_connection = g_dbus_connection_new_for_address_sync(
+            std::getenv("DBUS_SESSION_BUS_ADDRESS"),
+            static_cast<GDBusConnectionFlags>(G_DBUS_CONNECTION_FLAGS_AUTHENTICATION_CLIENT |
+                                              G_DBUS_CONNECTION_FLAGS_MESSAGE_BUS_CONNECTION),
+            nullptr, nullptr, &error);
+        if (!m_connection)
+            throw std::runtime_error(error->message);
+    }
+    ~BusClient() { g_clear_object(&m_connection); }
+    BusClient(const BusClient &) = delete;
+    BusClient &operator=(const BusClient &) = delete;
+
+    [[nodiscard]] GDBusConnection *get() const { return m_connection; }
+
+    /// Returns once the bus has dealt with all that was sent before.
+    void settle()
+    {
+        GVariant *reply = g_dbus_connection_call_sync(m_connection, "org.freedesktop.DBus", "/org/freedesktop/DBus",
+                                                      "org.freedesktop.DBus", "GetId", nullptr, nullptr,
+                                                      G_DBUS_CALL_FLAGS_NONE, 5000, nullptr, nullptr);
+        ASSERT_NE(reply, nullptr);
+        g_variant_unref(reply);
+    }
+
+private:
+    GDBusConnection *m_connection = nullptr;
+};
 
 /// Takes the signals of this library off the test's bus.
 class Subscriber {
@@ -25,8 +61,7 @@ public:
                                                             "Posted", "/com/corvane/KavellAccounts", nullptr,
                                                             G_DBUS_SIGNAL_FLAGS_NONE, received, this, nullptr);
         g_main_context_pop_thread_default(m_context);
-        // The bus has taken the subscription once it answers what was asked after it.
-        EXPECT_TRUE(m_client.waitForOwner("org.freedesktop.DBus"));
+        m_client.settle();
     }
     ~Subscriber()
     {

@@ -11,10 +11,8 @@
 #include <cstdlib>
 #include <fcntl.h>
 #include <filesystem>
-#include <gio/gio.h>
 #include <gtest/gtest.h>
 #include <memory>
-#include <stdexcept>
 #include <string>
 #include <sys/mman.h>
 #include <sys/stat.h>
@@ -101,53 +99,26 @@ private:
     std::unique_ptr<ChildProcess> m_daemon;
 };
 
-/// The test's own connection to its bus.
-class BusClient {
-public:
-    BusClient()
-    {
-        GError *error = nullptr;
-        m_connection = g_dbus_connection_new_for_address_sync(
-            std::getenv("DBUS_SESSION_BUS_ADDRESS"),
-            static_cast<GDBusConnectionFlags>(G_DBUS_CONNECTION_FLAGS_AUTHENTICATION_CLIENT |
-                                              G_DBUS_CONNECTION_FLAGS_MESSAGE_BUS_CONNECTION),
-            nullptr, nullptr, &error);
-        if (!m_connection)
-            throw std::runtime_error(error->message);
+/// Calls a method on the test's bus; its reply as dbus-send prints it, or nothing.
+inline std::string callOnBus(const std::string &name, const std::string &path, const std::string &method,
+                             const std::string &argument)
+{
+    const ProgramResult result =
+        runProgram({"dbus-send", "--print-reply=literal", "--dest=" + name, path, method, argument});
+    return result.status == 0 ? result.output : "";
+}
+
+/// Waits until somebody owns the name.
+inline bool waitForOwner(const std::string &name)
+{
+    for (const Stopwatch watch; watch.elapsed() < 10s;) {
+        const std::string reply = callOnBus("org.freedesktop.DBus", "/org/freedesktop/DBus",
+                                            "org.freedesktop.DBus.NameHasOwner", "string:" + name);
+        if (reply.find("boolean true") != std::string::npos)
+            return true;
     }
-    ~BusClient() { g_clear_object(&m_connection); }
-    BusClient(const BusClient &) = delete;
-    BusClient &operator=(const BusClient &) = delete;
-
-    [[nodiscard]] GDBusConnection *get() const { return m_connection; }
-
-    /// The reply (the caller unrefs it), or null.
-    GVariant *call(const char *name, const char *path, const char *interface, const char *method, GVariant *arguments)
-    {
-        return g_dbus_connection_call_sync(m_connection, name, path, interface, method, arguments, nullptr,
-                                           G_DBUS_CALL_FLAGS_NONE, 5000, nullptr, nullptr);
-    }
-
-    /// Waits until somebody owns the name.
-    [[nodiscard]] bool waitForOwner(const char *name)
-    {
-        for (const Stopwatch watch; watch.elapsed() < 10s;) {
-            GVariant *reply = call("org.freedesktop.DBus", "/org/freedesktop/DBus", "org.freedesktop.DBus",
-                                   "NameHasOwner", g_variant_new("(s)", name));
-            gboolean isOwned = FALSE;
-            if (reply) {
-                g_variant_get(reply, "(b)", &isOwned);
-                g_variant_unref(reply);
-            }
-            if (isOwned)
-                return true;
-        }
-        return false;
-    }
-
-private:
-    GDBusConnection *m_connection = nullptr;
-};
+    return false;
+}
 
 /// A real keyring daemon, unlocked with the password "keyring password", or left locked.
 class Keyring {
@@ -162,7 +133,7 @@ public:
         m_daemon = std::make_unique<ChildProcess>(words, std::vector<std::string>{}, input, nothing, nothing);
         close(input);
         close(nothing);
-        EXPECT_TRUE(BusClient().waitForOwner("org.freedesktop.secrets"));
+        EXPECT_TRUE(waitForOwner("org.freedesktop.secrets"));
     }
 
     void signal(int number) const { m_daemon->signal(number); }
@@ -176,13 +147,10 @@ public:
     /// Locks the default collection, as a desktop does when the user asks for it.
     static void lock()
     {
-        BusClient client;
-        const char *const paths[] = {"/org/freedesktop/secrets/aliases/default"};
-        GVariant *reply =
-            client.call("org.freedesktop.secrets", "/org/freedesktop/secrets", "org.freedesktop.Secret.Service", "Lock",
-                        g_variant_new("(@ao)", g_variant_new_objv(paths, 1)));
-        ASSERT_NE(reply, nullptr);
-        g_variant_unref(reply);
+        EXPECT_NE(callOnBus("org.freedesktop.secrets", "/org/freedesktop/secrets",
+                            "org.freedesktop.Secret.Service.Lock",
+                            "array:objpath:/org/freedesktop/secrets/aliases/default"),
+                  "");
     }
 
 private:
