@@ -276,6 +276,7 @@ TEST_F(CSKavellAccountDataFileTest, AStatusThatCannotBeHadIsReportedWithTheCalls
 
 TEST_F(CSKavellAccountDataFileTest, ALoginNameTooLongForTheFileSystemIsReportedAndCannotBeSaved)
 {
+    std::filesystem::create_directories(providerDirectory());
     StandardErrorCapture capture;
     const Account account = openAccount(std::string(300, 'x'));
     ASSERT_TRUE(account);
