@@ -1,0 +1,27 @@
+# SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+# SPDX-License-Identifier: LGPL-2.1-or-later
+#
+# Compiles each public header alone, as C11 (but for the C++ face) and as C++20, with every warning an error, so that a
+# client may include any one of them first. Run by ctest: cmake -DINCLUDE=… -DC_COMPILER=… -DCXX_COMPILER=… -P.
+
+file(GLOB headers RELATIVE "${INCLUDE}" "${INCLUDE}/kavellaccounts/*.h")
+list(LENGTH headers count)
+if(count LESS 18)
+    message(FATAL_ERROR "found only ${count} headers in ${INCLUDE}")
+endif()
+
+function(compile_alone header)
+    execute_process(COMMAND ${ARGN} -Wall -Wextra -Wpedantic -Werror -fsyntax-only "-I${INCLUDE}" -include "${header}" -
+                    INPUT_FILE /dev/null RESULT_VARIABLE status ERROR_VARIABLE complaint)
+    if(NOT status EQUAL 0)
+        message(SEND_ERROR "${header} does not stand alone (${ARGN}):\n${complaint}")
+    endif()
+endfunction()
+
+foreach(header IN LISTS headers)
+    if(NOT header STREQUAL "kavellaccounts/Ref.h")
+        compile_alone("${header}" "${C_COMPILER}" -x c -std=c11)
+    endif()
+    compile_alone("${header}" "${CXX_COMPILER}" -x c++ -std=c++20)
+endforeach()
+message(STATUS "${count} headers stand alone")
