@@ -28,13 +28,36 @@ std::string unguarded(const std::string &word)
     return word.starts_with(bracketGuard) && word.substr(1, 1) == "[" ? word.substr(1) : word;
 }
 
+constexpr size_t helpWidth = 80;
+
+/// The sentences in lines of at most helpWidth columns.
+std::string wrapped(std::string_view sentences)
+{
+    std::string text;
+    size_t width = 0;
+    while (!sentences.empty()) {
+        const std::string_view word = sentences.substr(0, sentences.find(' '));
+        sentences.remove_prefix(std::min(word.size() + 1, sentences.size()));
+        const bool fits = width == 0 || width + 1 + word.size() <= helpWidth;
+        text += width == 0 ? "" : fits ? " " : "\n";
+        width = fits && width > 0 ? width + 1 + word.size() : word.size();
+        text += word;
+    }
+    return text;
+}
+
 class HelpFormatter : public CLI::Formatter {
 public:
     explicit HelpFormatter(std::string usage) : m_usage(std::move(usage)) { column_width(28); }
 
     std::string make_usage(const CLI::App *, std::string) const override
     {
-        return bold("Usage:") + " " + m_usage + "\n";
+        return "\n" + bold("Usage:") + " " + m_usage + "\n";
+    }
+    std::string make_group(std::string group, bool positional, std::vector<const CLI::Option *> options) const override
+    {
+        const std::string text = CLI::Formatter::make_group(group, positional, options);
+        return "\n" + bold(group + ":") + text.substr(std::min(text.size(), group.size() + 2));
     }
     std::string make_positionals(const CLI::App *) const override { return {}; }
     std::string make_option_opts(const CLI::Option *option) const override
@@ -62,7 +85,7 @@ std::string sentenceOf(const CLI::ParseError &error, const Words &words)
 }  // namespace
 
 CommandLine::CommandLine(const CommandHelp &help)
-    : m_help(help), m_app(help.purpose, std::string("kavell-accounts ") + help.name)
+    : m_help(help), m_app(wrapped(help.purpose), std::string("kavell-accounts ") + help.name)
 {
     const std::string usage =
         "kavell-accounts " + std::string(help.name) + " " + help.usage + (*help.usage ? " " : "") + "[OPTION...]";
@@ -97,10 +120,7 @@ void CommandLine::addNumber(const std::string &names, std::optional<double> &tar
 
 void CommandLine::addServices()
 {
-    m_serviceOption = m_app
-                          .add_option("-s,--service", m_rawServices,
-                                      "The service whose attributes the words after it mean, such as CalDAV; without "
-                                      "it they are the account's own")
+    m_serviceOption = m_app.add_option("-s,--service", m_rawServices, "The service that the words after it are for")
                           ->type_name("SERVICE")
                           ->expected(1)
                           ->allow_extra_args(false)

@@ -201,7 +201,8 @@ void checkName(std::string_view name, std::string_view what)
     const std::string problem = nameProblem(name);
     if (problem.empty())
         return;
-    const std::string subject = name.empty() || name.size() > longestName ? std::string() : std::string(" ").append(inQuotes(name));
+    const std::string subject =
+        name.empty() || name.size() > longestName ? std::string() : std::string(" ").append(inQuotes(name));
     refuse("the " + std::string(what) + subject + " " + problem + "; it becomes a file's name, so choose another");
 }
 

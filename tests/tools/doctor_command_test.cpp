@@ -130,7 +130,7 @@ TEST_F(DoctorCommand, WakesThoseWhoWaitAndLetsThemInOneByOne)
     holder.killIt();
     std::vector<std::unique_ptr<ChildProcess>> waiting;
     for (int number = 0; number < 8; ++number)
-        waiting.push_back(std::make_unique<ChildProcess>([this, number] {
+        waiting.push_back(std::make_unique<ChildProcess>([number] {
             return client({"set", "google", "anna", "k" + std::to_string(number) + "=v"}).status;
         }));
     ASSERT_TRUE(awaitWaiters(m_path, 8));
