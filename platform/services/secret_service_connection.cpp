@@ -52,8 +52,19 @@ CredentialStatus statusOf(const GError *error)
 struct Completion {
     bool isDone = false;
     bool isDismissed = false;
+    bool isServiceGone = false;
     OwnedVariant result;
 };
+
+void serviceOwnerChanged(GDBusConnection *, const gchar *, const gchar *, const gchar *, const gchar *,
+                         GVariant *parameters, gpointer data)
+{
+    const char *owner = nullptr;
+    if (g_variant_is_of_type(parameters, G_VARIANT_TYPE("(sss)")))
+        g_variant_get(parameters, "(&s&s&s)", nullptr, nullptr, &owner);
+    if (owner && !*owner)
+        static_cast<Completion *>(data)->isServiceGone = true;
+}
 
 void promptCompleted(GDBusConnection *, const gchar *, const gchar *, const gchar *, const gchar *,
                      GVariant *parameters, gpointer data)
@@ -209,20 +220,25 @@ CredentialStatus SecretServiceConnection::prompt(const std::string &path, const 
     const guint subscription =
         g_dbus_connection_signal_subscribe(connection.get(), kServiceName, kPromptInterface, "Completed", path.c_str(),
                                            nullptr, G_DBUS_SIGNAL_FLAGS_NONE, promptCompleted, &completion, nullptr);
+    const guint ownerSubscription = g_dbus_connection_signal_subscribe(
+        connection.get(), kBusInterface, kBusInterface, "NameOwnerChanged", kBusPath, kServiceName,
+        G_DBUS_SIGNAL_FLAGS_NONE, serviceOwnerChanged, &completion, nullptr);
     OwnedError error;
     const ServiceCall show{path.c_str(), kPromptInterface, "Prompt", g_variant_new("(s)", ""), "()"};
     // Showing the prompt is a question like any other; only the user gets the long bound.
     const OwnedVariant shown = callBounded(connection.get(), show, credentialDeadline(), error);
-    const bool isDone = shown && runUntil(context, deadline, [&] {
-                            return completion.isDone || g_dbus_connection_is_closed(connection.get());
-                        });
+    const bool isOver =
+        shown && runUntil(context, deadline, [&] {
+            return completion.isDone || completion.isServiceGone || g_dbus_connection_is_closed(connection.get());
+        });
     g_dbus_connection_signal_unsubscribe(connection.get(), subscription);
-    // The unsubscribed signal may still be on its way to this context, which must outlive it no more than `completion`.
+    g_dbus_connection_signal_unsubscribe(connection.get(), ownerSubscription);
+    // A signal that was on its way is thrown away here, before `completion` goes.
     while (g_main_context_iteration(context.get(), FALSE)) {
     }
     if (!shown)
         return statusOf(error.get());
-    if (!isDone) {
+    if (!isOver) {
         drop(connection);
         return CredentialStatus::locked;
     }

@@ -64,8 +64,10 @@ bool isForkedFromBusUser()
 
 bool runUntil(const PrivateContext &context, const Deadline &deadline, const std::function<bool()> &done)
 {
-    // The timer only wakes the loop; time is judged by the deadline.
-    GSource *timer = g_timeout_source_new(static_cast<guint>(deadline.remaining()) + 1);
+    // The timer only wakes the loop, now and then, because not all that ends a wait arrives in this context: a
+    // connection tells the context that it was made in when it is closed.
+    constexpr int kWakingInterval = 50;
+    GSource *timer = g_timeout_source_new(static_cast<guint>(std::min(deadline.remaining() + 1, kWakingInterval)));
     g_source_set_callback(
         timer, [](gpointer) -> gboolean { return G_SOURCE_CONTINUE; }, nullptr, nullptr);
     g_source_attach(timer, context.get());

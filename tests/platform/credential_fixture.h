@@ -8,6 +8,7 @@
 #define KAVELL_TESTS_PLATFORM_CREDENTIAL_FIXTURE_H
 
 #include <chrono>
+#include <csignal>
 #include <cstdlib>
 #include <fcntl.h>
 #include <filesystem>
@@ -88,6 +89,8 @@ public:
     ~PrivateBus() { unsetenv("DBUS_SESSION_BUS_ADDRESS"); }
 
     void signal(int number) const { m_daemon->signal(number); }
+
+    [[nodiscard]] pid_t pid() const { return m_daemon->pid(); }
 
     void kill()
     {
