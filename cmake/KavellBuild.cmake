@@ -17,6 +17,10 @@ if(KAVELL_SANITIZE)
     target_link_options(kavell_options INTERFACE -fsanitize=${KAVELL_SANITIZE})
 endif()
 
+if(KAVELL_BUILD_FUZZERS)
+    target_compile_options(kavell_options INTERFACE -fsanitize=fuzzer-no-link)
+endif()
+
 # kavell_add_test(NAME SOURCES file… [LIBRARIES target…] [TIMEOUT seconds] [LABELS label…] [SHARED])
 #
 # A GoogleTest program, run by ctest in a scratch home with its own XDG directories, session bus and IPC namespace. It is

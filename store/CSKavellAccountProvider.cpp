@@ -64,7 +64,7 @@ constinit const TypeOperations providerOperations{
     .hash = addressHash,
 };
 
-constinit LazyType providerType(providerOperations);
+constinit LazyType providerRecordType(providerOperations);
 
 void appendAccount(CSKavellAccountProvider &provider, CSKavellAccountRef account, CSKavellStringRef loginName) noexcept
 {
@@ -138,7 +138,7 @@ void CSKavellAccountProviderLoadAccountData(CSKavellAccountProvider &provider)
 
 CSKavellTypeID _CSKavellAccountProviderGetTypeID(void)
 {
-    return ::providerType.typeID();
+    return providerRecordType.typeID();
 }
 
 CSKavellAccountProviderRef _CSKavellAccountProviderCreate(const CSKavellAllocator *allocator,
@@ -148,7 +148,7 @@ CSKavellAccountProviderRef _CSKavellAccountProviderCreate(const CSKavellAllocato
         writeError("Error: No service provider specified in CSKavellAccountProviderCreate\n");
         return nullptr;
     }
-    auto provider = adopt(makeObject<CSKavellAccountProvider>(allocator, ::providerType.typeID(), 0));
+    auto provider = adopt(makeObject<CSKavellAccountProvider>(allocator, providerRecordType.typeID(), 0));
     if (!provider)
         return nullptr;
     return guarded(CSKavellAccountProviderRef{}, [&]() -> CSKavellAccountProviderRef {
