@@ -95,10 +95,10 @@ TEST_F(Processes, AReaderNeverSeesATornFileWhileAWriterGrowsAndShrinksIt)
     RunningProbe writer({"resize", "ada", "1500"});
     StandardErrorCapture capture;
     const std::string uuid = uuidOf(account);
-    int64_t seen = 0, changes = 0;
+    int64_t changes = 0;
     std::optional<int64_t> last;
     // The pipe's other end closes when the writer ends.
-    for (bool isRunning = true; isRunning; ++seen) {
+    for (bool isRunning = true; isRunning;) {
         ASSERT_TRUE(CSKavellAccountLoadData(account.get())) << capture.take();
         ASSERT_EQ(uuidOf(account), uuid);
         const Value length = attribute(account, "length"), value = attribute(account, "text");
