@@ -12,6 +12,7 @@
 #include <string>
 
 #include <gio/gio.h>
+#include <unistd.h>
 
 namespace {
 
@@ -44,7 +45,7 @@ void askerGone(GDBusConnection *, const char *, const char *, const char *, cons
     const char *newOwner = nullptr;
     g_variant_get(parameters, "(&s&s&s)", &name, nullptr, &newOwner);
     if (static_cast<std::string *>(asker)->compare(name) == 0 && !*newOwner)
-        std::exit(4);
+        _exit(4);
 }
 
 void complete(GDBusConnection *connection, const char *asker, bool isDismissed)
@@ -61,7 +62,7 @@ void endDuringPrompt()
     if (bus > 1)
         kill(bus, SIGKILL);
     else
-        std::exit(0);
+        _exit(0);
 }
 
 void called(GDBusConnection *connection, const char *sender, const char *, const char *, const char *method, GVariant *,
@@ -74,7 +75,7 @@ void called(GDBusConnection *connection, const char *sender, const char *, const
         return g_dbus_method_invocation_return_value(invocation,
                                                      g_variant_new("(@aoo)", g_variant_new_objv(nullptr, 0), kPrompt));
     if (name == "Dismiss")
-        std::exit(3);
+        _exit(3);
     static std::string asker;
     asker = sender;
     g_dbus_connection_signal_subscribe(connection, "org.freedesktop.DBus", "org.freedesktop.DBus", "NameOwnerChanged",
