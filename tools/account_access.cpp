@@ -138,6 +138,12 @@ bool isOnDisk(const Address &address)
     return lstat(dataFileOf(address).c_str(), &status) == 0;
 }
 
+bool isRegularFile(const Address &address)
+{
+    struct stat status;
+    return stat(dataFileOf(address).c_str(), &status) == 0 && S_ISREG(status.st_mode);
+}
+
 OpenedAccount openAccount(const Address &address)
 {
     const std::string path = dataFileOf(address);
@@ -155,7 +161,8 @@ OpenedAccount openAccount(const Address &address)
     // There is a file, but no UUID came from it. That is no error of a readable file; only reading it again tells.
     const QuietStandardError quiet;
     opened.existed = true;
-    opened.readable = access(path.c_str(), R_OK) == 0 && CSKavellAccountLoadData(opened.record.get());
+    opened.readable =
+        isRegularFile(address) && access(path.c_str(), R_OK) == 0 && CSKavellAccountLoadData(opened.record.get());
     return opened;
 }
 

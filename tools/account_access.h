@@ -44,7 +44,11 @@ struct Address {
 /// because the store cannot name it.
 [[nodiscard]] std::vector<Address> accountsOnDisk(const std::optional<std::string> &providerType = std::nullopt);
 
+/// Whether something stands in the data file's place.
 [[nodiscard]] bool isOnDisk(const Address &address);
+
+/// Whether it is a file, and no directory or device.
+[[nodiscard]] bool isRegularFile(const Address &address);
 
 /// An account opened through the store.
 struct OpenedAccount {

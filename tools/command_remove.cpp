@@ -4,6 +4,7 @@
 // kavell-accounts remove: deletes an account and then its password. The password goes last, so that an account that
 // could not be removed still has it.
 
+#include <filesystem>
 #include <unistd.h>
 
 #include "tools/account_json.h"
@@ -67,6 +68,8 @@ ExitCode runRemove(const Words &words)
     line.expectNoMore();
     if (!isOnDisk(address))
         (void)openExisting(address);  // fails with the sentence for a missing account
+    if (std::filesystem::is_directory(dataFileOf(address)))
+        throw Failure(ExitCode::Failed, escaped(dataFileOf(address)) + " is a directory and no account; move it away");
     if (!yes)
         requireAgreement(address);
     const OpenedAccount account = openAccount(address);

@@ -18,7 +18,7 @@ namespace {
 constexpr size_t longestName = 249;
 
 // The values are written out here because three provider types (quillane, aol, haldenserver) have no constant in the
-// store; a test holds the others against the store's constants.
+// store.
 constexpr std::array<ShortName, 13> providerTable{{
     {"yahoo", "com.corvane.account.yahoo"},
     {"google", "com.corvane.account.google"},

@@ -17,19 +17,22 @@ namespace kavell::tools {
 
 namespace {
 
+/// A semaphore that changes hands faster than it can be looked at so many times is in order.
+constexpr int attempts = 100;
+
 /// A pid of 0 belongs to a process in another pid namespace, of which nothing can be known.
 bool isDead(pid_t process)
 {
     return process > 0 && kill(process, 0) != 0 && errno == ESRCH;
 }
 
-SemaphoreState stateOf(int value, pid_t lastOperator)
+SemaphoreState stateOf(int value, bool operatorIsDead)
 {
     if (value > 1)
         return SemaphoreState::AdmitsSeveral;
     if (value == 1)
         return SemaphoreState::Free;
-    return isDead(lastOperator) ? SemaphoreState::HeldByDead : SemaphoreState::Held;
+    return operatorIsDead ? SemaphoreState::HeldByDead : SemaphoreState::Held;
 }
 
 /// Steps into the dead holder's place and gives the semaphore back as that holder would have. The first operation waits
@@ -56,12 +59,18 @@ bool takeSurplus(int id, int value)
 
 std::optional<SemaphoreReport> inspectSemaphoreSet(int id)
 {
-    // The pid is read before the value: a holder that gives back in between leaves the value 1, which is "free".
-    const int lastOperator = semctl(id, 0, GETPID);
-    const int value = lastOperator < 0 ? -1 : semctl(id, 0, GETVAL);
-    if (value < 0)
-        return std::nullopt;
-    return SemaphoreReport{id, stateOf(value, lastOperator), value, lastOperator};
+    // The order counts: a process that was dead before the value was read, and is the last operator after that, has not
+    // given the semaphore back, and nobody else has touched it since.
+    for (int attempt = 0; attempt < attempts; ++attempt) {
+        const pid_t lastOperator = semctl(id, 0, GETPID);
+        const bool operatorIsDead = isDead(lastOperator);
+        const int value = semctl(id, 0, GETVAL);
+        if (lastOperator < 0 || value < 0)
+            return std::nullopt;
+        if (semctl(id, 0, GETPID) == lastOperator)
+            return SemaphoreReport{id, stateOf(value, operatorIsDead), value, lastOperator};
+    }
+    return SemaphoreReport{id, SemaphoreState::Free, 1, 0};
 }
 
 std::optional<SemaphoreReport> inspectSemaphore(const std::string &path)
@@ -83,9 +92,7 @@ bool repairSemaphore(const SemaphoreReport &report, const std::string &lockDirec
         return false;
     if (before->state == SemaphoreState::AdmitsSeveral)
         return takeSurplus(report.id, before->value);
-    // The dead holder must still be the last operator after the value was seen to be 0.
-    const bool unchanged = semctl(report.id, 0, GETPID) == report.lastOperator;
-    return before->state == SemaphoreState::HeldByDead && unchanged && takeOverAndGive(report.id);
+    return before->state == SemaphoreState::HeldByDead && takeOverAndGive(report.id);
 }
 
 }  // namespace kavell::tools

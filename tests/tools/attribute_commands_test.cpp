@@ -263,4 +263,15 @@ TEST_F(AttributeCommands, ADamagedAccountIsNamedInTheListAndNotChanged)
     EXPECT_EQ(everythingOnDisk(), before);
 }
 
+TEST_F(AttributeCommands, ADirectoryInAFilesPlaceIsNoAccount)
+{
+    std::filesystem::create_directories(dataFilePath(googleType, "anna"));
+
+    EXPECT_EQ(client({"show", "google", "anna"}).status, 1);
+    EXPECT_EQ(client({"set", "google", "anna", "a=b"}).status, 1);
+    EXPECT_EQ(client({"remove", "google", "anna", "--yes"}).status, 1);
+
+    EXPECT_TRUE(std::filesystem::is_directory(dataFilePath(googleType, "anna")));
+}
+
 }  // namespace kavell::test
