@@ -97,7 +97,7 @@ TEST_F(Processes, AReaderNeverSeesATornFileWhileAWriterGrowsAndShrinksIt)
     const std::string uuid = uuidOf(account);
     int64_t changes = 0;
     std::optional<int64_t> last;
-    // The pipe's other end closes when the writer ends.
+    // Until the last save of the writer is seen.
     for (bool isRunning = true; isRunning;) {
         ASSERT_TRUE(CSKavellAccountLoadData(account.get())) << capture.take();
         ASSERT_EQ(uuidOf(account), uuid);
