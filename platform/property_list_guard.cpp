@@ -121,7 +121,8 @@ public:
             if (!passMarkup())
                 return false;
         }
-        return true;
+        // The parser would make do with a file that was cut off; here it must have been closed to its last element.
+        return m_sawElement && m_depth == 0;
     }
 
 private:
