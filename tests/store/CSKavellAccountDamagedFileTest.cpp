@@ -5,9 +5,10 @@
 
 #include <fcntl.h>
 #include <functional>
-#include <regex>
 #include <sys/stat.h>
 #include <unistd.h>
+
+#include <gmock/gmock.h>
 
 #include "tests/store/store_test.h"
 
@@ -245,7 +246,7 @@ TEST_F(DamagedFile, ADamagedFileAboutToBeReplacedIsKeptBesideIt)
     EXPECT_FALSE(hasPendingChanges(m_account));
     const Names kept = entriesBeginningWith("damaged");
     ASSERT_EQ(kept.size(), 1u);
-    EXPECT_TRUE(std::regex_match(kept[0], std::regex("damaged-[0-9a-f]{16}-[0-9]{8}T[0-9]{6}Z.*"))) << kept[0];
+    EXPECT_THAT(kept[0], testing::MatchesRegex("damaged-[0-9a-f]{16}-[0-9]{8}T[0-9]{6}Z.*"));
     EXPECT_FALSE(kept[0].ends_with(".plist"));
     EXPECT_EQ(readFile(providerDirectory() + "/" + kept[0]), "damaged, but perhaps worth something");
     EXPECT_EQ(permissionsOf(providerDirectory() + "/" + kept[0]), 0600u);
