@@ -45,7 +45,7 @@ sockaddr_un addressIn(int directory, const char *name) noexcept
 {
     sockaddr_un address{};
     address.sun_family = AF_UNIX;
-    std::snprintf(address.sun_path, sizeof address.sun_path, "/proc/self/fd/%d/%s", directory, name);
+    std::snprintf(address.sun_path, sizeof address.sun_path, "/proc/self/fd/%d/%.70s", directory, name);
     return address;
 }
 

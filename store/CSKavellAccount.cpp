@@ -206,6 +206,20 @@ CSKavellURLRef _CSKavellAccountCopyBaseURL(CSKavellAccountRef)
     return guarded(CSKavellURLRef{}, [] { return CSKavellURLCreateWithFileSystemPath(dataRootPath().c_str(), true); });
 }
 
+CSKavellArrayRef _CSKavellAccountCopyServiceIDs(CSKavellAccountRef account)
+{
+    if (!account)
+        return nullptr;
+    const Guard guard(account->lock);
+    ArraySlot serviceIDs = NewMutableArray();
+    forEachService(*account, [&](CSKavellStringRef serviceID, CSKavellAccountSettingsRef settings) {
+        const auto attributes = adopt(CSKavellAccountSettingsCopyAttributes(settings));
+        if (CSKavellDictionaryGetCount(attributes.get()) > 0)
+            AddArrayValue(serviceIDs, serviceID);
+    });
+    return serviceIDs.leak();
+}
+
 CSKavellDictionaryRef _CSKavellAccountCopyServiceAttributes(CSKavellAccountRef account, CSKavellStringRef serviceID)
 {
     if (!account)

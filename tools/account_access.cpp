@@ -205,4 +205,15 @@ Ref<CSKavellDictionaryRef> ownAttributes(CSKavellAccountRef account)
     return own;
 }
 
+std::vector<std::string> serviceIdentifiers(const OpenedAccount &account)
+{
+    const auto serviceIDs = adopt(_CSKavellAccountCopyServiceIDs(account.record.get()));
+    std::vector<std::string> identifiers;
+    for (size_t index = 0; index < CSKavellArrayGetCount(serviceIDs.get()); ++index) {
+        CSKavellTypeRef serviceID = CSKavellArrayGetValueAtIndex(serviceIDs.get(), index);
+        identifiers.push_back(toStdString(cast<CSKavellStringRef>(serviceID, CSKavellStringGetTypeID())));
+    }
+    return identifiers;
+}
+
 }  // namespace kavell::tools

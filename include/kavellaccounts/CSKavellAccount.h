@@ -14,6 +14,7 @@
 #define KAVELLACCOUNTS_CSKAVELLACCOUNT_H
 
 #include <kavellaccounts/CSKavellAccountSettings.h>
+#include <kavellaccounts/CSKavellArray.h>
 #include <kavellaccounts/CSKavellBase.h>
 #include <kavellaccounts/CSKavellCofferel.h>
 #include <kavellaccounts/CSKavellDictionary.h>
@@ -62,6 +63,10 @@ CSKAVELL_EXPORT CSKavellURLRef _CSKavellAccountCopyBaseURL(CSKavellAccountRef ac
 
 /// @name Attributes of a service, or of the account itself for a service identifier of none
 /// @{
+
+/// The identifiers of the services that have effective attributes (caller owns), pending ones included; empty when there
+/// are none.
+CSKAVELL_EXPORT CSKavellArrayRef _CSKavellAccountCopyServiceIDs(CSKavellAccountRef account) CSKAVELL_NODISCARD;
 
 /// All effective attributes (caller owns), empty when there are none.
 CSKAVELL_EXPORT CSKavellDictionaryRef

@@ -351,16 +351,6 @@ TEST_F(AccountSemaphore, WithoutASetNothingIsReadOrWrittenAndEachAttemptIsReport
     EXPECT_EQ(readFile(fileOf("ada")), before);
 }
 
-TEST_F(AccountSemaphore, TheIdentifierZeroIsKeptOutOfTheWayInAFreshNamespace)
-{
-    // This program's library has taken identifier 0 out of the way already, in its own namespace and only there: a
-    // program of its own has not.
-    const ProgramResult result = runProgram({"/proc/self/exe", "--gtest_also_run_disabled_tests",
-                                             "--gtest_filter=AccountSemaphoreInAFreshNamespace.DISABLED_*"});
-    EXPECT_EQ(result.status, 0) << result.output << result.error;
-    EXPECT_NE(result.output.find("[  PASSED  ] 1 test."), std::string::npos) << result.output;
-}
-
 TEST_F(AccountSemaphore, ASetWithTheIdentifierZeroIsNeverUsed)
 {
     const std::string before = readFile(fileOf("ada"));
@@ -380,22 +370,4 @@ TEST_F(AccountSemaphore, ASetWithTheIdentifierZeroIsNeverUsed)
         EXPECT_EQ(valueOf(set), 1);
     });
     EXPECT_EQ(readFile(fileOf("ada")), before);
-}
-
-namespace {
-
-using AccountSemaphoreInAFreshNamespace = StoreTest;
-
-}
-
-// Run by the test above in a process that has not used the library yet.
-TEST_F(AccountSemaphoreInAFreshNamespace, DISABLED_TheFirstSetOfAFileIsNotZero)
-{
-    if (!enterFreshNamespace())
-        GTEST_SKIP() << "no IPC namespace can be made here";
-    writeFile(fileOf("ada"), accountFile("<key>a</key><integer>1</integer>"));
-    const Account account = openAccount("ada");
-    EXPECT_TRUE(same(attribute(account, "a"), integer(1)));
-    EXPECT_GT(setOfFile(fileOf("ada")), 0);
-    EXPECT_EQ(valueOf(setOfFile(fileOf("ada"))), 1);
 }
