@@ -291,9 +291,12 @@ bool removeDataFile(const char *path) noexcept
     if (!path)
         return false;
     return guarded(false, [&] {
-        // Not while somebody is in the middle of replacing it, if that can be helped.
-        const FileDescriptor file = openLocked(path, O_RDONLY);
-        unlink(siblingPath(path, kRedoRecordPrefix).c_str());
+        // Not while somebody is in the middle of replacing it, if that can be helped. A record that somebody left is
+        // settled, not only deleted: a power cut may undo the deletion of the file and keep that of the record.
+        const std::string recordPath = siblingPath(path, kRedoRecordPrefix);
+        const FileDescriptor file = openLocked(path, hasRecord(recordPath) ? O_RDWR : O_RDONLY);
+        if (hasRecord(recordPath) && (!file || !settleRecord(file.get(), recordPath)))
+            unlink(recordPath.c_str());
         if (std::remove(path) != 0)
             return false;
         // The file is gone for every program; that a power cut may bring it back is no failure of the removal.
