@@ -48,7 +48,8 @@ function(kavell_register_test name)
     if(NOT ARG_LABELS)
         set(ARG_LABELS unit)
     endif()
+    # The thread sanitizer's own exits: forked children of threaded tests may start threads, and no test waits a second to end.
     add_test(NAME ${name} COMMAND "${PROJECT_SOURCE_DIR}/tests/support/run_isolated" ${ARG_COMMAND})
     set_tests_properties(${name} PROPERTIES TIMEOUT "${ARG_TIMEOUT}" LABELS "${ARG_LABELS}" ENVIRONMENT
-        "KAVELL_SOURCE_DIR=${PROJECT_SOURCE_DIR};KAVELL_BUILD_DIR=${PROJECT_BINARY_DIR};TSAN_OPTIONS=halt_on_error=1 suppressions=${PROJECT_SOURCE_DIR}/tests/support/tsan.supp")
+        "KAVELL_SOURCE_DIR=${PROJECT_SOURCE_DIR};KAVELL_BUILD_DIR=${PROJECT_BINARY_DIR};TSAN_OPTIONS=halt_on_error=1 die_after_fork=0 atexit_sleep_ms=20 suppressions=${PROJECT_SOURCE_DIR}/tests/support/tsan.supp")
 endfunction()
