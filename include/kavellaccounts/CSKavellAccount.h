@@ -64,8 +64,8 @@ CSKAVELL_EXPORT CSKavellURLRef _CSKavellAccountCopyBaseURL(CSKavellAccountRef ac
 /// @name Attributes of a service, or of the account itself for a service identifier of none
 /// @{
 
-/// The identifiers of the services that have effective attributes (caller owns), pending ones included; empty when there
-/// are none.
+/// The identifiers of the services that have effective attributes (caller owns), pending ones included; empty when
+/// there are none.
 CSKAVELL_EXPORT CSKavellArrayRef _CSKavellAccountCopyServiceIDs(CSKavellAccountRef account) CSKAVELL_NODISCARD;
 
 /// All effective attributes (caller owns), empty when there are none.

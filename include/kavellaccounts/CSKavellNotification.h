@@ -35,10 +35,10 @@ typedef struct CSKavellNotificationObserver *CSKavellNotificationObserverRef;
 CSKAVELL_EXPORT CSKavellTypeID CSKavellNotificationGetTypeID(void);
 CSKAVELL_EXPORT CSKavellTypeID CSKavellNotificationObserverGetTypeID(void);
 
-/// Posts a notification; `object` and `userInformation` (property-list values only) may be none. Whether it was handed to
-/// every observer: one that is stopped with thousands of notifications waiting is given up on, and a notification whose
-/// written form is larger than 64 KiB is handed to nobody. Blocks for at most 100 milliseconds. The session bus, where
-/// one stands, gets a copy later, as the signal "Posted" (name, object, information) of the interface
+/// Posts a notification; `object` and `userInformation` (property-list values only) may be none. Whether it was handed
+/// to every observer: one that is stopped with thousands of notifications waiting is given up on, and a notification
+/// whose written form is larger than 64 KiB is handed to nobody. Blocks for at most 100 milliseconds. The session bus,
+/// where one stands, gets a copy later, as the signal "Posted" (name, object, information) of the interface
 /// "com.corvane.KavellAccounts" at "/com/corvane/KavellAccounts".
 CSKAVELL_EXPORT bool CSKavellNotificationPost(CSKavellStringRef name, CSKavellStringRef object,
                                               CSKavellDictionaryRef userInformation);
