@@ -215,7 +215,7 @@ CSKavellArrayRef _CSKavellAccountCopyServiceIDs(CSKavellAccountRef account)
     forEachService(*account, [&](CSKavellStringRef serviceID, CSKavellAccountSettingsRef settings) {
         const auto attributes = adopt(CSKavellAccountSettingsCopyAttributes(settings));
         if (CSKavellDictionaryGetCount(attributes.get()) > 0)
-            AddArrayValue(serviceIDs, serviceID);
+            CSKavellArrayAppendValue(serviceIDs.get(), serviceID);
     });
     return serviceIDs.leak();
 }

@@ -84,11 +84,15 @@ void UpdateServiceAttributesAux(CSKavellStringRef serviceID, CSKavellAccountSett
 
 void dropServicesWithoutAttributes(CSKavellAccount &account) noexcept
 {
-    ArraySlot withoutAttributes;
+    // Identifiers are distinct as they are; to look for each in the list would let a file of very many useless services
+    // hold up its reader for half an hour.
+    const ArraySlot withoutAttributes = NewMutableArray();
     forEachService(account, [&](CSKavellStringRef serviceID, CSKavellAccountSettingsRef settings) {
         if (!CSKavellAccountSettingsHasAttributes(settings))
-            AddArrayValue(withoutAttributes, serviceID);
+            CSKavellArrayAppendValue(withoutAttributes.get(), serviceID);
     });
+    if (CSKavellArrayGetCount(withoutAttributes.get()) == 0)
+        return;
     RemoveDictKeys(account.services, withoutAttributes.get());
 }
 
