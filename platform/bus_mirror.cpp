@@ -113,15 +113,29 @@ void work(Mirror *mirror)
     }
 }
 
-/// Starts the worker with every signal blocked: the host's signals are the host's threads' business.
+/// Blocks every signal in this thread while it lives.
+class SignalsBlocked {
+public:
+    SignalsBlocked() noexcept
+    {
+        sigset_t all;
+        sigfillset(&all);
+        pthread_sigmask(SIG_SETMASK, &all, &m_saved);
+    }
+    ~SignalsBlocked() { pthread_sigmask(SIG_SETMASK, &m_saved, nullptr); }
+    SignalsBlocked(const SignalsBlocked &) = delete;
+    SignalsBlocked &operator=(const SignalsBlocked &) = delete;
+
+private:
+    sigset_t m_saved;
+};
+
+/// Starts the worker with every signal blocked, which it inherits: the host's signals are the host's threads' business.
+/// Throws when the system gives no thread.
 void startWorker(Mirror *mirror)
 {
-    sigset_t all;
-    sigset_t saved;
-    sigfillset(&all);
-    pthread_sigmask(SIG_SETMASK, &all, &saved);
+    const SignalsBlocked blocked;
     std::thread(work, mirror).detach();
-    pthread_sigmask(SIG_SETMASK, &saved, nullptr);
     mirror->hasWorker = true;
 }
 

@@ -7,7 +7,6 @@
 #include <array>
 #include <atomic>
 #include <chrono>
-#include <cstdio>
 #include <ctime>
 #include <fcntl.h>
 #include <optional>
@@ -48,14 +47,43 @@ bool lockFile(int file) noexcept
     return true;
 }
 
-/// Opens a file and takes its flock; none, with errno, when either fails. Opening never waits, whatever the path names.
-FileDescriptor openLocked(const char *path, int access) noexcept
+bool wasUnlinked(int file) noexcept
 {
-    FileDescriptor file(withoutInterruption([&] { return open(path, access | O_CLOEXEC | O_NONBLOCK | O_NOCTTY); }));
-    if (file && !lockFile(file.get()))
-        return FileDescriptor();
-    return file;
+    struct stat status;
+    return fstat(file, &status) == 0 && status.st_nlink == 0;
 }
+
+/// An open file with its flock. The flock is given back explicitly: a child that the host forks meanwhile has the file
+/// open too, and would keep it.
+class LockedFile {
+public:
+    /// Opens the file that has the path and takes its flock; none, with errno, when either fails. Opening never waits,
+    /// whatever the path names. A file that was deleted while its flock was waited for is not the one that has the path.
+    LockedFile(const char *path, int access) noexcept
+    {
+        for (int attempt = 0; attempt < kMostAttempts; ++attempt) {
+            m_file = FileDescriptor(
+                withoutInterruption([&] { return open(path, access | O_CLOEXEC | O_NONBLOCK | O_NOCTTY); }));
+            if (m_file && !lockFile(m_file.get()))
+                m_file = FileDescriptor();
+            if (!m_file || !wasUnlinked(m_file.get()))
+                return;
+        }
+    }
+    ~LockedFile()
+    {
+        if (m_file)
+            flock(m_file.get(), LOCK_UN);
+    }
+    LockedFile(const LockedFile &) = delete;
+    LockedFile &operator=(const LockedFile &) = delete;
+
+    [[nodiscard]] int get() const noexcept { return m_file.get(); }
+    explicit operator bool() const noexcept { return static_cast<bool>(m_file); }
+
+private:
+    FileDescriptor m_file;
+};
 
 /// Puts the new contents over the old, which are never cut off first: a full disk must not cost them.
 bool overwrite(int file, std::string_view contents, off_t oldSize) noexcept
@@ -114,16 +142,14 @@ bool settleRecord(int file, const std::string &recordPath)
     return unlink(recordPath.c_str()) == 0;
 }
 
-/// Writes a file that must not exist yet, durably except for its name.
-bool writeNewFile(const std::string &path, std::string_view contents) noexcept
+/// Makes a file that must not exist yet; it has its contents durably, but not its name. None, with errno, on failure.
+FileDescriptor makeNewFile(const std::string &path, std::string_view contents) noexcept
 {
-    const FileDescriptor file(open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC | O_NOFOLLOW, 0600));
-    if (!file)
-        return false;
-    if (fchmod(file.get(), 0600) == 0 && writeWhole(file.get(), contents) && syncData(file.get()))
-        return true;
+    FileDescriptor file(open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC | O_NOFOLLOW, 0600));
+    if (!file || (fchmod(file.get(), 0600) == 0 && writeWhole(file.get(), contents) && syncData(file.get())))
+        return file;
     unlink(path.c_str());
-    return false;
+    return FileDescriptor();
 }
 
 /// Gives the file a modification time of its own. The kernel's default is as coarse as its tick on many systems, and
@@ -160,7 +186,7 @@ bool replaceInPlace(int file, const char *path, std::string_view contents, Intac
     if ((!record.oldContents || !isIntact(oldContents)) && !keepDamagedCopy(file, path))
         return false;
     const bool isProtected = (contents.size() <= oldContents.size() || reserveRoom(file, contents.size())) &&
-                             writeNewFile(recordPath, encodeRedoRecord(record)) && syncDirectoryOf(path);
+                             makeNewFile(recordPath, encodeRedoRecord(record)) && syncDirectoryOf(path);
     if (!isProtected) {
         unlink(recordPath.c_str());
         return false;
@@ -195,32 +221,42 @@ Creation createWhole(const char *path, std::string_view contents)
     static std::atomic<unsigned> counter{0};
     const std::string newPath = siblingPath(path, kNewFilePrefix) + "-" + std::to_string(getpid()) + "-" +
                                 std::to_string(counter.fetch_add(1, std::memory_order_relaxed));
-    if (!writeNewFile(newPath, contents)) {
-        // A process of this number may have died here before.
-        if (errno != EEXIST || unlink(newPath.c_str()) != 0 || !writeNewFile(newPath, contents))
+    FileDescriptor file = makeNewFile(newPath, contents);
+    // A process of this number may have died here before.
+    if (!file && errno == EEXIST && unlink(newPath.c_str()) == 0)
+        file = makeNewFile(newPath, contents);
+    if (!file || !lockFile(file.get()))
+        return Creation::Failed;
+    const Creation creation = publish(newPath.c_str(), path);
+    if (creation == Creation::Done) {
+        // Whoever has the flock is the only one who may make a record; one that is there was left by an earlier file.
+        unlink(siblingPath(path, kRedoRecordPrefix).c_str());
+        if (!syncDirectoryOf(path))
             return Creation::Failed;
     }
-    const Creation creation = publish(newPath.c_str(), path);
-    if (creation == Creation::Done)
-        return syncDirectoryOf(path) ? Creation::Done : Creation::Failed;
     return creation;
 }
 
-bool wasUnlinked(int file) noexcept
+/// The contents of a file that has no redo record; none when it has one.
+std::optional<FileRead> readWithoutRecord(const char *path, const std::string &recordPath, FileContents &contents)
 {
-    struct stat status;
-    return fstat(file, &status) == 0 && status.st_nlink == 0;
+    const LockedFile file(path, O_RDONLY);
+    if (!file)
+        return FileRead::Failed;
+    if (hasRecord(recordPath))
+        return std::nullopt;
+    return contents.read(file.get(), kLargestDataFile) ? FileRead::Done : FileRead::Failed;
 }
 
 /// The contents of a file that has a redo record, settling the record where this process may write.
 FileRead readWithRecord(const char *path, const std::string &recordPath, FileContents &contents)
 {
-    if (const FileDescriptor writable = openLocked(path, O_RDWR); writable) {
+    if (const LockedFile writable(path, O_RDWR); writable) {
         if (!settleRecord(writable.get(), recordPath))
             return FileRead::Failed;
         return contents.read(writable.get(), kLargestDataFile) ? FileRead::Done : FileRead::Failed;
     }
-    const FileDescriptor file = openLocked(path, O_RDONLY);
+    const LockedFile file(path, O_RDONLY);
     if (!file)
         return FileRead::Failed;
     const auto found = findRecord(file.get(), recordPath);
@@ -250,17 +286,9 @@ std::string siblingPath(std::string_view path, std::string_view prefix)
 FileRead readDataFile(const char *path, FileContents &contents) noexcept
 {
     return guarded(FileRead::Failed, [&] {
-        FileDescriptor file = openLocked(path, O_RDONLY);
-        if (!file)
-            return FileRead::Failed;
         const std::string recordPath = siblingPath(path, kRedoRecordPrefix);
-        FileRead result;
-        if (hasRecord(recordPath)) {
-            file = FileDescriptor();
-            result = readWithRecord(path, recordPath, contents);
-        } else {
-            result = contents.read(file.get(), kLargestDataFile) ? FileRead::Done : FileRead::Failed;
-        }
+        const auto unhindered = readWithoutRecord(path, recordPath, contents);
+        const FileRead result = unhindered ? *unhindered : readWithRecord(path, recordPath, contents);
         return result == FileRead::Done && contents.view().size() > kLargestDataFile ? FileRead::TooLarge : result;
     });
 }
@@ -271,16 +299,13 @@ bool writeDataFile(const char *path, std::string_view contents, IntactCheck isIn
         return false;
     return guarded(false, [&] {
         for (int attempt = 0; attempt < kMostAttempts; ++attempt) {
-            const FileDescriptor file = openLocked(path, O_RDWR);
-            if (file && !wasUnlinked(file.get()))
+            if (const LockedFile file(path, O_RDWR); file)
                 return replaceInPlace(file.get(), path, contents, isIntact);
-            if (!file && errno != ENOENT)
+            if (errno != ENOENT)
                 return false;
-            if (!file) {
-                const Creation creation = createWhole(path, contents);
-                if (creation != Creation::Exists)
-                    return creation == Creation::Done;
-            }
+            const Creation creation = createWhole(path, contents);
+            if (creation != Creation::Exists)
+                return creation == Creation::Done;
         }
         return false;
     });
@@ -294,10 +319,10 @@ bool removeDataFile(const char *path) noexcept
         // Not while somebody is in the middle of replacing it, if that can be helped. A record that somebody left is
         // settled, not only deleted: a power cut may undo the deletion of the file and keep that of the record.
         const std::string recordPath = siblingPath(path, kRedoRecordPrefix);
-        const FileDescriptor file = openLocked(path, hasRecord(recordPath) ? O_RDWR : O_RDONLY);
+        const LockedFile file(path, hasRecord(recordPath) ? O_RDWR : O_RDONLY);
         if (hasRecord(recordPath) && (!file || !settleRecord(file.get(), recordPath)))
             unlink(recordPath.c_str());
-        if (std::remove(path) != 0)
+        if (unlink(path) != 0)
             return false;
         // The file is gone for every program; that a power cut may bring it back is no failure of the removal.
         static_cast<void>(syncDirectoryOf(path));

@@ -27,6 +27,7 @@ constexpr std::string_view kDirectoryName = "/kavell-accounts";
 constexpr std::string_view kObserverPrefix = "observer-";
 constexpr auto kLongestPost = std::chrono::milliseconds(90);
 constexpr auto kRetryPause = std::chrono::milliseconds(1);
+constexpr size_t kMostWaiting = 256;
 
 using Clock = std::chrono::steady_clock;
 
@@ -124,7 +125,7 @@ bool postToSockets(std::string_view message)
     const std::unique_ptr<DIR, DirectoryCloser> directory(path.empty() ? nullptr : opendir(path.c_str()));
     // Where nobody has ever observed there is no directory, and all of nobody has the message.
     if (!directory)
-        return true;
+        return path.empty() || errno == ENOENT;
     const auto deadline = Clock::now() + kLongestPost;
     bool hasAll = true;
     while (const dirent *entry = readdir(directory.get())) {
@@ -136,7 +137,8 @@ bool postToSockets(std::string_view message)
 
 NotificationSocket::~NotificationSocket()
 {
-    if (!m_path.empty())
+    // A forked child has a copy of this object, but the socket is its parent's.
+    if (!m_path.empty() && m_owner == getpid())
         unlink(m_path.c_str());
 }
 
@@ -161,6 +163,7 @@ bool NotificationSocket::open()
         return false;
     }
     m_path = path + "/" + name;
+    m_owner = getpid();
     return true;
 }
 
@@ -190,8 +193,12 @@ bool NotificationSocket::receiveFromListener(std::string &message)
         if (taken == Taken::Message)
             return true;
         // A poster between its connect and its send; the message comes, and the descriptor is then readable.
-        if (taken == Taken::NotYet && watch(m_poll.get(), connection.get()))
-            m_waiting.push_back(std::move(connection));
+        if (taken != Taken::NotYet || !watch(m_poll.get(), connection.get()))
+            continue;
+        // Whoever has kept silent for so long will not speak any more.
+        if (m_waiting.size() >= kMostWaiting)
+            m_waiting.erase(m_waiting.begin());
+        m_waiting.push_back(std::move(connection));
     }
 }
 

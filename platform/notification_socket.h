@@ -56,6 +56,7 @@ private:
     /// Connections accepted before their message was there.
     std::vector<FileDescriptor> m_waiting;
     std::string m_path;
+    pid_t m_owner = 0;  ///< the process that listens
 };
 
 }  // namespace kavell

@@ -205,7 +205,7 @@ public:
         if (!whole)
             return nullptr;
         dictionary->forEach([&](CSKavellTypeRef key, CSKavellTypeRef value) {
-            whole = whole && isPlainText(key);
+            whole = whole && ++m_keys <= kMostKeys && isPlainText(key);
             PlistNode node = whole ? object(value, depth) : nullptr;
             whole = whole && node;
             if (whole)
@@ -295,6 +295,7 @@ private:
     }
 
     size_t m_values = 0;
+    size_t m_keys = 0;
 };
 
 // The top-level dictionary stands in the document's root element.

@@ -24,8 +24,8 @@ namespace kavell {
 
 /// Writes a dictionary as XML. False, with `xml` as it was, when a value cannot be kept by a property list: an object
 /// of another type, a key that is no string, text with control characters, a real that is no number, an integer above
-/// INT64_MAX, a date out of range, containers deeper than the guard allows or holding themselves, or more than the
-/// largest file.
+/// INT64_MAX, a date out of range, containers deeper than the guard allows or holding themselves, more keys than it
+/// allows, or more than the largest file.
 [[nodiscard]] bool writePropertyList(CSKavellDictionaryRef dictionary, std::string &xml) noexcept;
 
 }  // namespace kavell

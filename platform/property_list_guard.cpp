@@ -175,6 +175,8 @@ private:
         if (tag.ends_with('/'))
             return true;
         const std::string_view name = tag.substr(0, tag.find_first_of(kBlanks));
+        if (name == "key" && ++m_keys > kMostKeys)
+            return false;
         return ++m_depth <= kDeepestPropertyList && scalarIsWellFormed(name);
     }
 
@@ -192,6 +194,7 @@ private:
 
     std::string_view m_rest;
     int m_depth = 0;
+    size_t m_keys = 0;
     bool m_sawElement = false;
 };
 

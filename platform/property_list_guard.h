@@ -18,14 +18,18 @@ namespace kavell {
 /// leaves room on the smallest thread stacks in use.
 inline constexpr int kDeepestPropertyList = 256;
 
+/// How many keys all dictionaries of a document may have together. The parser looks keys up by a hash that is easy to make
+/// collide, in time that grows with the square of their number; this many take a second at the worst.
+inline constexpr size_t kMostKeys = 10000;
+
 /// The first and the last second since 1970 that a property list keeps: 32-bit seconds around 2001-01-01.
 inline constexpr int64_t kPropertyListEpoch = 978307200;
 inline constexpr int64_t kEarliestDate = kPropertyListEpoch + INT32_MIN;
 inline constexpr int64_t kLatestDate = kPropertyListEpoch + INT32_MAX;
 
 /// Whether the text may be handed to the parser: UTF-8 without control characters, elements that are all closed and no
-/// deeper than kDeepestPropertyList, no document-type subset, and only well-formed numbers, dates and data within their
-/// ranges.
+/// deeper than kDeepestPropertyList, at most kMostKeys keys, no document-type subset, and only well-formed numbers, dates
+/// and data within their ranges.
 [[nodiscard]] bool isSafePropertyList(std::string_view xml) noexcept;
 
 /// Whether a string can stand in an XML document: without control characters but for tab, line feed and carriage

@@ -10,8 +10,7 @@
 //     torn, or of another inode             anything               deleting the record: the data file was not touched
 //     whole                                 the new contents       deleting the record
 //     whole                                 a mix of old and new   writing the new contents, then deleting the record
-//     whole                                 anything else          deleting the record: another program has written
-//     since
+//     whole                                 anything else          deleting the record: another program wrote since
 //
 // "A mix" is decided byte by byte, so that no tear, at whatever place, is taken for another program's work, and the
 // other way round. The zeros of a file that grew without its bytes count as torn.

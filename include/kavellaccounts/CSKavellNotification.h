@@ -5,9 +5,9 @@
 // process posts reaches every observer that exists at that moment, the poster's own included, also when the poster
 // exits right after.
 //
-//     CSKavellNotificationObserverRef observer =
-//     CSKavellNotificationObserverCreate(kCSKavellAccountNotificationSender); struct pollfd waiting = {
-//     CSKavellNotificationObserverGetFileDescriptor(observer), POLLIN, 0 }; while (poll(&waiting, 1, -1) > 0) {
+//     CSKavellNotificationObserverRef observer = CSKavellNotificationObserverCreate(kCSKavellAccountNotificationSender);
+//     struct pollfd waiting = {CSKavellNotificationObserverGetFileDescriptor(observer), POLLIN, 0};
+//     while (poll(&waiting, 1, -1) > 0) {
 //         CSKavellNotificationRef notification;
 //         while ((notification = CSKavellNotificationObserverCopyNext(observer)) != NULL) {
 //             … CSKavellNotificationGetObject(notification) …

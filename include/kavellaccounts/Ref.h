@@ -5,9 +5,9 @@
 // Header-only; a Ref is as thread-safe as a std::shared_ptr (the count is, one Ref object is not).
 //
 //     using kavell::Ref, kavell::adopt;
-//     Ref<CSKavellAccountRef> account = adopt(_CSKavellAccountCreate(nullptr, kCSKavellAccountProviderMail,
-//     name.get())); std::string full = kavell::toStdString(adopt(_CSKavellAccountCopyProviderAttribute(account.get(),
-//     key)).get());
+//     Ref<CSKavellAccountRef> account = adopt(_CSKavellAccountCreate(nullptr, kCSKavellAccountProviderMail, name.get()));
+//     Ref<CSKavellStringRef> login = adopt(_CSKavellAccountCopyLoginName(account.get()));
+//     std::cout << kavell::toStringView(login.get());
 
 #ifndef KAVELLACCOUNTS_REF_H
 #define KAVELLACCOUNTS_REF_H
