@@ -190,6 +190,8 @@ std::string parseKey(std::string_view word)
         refuse("an attribute key is missing; write KEY=VALUE, such as server=imap.example.org");
     if (!isUTF8(word) || hasControlCharacter(word))
         refuse("the attribute key " + inQuotes(word) + " has a control character or is not UTF-8; choose another");
+    if (!isStorableText(word))
+        refuse("the attribute key " + inQuotes(word) + " has a character that a data file cannot hold; choose another");
     std::string key = attributeKeyOf(word);
     if (key == passwordReferenceKey)
         refuse("the attribute " + inQuotes(key) +

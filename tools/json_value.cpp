@@ -83,6 +83,8 @@ Ref<CSKavellDictionaryRef> readPlainDictionary(const Json &json, const std::stri
         const std::string inner = place + "." + escaped(key);
         if (key.empty() || hasControlCharacter(key))
             refuse("the key " + inQuotes(key) + " in " + place + " is empty or has a control character");
+        if (!isStorableText(key))
+            refuse("the key " + inQuotes(key) + " in " + place + " has a character that a data file cannot hold");
         CSKavellDictionarySetValue(dictionary.get(), makeString(key).get(), read(value, inner, depth).get());
     }
     return dictionary;

@@ -152,6 +152,9 @@ std::string providerTypeOf(std::string_view word)
 
 std::string serviceOf(std::string_view word)
 {
+    // Unlike a provider type, which is a directory's name only, a service stands inside the data file.
+    if (isUTF8(word) && !hasControlCharacter(word) && !isStorableText(word))
+        refuse("the service " + inQuotes(word) + " has a character that a data file cannot hold; choose another");
     return valueOf(word, serviceTable, "service");
 }
 

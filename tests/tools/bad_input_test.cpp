@@ -49,6 +49,16 @@ INSTANTIATE_TEST_SUITE_P(
                      "the provider type 'org.example\\n' contains a control character" + isFileName},
         BadInputCase{{"add", "..", "a"}, "the provider type '..' means a directory" + isFileName}));
 
+// U+FFFE is valid UTF-8 and no control character, but no XML file can hold it.
+INSTANTIATE_TEST_SUITE_P(
+    NoncharacterNames, BadInput,
+    testing::Values(BadInputCase{{"set", "google", "anna", "a\xef\xbf\xbe=1"},
+                                 "the attribute key 'a\xef\xbf\xbe' has a character that a data file cannot hold; "
+                                 "choose another"},
+                    BadInputCase{{"set", "google", "anna", "--service", "org.example\xef\xbf\xbe.x", "a=1"},
+                                 "the service 'org.example\xef\xbf\xbe.x' has a character that a data file cannot "
+                                 "hold; choose another"}));
+
 const std::string knownProviders = "; known are yahoo, google, nimbrel, quillane, facebook, exchange, aol, mail, "
                                    "cardell, parlex, tidewell, haldenserver, test, or a full name such as "
                                    "com.corvane.account.yahoo";

@@ -218,6 +218,9 @@ INSTANTIATE_TEST_SUITE_P(
         BadDocumentCase{documentWith(R"({"provider": "google", "login": "x", "attributes": {"a": "\u0001"}})"),
                         "standard input, account 2 (google x) attributes.a has a character that a data file cannot "
                         "hold; give such bytes as data"},
+        BadDocumentCase{documentWith(R"({"provider": "google", "login": "x", "attributes": {"a\uffff": "b"}})"),
+                        "the key 'a\xef\xbf\xbf' in standard input, account 2 (google x) attributes has a character "
+                        "that a data file cannot hold"},
         BadDocumentCase{
             documentWith(
                 R"({"provider": "google", "login": "x", "attributes": {"com.corvane.account.CofferelToken": ""}})"),
