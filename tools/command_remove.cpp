@@ -54,6 +54,18 @@ void removePassword(const Address &address, CSKavellCofferelItemRef item, CSKave
                       address.text() + "' later");
 }
 
+/// The item of an account whose data file does not tell the reference: found by the account's names.
+Ref<CSKavellCofferelItemRef> itemByNames(const Address &address)
+{
+    CSKavellCofferelItemRef item = nullptr;
+    const CSKavellCofferelStatus status =
+        CSKavellCofferelStoreFindItem(makeString(address.providerType).get(), makeString(address.login).get(), &item);
+    if (status != kCSKavellCofferelStatusStored && status != kCSKavellCofferelStatusAbsent)
+        complain("a password of " + address.text() + " could not be looked for: the credential store is " +
+                 CSKavellCofferelStatusGetName(status));
+    return adopt(item);
+}
+
 }  // namespace
 
 ExitCode runRemove(const Words &words)
@@ -82,6 +94,8 @@ ExitCode runRemove(const Words &words)
         item = adopt(_CSKavellAccountCopyCofferelItem(account.record.get()));
         if (!item)
             state = _CSKavellAccountGetPasswordStatus(account.record.get());
+    } else if (!account.readable && !keepPassword) {
+        item = itemByNames(address);
     }
     removeDataFile(account);
     if (isOnDisk(address))

@@ -87,6 +87,17 @@ TEST_F(PasswordCommand, RemovingAnAccountRemovesItsPassword)
     EXPECT_EQ(doctor.output, "0 accounts examined, no problems.\n");
 }
 
+TEST_F(PasswordCommand, RemovingADamagedAccountRemovesItsPassword)
+{
+    run({"password", "set", "google", "anna"}, "s3cret");
+    writeFile(dataFilePath(googleType, "anna"), "<plist><dict>");
+
+    const ProgramResult removed = client({"remove", "google", "anna", "--yes"});
+
+    EXPECT_EQ(removed.status, 0) << removed.error;
+    EXPECT_EQ(client({"doctor"}).output, "0 accounts examined, no problems.\n");
+}
+
 TEST_F(PasswordCommand, AKeptPasswordIsReportedByTheDoctorAndCanStillBeRemoved)
 {
     run({"password", "set", "google", "anna"}, "s3cret");
