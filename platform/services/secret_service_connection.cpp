@@ -147,10 +147,13 @@ CredentialStatus SecretServiceConnection::probe(const Deadline &deadline)
                             "(u)"};
     if (callBounded(connection.get(), start, deadline, error, kBusInterface))
         return CredentialStatus::stored;
-    // An answer, whatever its reason, says that there is no such service; silence says nothing.
+    // An answer, whatever its reason, says that there is no such service; silence says nothing, and neither does a bus
+    // that gave up waiting for a service it knows how to start.
     const OwnedText remote(g_dbus_error_get_remote_error(error.get()));
-    const bool isAnswered = remote && !std::string_view(remote.get()).ends_with(".NoReply");
-    return isAnswered ? CredentialStatus::absent : CredentialStatus::unreachable;
+    const std::string_view reason = remote ? remote.get() : "";
+    const bool isSilence =
+        !remote || reason.ends_with(".NoReply") || reason.ends_with(".TimedOut") || reason.ends_with(".Timeout");
+    return isSilence ? CredentialStatus::unreachable : CredentialStatus::absent;
 }
 
 CredentialStatus SecretServiceConnection::call(const ServiceCall &call, const Deadline &deadline, OwnedVariant &reply)
