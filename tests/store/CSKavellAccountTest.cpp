@@ -498,24 +498,3 @@ TEST(CreateUTF8CString, IsNoneForNone)
 {
     EXPECT_EQ(CreateUTF8CString(nullptr).get(), nullptr);
 }
-
-TEST_F(CSKavellAccountTest, TheServicesListedAreThoseWithEffectiveAttributes)
-{
-    const Account account = openAccount("ada");
-    const auto key = text("key");
-    _CSKavellAccountSetServiceAttribute(account.get(), kCSKavellAccountServiceMail, key.get(), key.get());
-    _CSKavellAccountSetServiceAttribute(account.get(), kCSKavellAccountServiceCalDAV, key.get(), key.get());
-    commit(account);
-    _CSKavellAccountSetServiceAttribute(account.get(), kCSKavellAccountServicePhotos, key.get(), key.get());
-    _CSKavellAccountRemoveServiceAttribute(account.get(), kCSKavellAccountServiceMail, key.get());
-    const auto serviceIDs = adopt(_CSKavellAccountCopyServiceIDs(account.get()));
-    ASSERT_EQ(CSKavellArrayGetCount(serviceIDs.get()), 2u);
-    EXPECT_TRUE(CSKavellEqual(CSKavellArrayGetValueAtIndex(serviceIDs.get(), 0), kCSKavellAccountServiceCalDAV));
-    EXPECT_TRUE(CSKavellEqual(CSKavellArrayGetValueAtIndex(serviceIDs.get(), 1), kCSKavellAccountServicePhotos));
-}
-
-TEST_F(CSKavellAccountTest, AnAccountWithoutServicesListsNone)
-{
-    EXPECT_EQ(CSKavellArrayGetCount(adopt(_CSKavellAccountCopyServiceIDs(openAccount("ada").get())).get()), 0u);
-    EXPECT_EQ(_CSKavellAccountCopyServiceIDs(nullptr), nullptr);
-}
