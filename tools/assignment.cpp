@@ -87,10 +87,16 @@ Ref<CSKavellTypeRef> readDate(const std::string &key, std::string_view text)
     return adopt(CSKavellDateCreate(*date));
 }
 
+// A data file has room for 32 MiB, and keeps data as base64, a third longer.
+constexpr size_t largestData = size_t{16} << 20;
+
 Ref<CSKavellTypeRef> readData(const std::string &key, std::string_view text)
 {
     if (text.starts_with('@')) {
         const std::string contents = readInputFile(std::string(text.substr(1)));
+        if (contents.size() > largestData)
+            refuse("the value of " + inQuotes(key) + ", the file " + inQuotes(text.substr(1)) +
+                   ", is larger than the 16 MiB that an attribute may have");
         return adopt(CSKavellDataCreate(contents.data(), contents.size()));
     }
     if (const auto bytes = parseBase64(text))

@@ -4,6 +4,10 @@
 // kavell-accounts import: adds the accounts of an exported document. The whole document is understood, and every
 // account it touches is looked at, before the first one is changed.
 
+#include <kavellaccounts/CSKavellArray.h>
+#include <kavellaccounts/CSKavellData.h>
+#include <kavellaccounts/CSKavellDictionary.h>
+
 #include "tools/account_json.h"
 #include "tools/command_line.h"
 #include "tools/commands.h"
@@ -59,11 +63,53 @@ Treatment treatmentOfExisting(const ImportOptions &options)
     return options.merge ? Treatment::Merge : options.replace ? Treatment::Replace : Treatment::Skip;
 }
 
+/// What an account would take in its data file, at most.
+struct StoredSize {
+    size_t keys = 0;
+    size_t bytes = 0;
+};
+
+void measure(CSKavellTypeRef value, StoredSize &size)
+{
+    // The longest escape of a character is six bytes, base64 is a third longer, and each value stands between tags.
+    constexpr size_t tags = 64;
+    size.bytes += tags;
+    if (const auto text = cast<CSKavellStringRef>(value, CSKavellStringGetTypeID()))
+        size.bytes += CSKavellStringGetLength(text) * 6;
+    if (const auto data = cast<CSKavellDataRef>(value, CSKavellDataGetTypeID()))
+        size.bytes += CSKavellDataGetLength(data) * 3 / 2;
+    const auto array = cast<CSKavellArrayRef>(value, CSKavellArrayGetTypeID());
+    for (size_t index = 0; index < CSKavellArrayGetCount(array); ++index)
+        measure(CSKavellArrayGetValueAtIndex(array, index), size);
+    const auto dictionary = cast<CSKavellDictionaryRef>(value, CSKavellDictionaryGetTypeID());
+    std::vector<CSKavellTypeRef> keys(CSKavellDictionaryGetCount(dictionary)), values(keys.size());
+    CSKavellDictionaryGetKeysAndValues(dictionary, keys.data(), values.data());
+    size.keys += keys.size();
+    for (size_t index = 0; index < keys.size(); ++index) {
+        measure(keys[index], size);
+        measure(values[index], size);
+    }
+}
+
+/// Refuses an account that no data file could hold now, not half way through.
+void checkSize(const TransferredAccount &account)
+{
+    constexpr size_t mostKeys = 9000, mostBytes = size_t{30} << 20;
+    StoredSize size;
+    measure(account.attributes.get(), size);
+    for (const auto &[service, attributes] : account.services)
+        measure(attributes.get(), size);
+    if (size.keys > mostKeys || size.bytes > mostBytes)
+        refuse("nothing was imported, because " + account.address.text() +
+               " is too large for an account, which has room for 9000 keys and 30 MiB");
+}
+
 std::vector<Step> planOf(std::vector<TransferredAccount> accounts, const ImportOptions &options)
 {
     std::vector<Step> steps;
     std::string existing;
     for (TransferredAccount &account : accounts) {
+        checkSize(account);
         Step step{std::move(account), Treatment::Add};
         if (isOnDisk(step.account.address)) {
             step.treatment = treatmentOfExisting(options);

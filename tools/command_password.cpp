@@ -36,7 +36,9 @@ const char *wayOutOf(CSKavellCofferelStatus status)
 {
     switch (status) {
     case kCSKavellCofferelStatusLocked:
-        return "; unlock it first";
+        return std::string_view(CSKavellCofferelStoreGetName()) == "vault"
+                   ? "; give its passphrase at a terminal, or in a file that KAVELL_VAULT_PASSPHRASE_FILE names"
+                   : "; unlock it first";
     case kCSKavellCofferelStatusRefused:
         return "; unlock it, or check the passphrase, and try again";
     case kCSKavellCofferelStatusUnreachable:

@@ -63,12 +63,12 @@ const Address *accountOfRedoRecord(const std::string &path, const std::map<ino_t
     return found == accountsByInode.end() ? nullptr : &found->second;
 }
 
-/// Waits until nobody is inside the data file: a redo record that is still there then belongs to nobody.
+/// Waits, for a bounded time, until nobody is inside the data file: a redo record that is still there then belongs to nobody.
 void waitForWriters(const Address &address)
 {
     const FileDescriptor file(open(dataFileOf(address).c_str(), O_RDONLY | O_CLOEXEC));
     if (file.get() >= 0)
-        (void)flock(file.get(), LOCK_SH);
+        (void)lockWithinBound(file.get(), LOCK_SH);
 }
 
 bool exists(const std::string &path)

@@ -4,11 +4,14 @@
 #include "tools/files.h"
 
 #include <cerrno>
+#include <chrono>
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
 #include <fcntl.h>
+#include <sys/file.h>
 #include <sys/stat.h>
+#include <thread>
 #include <unistd.h>
 
 #include "tools/failure.h"
@@ -52,6 +55,17 @@ FileDescriptor::~FileDescriptor()
 {
     if (m_descriptor > STDERR_FILENO)
         close(m_descriptor);
+}
+
+bool lockWithinBound(int descriptor, int operation)
+{
+    const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(10);
+    while (flock(descriptor, operation | LOCK_NB) != 0) {
+        if ((errno != EWOULDBLOCK && errno != EINTR) || std::chrono::steady_clock::now() > deadline)
+            return false;
+        std::this_thread::sleep_for(std::chrono::milliseconds(5));
+    }
+    return true;
 }
 
 std::string readInputFile(const std::string &path)

@@ -24,6 +24,9 @@ private:
     int m_descriptor;
 };
 
+/// Takes a flock (LOCK_SH or LOCK_EX), waiting for at most ten seconds; false when somebody else still has it then.
+[[nodiscard]] bool lockWithinBound(int descriptor, int operation);
+
 /// The whole contents of a file, or of standard input for "-"; refuses what cannot be read or has more than 256 MiB.
 [[nodiscard]] std::string readInputFile(const std::string &path);
 

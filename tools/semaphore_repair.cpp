@@ -85,7 +85,7 @@ std::optional<SemaphoreReport> inspectSemaphore(const std::string &path)
 bool repairSemaphore(const SemaphoreReport &report, const std::string &lockDirectory)
 {
     const FileDescriptor directory(open(lockDirectory.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
-    if (directory.get() < 0 || flock(directory.get(), LOCK_EX) != 0)
+    if (directory.get() < 0 || !lockWithinBound(directory.get(), LOCK_EX))
         return false;
     const std::optional<SemaphoreReport> before = inspectSemaphoreSet(report.id);
     if (!before || before->state != report.state || before->lastOperator != report.lastOperator)

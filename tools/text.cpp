@@ -146,7 +146,9 @@ std::string escaped(std::string_view text)
 
 std::string inQuotes(std::string_view text)
 {
-    return "'" + escaped(text) + "'";
+    std::string quoted = "'";
+    quoted.append(escaped(text)).append("'");
+    return quoted;
 }
 
 std::string joined(std::span<const std::string_view> words, std::string_view separator)

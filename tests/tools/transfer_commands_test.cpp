@@ -1,6 +1,8 @@
 // SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
 
+#include <filesystem>
+
 #include <nlohmann/json.hpp>
 
 #include "tests/tools/client_fixture.h"
@@ -23,6 +25,30 @@ protected:
         return Json::parse(client({"show", "google", login, "--json"}).output);
     }
 };
+
+TEST_F(TransferCommands, AnAccountTooLargeToBeSavedIsRefusedBeforeAnythingIsImported)
+{
+    std::string attributes;
+    for (int number = 0; number < 9001; ++number)
+        attributes += (number > 0 ? ", \"" : "\"") + std::to_string(number) + "\": true";
+    const ProgramResult result = import(R"({"provider": "google", "login": "small", "attributes": {}, "services": {}},)"
+                                        R"({"provider": "google", "login": "large", "services": {}, "attributes": {)" +
+                                        attributes + "}}");
+    EXPECT_EQ(result.status, 2);
+    EXPECT_EQ(result.error, "kavell-accounts: nothing was imported, because google large is too large for an account, "
+                            "which has room for 9000 keys and 30 MiB\n");
+    EXPECT_EQ(client({"show", "google", "small"}).status, 3);
+}
+
+TEST_F(TransferCommands, AFileTooLargeForAnAttributeIsRefused)
+{
+    writeFile(std::filesystem::current_path().string() + "/large", std::string((size_t{16} << 20) + 1, 'x'));
+    run({"add", "google", "anna"});
+    const ProgramResult result = client({"set", "google", "anna", "picture:data=@large"});
+    EXPECT_EQ(result.status, 2);
+    EXPECT_EQ(result.error, "kavell-accounts: the value of 'picture', the file 'large', is larger "
+                            "than the 16 MiB that an attribute may have\n");
+}
 
 TEST_F(TransferCommands, AnImportedExportIsTheSameToTheLastByte)
 {
