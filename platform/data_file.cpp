@@ -58,7 +58,8 @@ bool wasUnlinked(int file) noexcept
 class LockedFile {
 public:
     /// Opens the file that has the path and takes its flock; none, with errno, when either fails. Opening never waits,
-    /// whatever the path names. A file that was deleted while its flock was waited for is not the one that has the path.
+    /// whatever the path names. A file that was deleted while its flock was waited for is not the one that has the path,
+    /// and must not be written to; for reading, it is as good as the moment before.
     LockedFile(const char *path, int access) noexcept
     {
         for (int attempt = 0; attempt < kMostAttempts; ++attempt) {
@@ -66,7 +67,7 @@ public:
                 withoutInterruption([&] { return open(path, access | O_CLOEXEC | O_NONBLOCK | O_NOCTTY); }));
             if (m_file && !lockFile(m_file.get()))
                 m_file = FileDescriptor();
-            if (!m_file || !wasUnlinked(m_file.get()))
+            if (!m_file || access == O_RDONLY || !wasUnlinked(m_file.get()))
                 return;
         }
     }
@@ -319,7 +320,7 @@ bool removeDataFile(const char *path) noexcept
         // Not while somebody is in the middle of replacing it, if that can be helped. A record that somebody left is
         // settled, not only deleted: a power cut may undo the deletion of the file and keep that of the record.
         const std::string recordPath = siblingPath(path, kRedoRecordPrefix);
-        const LockedFile file(path, hasRecord(recordPath) ? O_RDWR : O_RDONLY);
+        const LockedFile file(path, O_RDWR);
         if (hasRecord(recordPath) && (!file || !settleRecord(file.get(), recordPath)))
             unlink(recordPath.c_str());
         if (unlink(path) != 0)

@@ -120,11 +120,11 @@ public:
             plist_dict_next_item(node, iterator.get(), nullptr, &item);
             if (!item)
                 return result;
-            const auto itemKey = key(item);
-            const auto value = object(item);
+            auto itemKey = key(item);
+            auto value = object(item);
             if (!itemKey || !value)
                 return nullptr;
-            result->set(itemKey.get(), value.get());
+            result->take(std::move(itemKey), std::move(value));
         }
     }
 

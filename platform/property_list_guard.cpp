@@ -129,19 +129,21 @@ private:
     /// Passes what begins after a "<".
     bool passMarkup() noexcept
     {
+        const char first = m_rest.empty() ? '\0' : m_rest.front();
+        // A declaration is legal before the first element only, where quotes cannot make the parser and this code disagree
+        // about depth; a subset of declarations inside a document type is not needed by any property list.
+        if (first == '?')
+            return !m_sawElement && passThrough("?>", 1);
+        return first == '!' ? passDeclaration() : passTag();
+    }
+
+    bool passDeclaration() noexcept
+    {
         if (m_rest.starts_with("!--"))
             return passThrough("-->", 3);
         if (m_rest.starts_with("![CDATA["))
             return m_depth > 0 && passThrough("]]>", 8);
-        // A declaration is legal before the first element only, where quotes cannot make the parser and this code
-        // disagree about depth; a subset of declarations inside a document type is not needed by any property list.
-        if (m_rest.starts_with('?'))
-            return !m_sawElement && passThrough("?>", 1);
-        if (m_rest.starts_with("!DOCTYPE"))
-            return !m_sawElement && passDocumentType();
-        if (m_rest.starts_with('!'))
-            return false;
-        return passTag();
+        return m_rest.starts_with("!DOCTYPE") && !m_sawElement && passDocumentType();
     }
 
     bool passThrough(std::string_view end, size_t from) noexcept
@@ -183,6 +185,9 @@ private:
     /// Whether the text that follows an opened element fits it.
     [[nodiscard]] bool scalarIsWellFormed(std::string_view name) const noexcept
     {
+        // Most elements are keys and strings.
+        if (name == "key" || name == "string")
+            return true;
         const auto *element = std::find_if(kScalarElements.begin(), kScalarElements.end(),
                                            [name](const ScalarElement &each) { return each.name == name; });
         if (element == kScalarElements.end())

@@ -67,25 +67,30 @@ const DictionaryEntry *CSKavellDictionary::find(CSKavellTypeRef key) const noexc
 
 void CSKavellDictionary::set(CSKavellTypeRef key, CSKavellTypeRef value)
 {
-    if (auto *existing = const_cast<DictionaryEntry *>(find(key))) {
-        CSKavellRetain(value);
-        CSKavellRelease(std::exchange(existing->value, value));
+    take(retain(key), retain(value));
+}
+
+void CSKavellDictionary::take(Ref<CSKavellTypeRef> key, Ref<CSKavellTypeRef> value)
+{
+    if (auto *existing = const_cast<DictionaryEntry *>(find(key.get()))) {
+        CSKavellRelease(std::exchange(existing->value, value.leak()));
         return;
     }
     if (entries.size() == entries.capacity() && count < entries.size())
         closeGaps();
-    entries.push_back({key, value});
+    entries.push_back({key.get(), value.get()});
     try {
         if (entries.size() > kMostScanned && (entries.size() + 1) * 4 > index.size() * 3)
             rebuildIndex();
         else if (!index.empty())
-            index[slotOf(key)] = static_cast<uint32_t>(entries.size());
+            index[slotOf(key.get())] = static_cast<uint32_t>(entries.size());
     } catch (...) {
         entries.pop_back();
         throw;
     }
-    CSKavellRetain(key);
-    CSKavellRetain(value);
+    // The dictionary owns them from here on.
+    static_cast<void>(key.leak());
+    static_cast<void>(value.leak());
     ++count;
 }
 

@@ -16,6 +16,7 @@
 #include <vector>
 
 #include <kavellaccounts/CSKavellDictionary.h>
+#include <kavellaccounts/Ref.h>
 
 #include "runtime/object_p.h"
 
@@ -42,6 +43,9 @@ struct CSKavellDictionary : kavell::Object {
     /// Sets a key that is not none to a value that is not none, retaining both. May throw std::bad_alloc, and has then
     /// changed nothing.
     void set(CSKavellTypeRef key, CSKavellTypeRef value);
+
+    /// The same for a key and a value whose references the caller gives away.
+    void take(kavell::Ref<CSKavellTypeRef> key, kavell::Ref<CSKavellTypeRef> value);
 
     void remove(CSKavellTypeRef key) noexcept;
 
