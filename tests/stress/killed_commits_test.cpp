@@ -116,20 +116,38 @@ protected:
     }
 };
 
+/// Moments at which to kill, anywhere in a window from the start of a commit. The window grows while the kills come too
+/// early and shrinks while they come too late, so that they meet the commits however fast these are here.
+class KillMoments {
+public:
+    explicit KillMoments(std::chrono::nanoseconds usual)
+        : m_random(std::random_device()()), m_window(static_cast<double>(usual.count()))
+    {
+    }
+
+    [[nodiscard]] std::chrono::nanoseconds next()
+    {
+        return std::chrono::nanoseconds(
+            static_cast<int64_t>(std::uniform_real_distribution<double>(0, m_window)(m_random)));
+    }
+
+    void learn(bool wasDone) { m_window *= wasDone ? 0.97 : 1.03; }
+
+private:
+    std::mt19937 m_random;
+    double m_window;
+};
+
 }  // namespace
 
 TEST_F(KilledCommits, LeaveAnExistingFileAsBeforeOrAsAfter)
 {
     constexpr int kRounds = 1700;
-    const auto usual = measureCommit();
-    const unsigned seed = std::random_device()();
-    SCOPED_TRACE("seed " + std::to_string(seed));
-    std::mt19937 random(seed);
-    std::uniform_int_distribution<int64_t> delays(0, usual.count() * 5 / 4);
+    KillMoments moments(measureCommit());
     int killed = 0, before = 0, after = 0;
     int64_t last = stateOf(openAccount("ada")).round;
     for (int round = 100; round < 100 + kRounds; ++round) {
-        killed += commitAndKill(round, std::chrono::nanoseconds(delays(random)));
+        killed += commitAndKill(round, moments.next());
         freeSemaphores();
         StandardErrorCapture capture;
         const Account account = openAccount("ada");
@@ -138,6 +156,7 @@ TEST_F(KilledCommits, LeaveAnExistingFileAsBeforeOrAsAfter)
         ASSERT_TRUE(state.isWhole) << round << " shows " << state.round;
         ASSERT_TRUE(state.round == last || state.round == round) << round << " shows " << state.round;
         ++(state.round == round ? after : before);
+        moments.learn(state.round == round);
         last = state.round;
     }
     // The kills must have met the commits, or nothing was shown.
@@ -156,16 +175,13 @@ TEST_F(KilledCommits, LeaveAnExistingFileAsBeforeOrAsAfter)
 TEST_F(KilledCommits, LeaveANewFileWholeOrNotThere)
 {
     constexpr int kRounds = 300;
-    const auto usual = measureCommit();
-    const unsigned seed = std::random_device()();
-    SCOPED_TRACE("seed " + std::to_string(seed));
-    std::mt19937 random(seed);
-    std::uniform_int_distribution<int64_t> delays(0, usual.count() * 5 / 4);
+    KillMoments moments(measureCommit());
     int missing = 0, whole = 0;
     for (int round = 100; round < 100 + kRounds; ++round) {
         std::filesystem::remove(fileOf("ada"));
-        (void)commitAndKill(round, std::chrono::nanoseconds(delays(random)));
+        (void)commitAndKill(round, moments.next());
         freeSemaphores();
+        moments.learn(std::filesystem::exists(fileOf("ada")));
         if (!std::filesystem::exists(fileOf("ada"))) {
             ++missing;
             continue;
