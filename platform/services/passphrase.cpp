@@ -118,10 +118,10 @@ void show(int terminal, std::string_view text)
 }
 
 /// The terminal, unless this process is in its background: there reading would stop the whole program.
-Descriptor openTerminal()
+FileDescriptor openTerminal()
 {
-    Descriptor terminal(::open("/dev/tty", O_RDWR | O_NOCTTY | O_CLOEXEC));
-    return terminal && tcgetpgrp(terminal.get()) == getpgrp() ? std::move(terminal) : Descriptor();
+    FileDescriptor terminal(::open("/dev/tty", O_RDWR | O_NOCTTY | O_CLOEXEC));
+    return terminal && tcgetpgrp(terminal.get()) == getpgrp() ? std::move(terminal) : FileDescriptor();
 }
 
 CredentialStatus readLine(int terminal, const Deadline &deadline, TypedLine &line)
@@ -150,7 +150,7 @@ bool hasPassphraseFile()
 CredentialStatus readPassphraseFile(Secret &passphrase)
 {
     // Not blocking: what stands there may be a pipe.
-    const Descriptor file(::open(std::getenv(kFileVariable), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY));
+    const FileDescriptor file(::open(std::getenv(kFileVariable), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY));
     struct stat status {};
     if (!file || fstat(file.get(), &status) != 0 || !isPrivate(status))
         return CredentialStatus::locked;
@@ -169,7 +169,7 @@ CredentialStatus readPassphraseFile(Secret &passphrase)
 
 CredentialStatus askForPassphrase(std::string_view question, const Deadline &deadline, Secret &passphrase)
 {
-    const Descriptor terminal = openTerminal();
+    const FileDescriptor terminal = openTerminal();
     if (!terminal)
         return CredentialStatus::locked;
     const SilentTerminal silent(terminal.get());
@@ -186,7 +186,7 @@ CredentialStatus askForPassphrase(std::string_view question, const Deadline &dea
 
 void tellAtTerminal(std::string_view text)
 {
-    if (const Descriptor terminal = openTerminal())
+    if (const FileDescriptor terminal = openTerminal())
         show(terminal.get(), text);
 }
 

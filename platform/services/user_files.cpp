@@ -7,48 +7,20 @@
 #include <cstdio>
 #include <cstdlib>
 #include <fcntl.h>
-#include <pwd.h>
 #include <sys/file.h>
 #include <sys/stat.h>
-#include <vector>
+
+#include "platform/home_directory.h"
 
 namespace kavell {
 
 namespace {
-
-std::string homeDirectory()
-{
-    if (const char *home = std::getenv("HOME"); home && home[0] == '/')
-        return home;
-    std::vector<char> buffer(16384);
-    passwd entry{};
-    passwd *found = nullptr;
-    getpwuid_r(getuid(), &entry, buffer.data(), buffer.size(), &found);
-    return found && found->pw_dir ? found->pw_dir : "";
-}
 
 std::string dataDirectory()
 {
     // A relative path there is to be ignored, as the base directory rules say.
     const char *data = std::getenv("XDG_DATA_HOME");
     return data && data[0] == '/' ? std::string(data) : homeDirectory() + "/.local/share";
-}
-
-bool writeAll(int file, std::string_view bytes)
-{
-    while (!bytes.empty()) {
-        const ssize_t count = ::write(file, bytes.data(), bytes.size());
-        if (count < 0 && errno != EINTR)
-            return false;
-        bytes.remove_prefix(count > 0 ? static_cast<size_t>(count) : 0);
-    }
-    return true;
-}
-
-bool syncDirectory(const std::string &path)
-{
-    const Descriptor directory(::open(path.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
-    return directory && fsync(directory.get()) == 0;
 }
 
 }  // namespace
@@ -74,7 +46,7 @@ FileLock::FileLock(const std::string &name, const Deadline &deadline)
     if (!makeCredentialDirectory())
         return;
     const std::string path = credentialDirectory() + "/" + name;
-    m_file = Descriptor(::open(path.c_str(), O_RDWR | O_CREAT | O_CLOEXEC | O_NOFOLLOW, 0600));
+    m_file = FileDescriptor(::open(path.c_str(), O_RDWR | O_CREAT | O_CLOEXEC | O_NOFOLLOW, 0600));
     if (!m_file)
         return;
     int error = 0;
@@ -88,7 +60,7 @@ FileLock::FileLock(const std::string &name, const Deadline &deadline)
 StoredFile readWholeFile(const std::string &path, size_t most)
 {
     // Not blocking: what stands there may be a pipe.
-    const Descriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK));
+    const FileDescriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK));
     if (!file)
         return {errno == ENOENT ? StoredFile::State::absent : StoredFile::State::failed, {}};
     struct stat status {};
@@ -114,15 +86,15 @@ bool replaceFile(const std::string &name, std::string_view bytes)
     const std::string fresh = path + ".new";
     // A leftover of a process that was killed here; the lock's holder is its only user.
     ::unlink(fresh.c_str());
-    const Descriptor file(::open(fresh.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC | O_NOFOLLOW, 0600));
+    const FileDescriptor file(::open(fresh.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC | O_NOFOLLOW, 0600));
     if (!file)
         return false;
-    if (!writeAll(file.get(), bytes) || fsync(file.get()) != 0 || std::rename(fresh.c_str(), path.c_str()) != 0) {
+    if (!writeWhole(file.get(), bytes) || fsync(file.get()) != 0 || std::rename(fresh.c_str(), path.c_str()) != 0) {
         ::unlink(fresh.c_str());
         return false;
     }
     // The new file stands either way; a directory that cannot be synced only weakens what a power cut leaves.
-    static_cast<void>(syncDirectory(directory));
+    static_cast<void>(syncDirectoryOf(path.c_str()));
     return true;
 }
 

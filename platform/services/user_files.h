@@ -10,36 +10,11 @@
 #include <optional>
 #include <string>
 #include <string_view>
-#include <unistd.h>
-#include <utility>
 
+#include "platform/file_io.h"
 #include "platform/services/deadline.h"
 
 namespace kavell {
-
-/// Owns an open descriptor, or none.
-class Descriptor {
-public:
-    Descriptor() noexcept = default;
-    explicit Descriptor(int descriptor) noexcept : m_descriptor(descriptor) {}
-    ~Descriptor()
-    {
-        if (m_descriptor >= 0)
-            ::close(m_descriptor);
-    }
-    Descriptor(Descriptor &&other) noexcept : m_descriptor(std::exchange(other.m_descriptor, -1)) {}
-    Descriptor &operator=(Descriptor &&other) noexcept
-    {
-        std::swap(m_descriptor, other.m_descriptor);
-        return *this;
-    }
-
-    [[nodiscard]] int get() const noexcept { return m_descriptor; }
-    explicit operator bool() const noexcept { return m_descriptor >= 0; }
-
-private:
-    int m_descriptor = -1;
-};
 
 /// The directory "kavell-accounts" below $XDG_DATA_HOME, else below ~/.local/share. It need not exist.
 [[nodiscard]] std::string credentialDirectory();
@@ -58,7 +33,7 @@ public:
     [[nodiscard]] State state() const noexcept { return m_state; }
 
 private:
-    Descriptor m_file;
+    FileDescriptor m_file;
     State m_state = State::failed;
 };
 
