@@ -53,3 +53,33 @@ function(kavell_register_test name)
     set_tests_properties(${name} PROPERTIES TIMEOUT "${ARG_TIMEOUT}" LABELS "${ARG_LABELS}" ENVIRONMENT
         "KAVELL_SOURCE_DIR=${PROJECT_SOURCE_DIR};KAVELL_BUILD_DIR=${PROJECT_BINARY_DIR};TSAN_OPTIONS=halt_on_error=1 die_after_fork=0 atexit_sleep_ms=20 suppressions=${PROJECT_SOURCE_DIR}/tests/support/tsan.supp")
 endfunction()
+
+# kavell_add_object_layer_library(NAME file…)
+#
+# One folder of libkavellaccounts, as objects with moc run over its sources. The public headers with Q_OBJECT are listed
+# by the folder that implements them.
+function(kavell_add_object_layer_library name)
+    add_library(${name} OBJECT ${ARGN})
+    set_target_properties(${name} PROPERTIES AUTOMOC ON)
+    target_link_libraries(${name} PUBLIC kavell_options kavellstore Qt6::Core Qt6::Gui Qt6::Widgets)
+    target_compile_definitions(${name} PRIVATE QT_NO_CAST_TO_ASCII QT_NO_FOREACH)
+endfunction()
+
+# kavell_add_object_layer_test(NAME SOURCES file… [LIBRARIES target…] [TIMEOUT seconds] [LABELS label…] [INTERNAL])
+#
+# A GoogleTest program for the object layer, isolated like all others and drawing offscreen. It links the shared library
+# as a client does, so that plug-in bundles share its classes; INTERNAL links the library's objects instead, for tests
+# that look at what is not exported and load no bundle.
+function(kavell_add_object_layer_test name)
+    cmake_parse_arguments(ARG "INTERNAL" "TIMEOUT" "SOURCES;LIBRARIES;LABELS" ${ARGN})
+    add_executable(${name} ${ARG_SOURCES})
+    set_target_properties(${name} PROPERTIES AUTOMOC ON RUNTIME_OUTPUT_DIRECTORY "${PROJECT_BINARY_DIR}/tests")
+    if(ARG_INTERNAL)
+        target_link_libraries(${name} PRIVATE kavellaccounts_internal)
+    else()
+        target_link_libraries(${name} PRIVATE kavellaccounts)
+    endif()
+    target_link_libraries(${name} PRIVATE kavell_options kavell_object_layer_test_support ${ARG_LIBRARIES} GTest::gtest
+                          GTest::gmock)
+    kavell_register_test(${name} COMMAND $<TARGET_FILE:${name}> TIMEOUT "${ARG_TIMEOUT}" LABELS ${ARG_LABELS})
+endfunction()

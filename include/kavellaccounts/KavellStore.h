@@ -19,6 +19,7 @@
 #include <kavellaccounts/CSKavellDictionary.h>
 #include <kavellaccounts/CSKavellNotification.h>
 #include <kavellaccounts/CSKavellNumber.h>
+#include <kavellaccounts/CSKavellPropertyList.h>
 #include <kavellaccounts/CSKavellString.h>
 #include <kavellaccounts/CSKavellType.h>
 #include <kavellaccounts/CSKavellURL.h>
