@@ -38,7 +38,5 @@ const QString kJapaneseCommercialSuffix = QStringLiteral(".co.jp");
 const QString kSystemPluginDirectory = QStringLiteral("/System/Library/KavellAccounts");
 // The library's own domain of the user's preferences.
 const QString kPreferencesDomain = QStringLiteral("com.corvane.kavellaccounts");
-// The maker's online-service library, which may be absent.
-const char kOnlineServiceLibraryPath[] = KAVELL_ONLINE_SERVICE_LIBRARY;
 
 }  // namespace kavell::configuration

@@ -37,7 +37,7 @@ extern const QString kJapaneseCommercialSuffix;
 // Places
 extern const QString kSystemPluginDirectory;
 extern const QString kPreferencesDomain;
-extern const char kOnlineServiceLibraryPath[];  ///< fixed when the library is built
+extern const char kOnlineServiceLibraryPath[];  ///< in online_service_path.cpp, fixed when the library is built
 
 }  // namespace kavell::configuration
 

@@ -1,0 +1,47 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+//
+// Reading settings dictionaries. "Has a value" is a key with a value that is not null; a present but empty text is a
+// value. A value of another type than text is no text.
+
+#ifndef KAVELL_MODEL_SETTINGS_READING_H
+#define KAVELL_MODEL_SETTINGS_READING_H
+
+#include <QtCore/QString>
+#include <QtCore/QVariantMap>
+
+namespace kavell {
+
+/// Whether a value stands for nothing: invalid, or a null text.
+[[nodiscard]] inline bool isNothing(const QVariant &value)
+{
+    return !value.isValid() || (value.metaType().id() == QMetaType::QString && value.isNull());
+}
+
+/// The text of a value; null for nothing and for values of other types.
+[[nodiscard]] inline QString textOf(const QVariant &value)
+{
+    return value.metaType().id() == QMetaType::QString ? *static_cast<const QString *>(value.constData()) : QString();
+}
+
+[[nodiscard]] inline bool hasValueForKey(const QVariantMap &settings, const QString &key)
+{
+    const auto found = settings.constFind(key);
+    return found != settings.cend() && !isNothing(*found);
+}
+
+[[nodiscard]] inline QString textForKey(const QVariantMap &settings, const QString &key)
+{
+    const auto found = settings.constFind(key);
+    return found != settings.cend() ? textOf(*found) : QString();
+}
+
+/// Whether the key holds a text that is not empty.
+[[nodiscard]] inline bool hasTextForKey(const QVariantMap &settings, const QString &key)
+{
+    return !textForKey(settings, key).isEmpty();
+}
+
+}  // namespace kavell
+
+#endif
