@@ -3,25 +3,26 @@
 //
 // Which hosts receive the mail of a domain, and is a given provider among them? One object asks once:
 //
-//     KADNSService service("example.net");
-//     service.beginQuerySync();
-//     if (service.hasMailHost("mx.example.com")) …
+//     const auto service = KADNSService::initWithServerAddress("example.net");
+//     service->beginQuerySync();
+//     if (service->hasMailHost("mx.example.com")) …
 //
 // Answers are cached for the life of the process, empty ones included. An object belongs to one thread at a time; many
-// objects may ask at once.
+// objects may ask at once. No application object is needed.
 
 #ifndef KAVELLACCOUNTS_KADNSSERVICE_H
 #define KAVELLACCOUNTS_KADNSSERVICE_H
 
 #include <memory>
 
+#include <QtCore/QSemaphore>
 #include <QtCore/QString>
 #include <QtCore/QStringList>
 
 #include <kavellaccounts/KAExport.h>
 #include <kavellaccounts/KAObject.h>
 
-class KAVELL_ACCOUNTS_EXPORT KADNSService : public KAObject {
+class KAVELL_ACCOUNTS_EXPORT KADNSService : public KAObject, public std::enable_shared_from_this<KADNSService> {
 public:
     /// Keeps the domain as it is; the cache is on.
     [[nodiscard]] static std::shared_ptr<KADNSService> initWithServerAddress(const QString &serverAddress);
@@ -37,6 +38,9 @@ public:
     [[nodiscard]] bool useCache() const;
     void setUseCache(bool useCache);
 
+    /// What the answers are waited for with; null once the object has asked.
+    [[nodiscard]] std::shared_ptr<QSemaphore> semaphore() const;
+
     /// Asks for the domain's mail exchangers, once per object. Blocks for at most 0.5 seconds. A domain of fewer than
     /// two labels is not asked about. What has not arrived by then is missing, in the cache too.
     void beginQuerySync();
@@ -48,8 +52,12 @@ public:
 
 private:
     explicit KADNSService(const QString &serverAddress);
-    struct State;
-    std::shared_ptr<State> m_state;
+    void query();
+
+    QString _serverAddress;
+    QStringList _mailServers;
+    std::shared_ptr<QSemaphore> _semaphore;
+    bool _useCache = true;
 };
 
 #endif
