@@ -19,6 +19,7 @@
 #include <memory>
 #include <mutex>
 #include <optional>
+#include <string>
 
 #include <QtCore/QHash>
 #include <QtCore/QList>
@@ -148,17 +149,20 @@ public:
     [[nodiscard]] std::unique_ptr<KAPlugin> createKAPluginAtPath(const QString &path);
     [[nodiscard]] std::unique_ptr<KAPlugin> _createPluginFromBundle(const std::shared_ptr<KABundle> &bundle);
 
-    /// What became of one bundle that a search met.
+    /// What became of one bundle, or of one directory, that a search met.
     struct BundleReport {
         enum class Outcome {
-            Registered,
-            Shadowed,
-            NoBundle,
+            Registered,      ///< the plug-in of this bundle is in the registry
+            Shadowed,        ///< another bundle with this identifier came first
+            WrongExtension,  ///< ".kaplugin" in another case of letters
+            NoBundle,        ///< no readable information dictionary
             NoIdentifier,
             UnsupportedVersion,
-            NotLoaded,
-            NoObject,
-            Threw
+            NotLoaded,           ///< the code could not be loaded
+            NoObject,            ///< the code has no factory for the principal class, or that made nothing
+            Threw,               ///< the rest of its directory was given up
+            DirectoryMissing,    ///< nothing is at the path of the directory
+            DirectoryNotListed,  ///< the directory cannot be listed, or its path is no URL path
         };
         QString path;
         QString identifier;  ///< null when it has none
@@ -166,21 +170,25 @@ public:
         QString reason;  ///< a sentence for people; null for Registered
     };
 
-    /// Searches all directories and says what was found where, in the order of the search, directories that list
-    /// nothing included as reports without identifier whose reason says why. For tools that explain.
+    /// Searches all directories and says what was found where, in the order of the search. For tools that explain.
     [[nodiscard]] QList<BundleReport> surveyBundles();
     /// @}
 
     void describeFields(KAFieldList &fields) const override;
 
 private:
+    struct Search;
+
     template <typename Plugin> QList<Plugin *> _allPluginsForClass();
+    template <typename Plugin> QList<Plugin *> pluginsSupportingServices(const QStringList &services);
+    void searchDirectory(Search &search, size_t index, const std::optional<QStringList> &identifiers);
+    BundleReport loadBundle(const QString &path, const std::optional<QStringList> &identifiers);
+    void surveyDirectory(const std::string &path, QList<BundleReport> &reports);
 
     mutable std::recursive_mutex m_registryLock;
     QHash<QString, KAPlugin *> _plugins;
     QHash<QString, QString> _cachedDisplayNames;
     QHash<QString, QString> _cachedImagePaths;
-    struct Search;
     std::unique_ptr<Search> m_search;
 };
 
