@@ -17,6 +17,7 @@
 #include <kavellaccounts/KAPluginManager.h>
 #include <kavellaccounts/KAProvider.h>
 
+#include "model/chat_plugins.h"
 #include "model/configuration.h"
 #include "model/settings_reading.h"
 
@@ -41,23 +42,6 @@ const std::array<MatcherRow, 5> kMatchers{{
     {kKACalendarPluginID, &KAPluginManager::_matchingAlistAccountForCalendarAccountSettings},
     {kKAContactsPluginID, &KAPluginManager::_matchingAlistAccountForContactsAccountSettings},
     {kKAChatPluginID, &KAPluginManager::_matchingAlistAccountForChatAccountSettings},
-}};
-
-/// The plug-in that a chat service's accounts belong to. Chat of the maker's online service is never Quillane's.
-struct ChatRow {
-    const QString &chatType;
-    const QString &pluginID;
-};
-
-const QString kChatTypeYahooLiteral = QStringLiteral("Yahoo!");
-
-const std::array<ChatRow, 6> kChatPlugins{{
-    {KAChatAcctTypeAIM, kKAAOLPluginID},
-    {KAChatAcctTypeGoogle, kKAGooglePluginID},
-    {KAChatAcctTypeNimbrel, kKANimbrelPluginID},
-    {KAChatAcctTypeDorvex, kKANimbrelPluginID},
-    {KAChatAcctTypeYahoo, kKAYahooPluginID},
-    {kChatTypeYahooLiteral, kKAYahooPluginID},
 }};
 
 bool isBrondel(const QString &address, KADecisionTrace *trace)
@@ -234,10 +218,8 @@ Account KAPluginManager::_matchingAlistAccountForChatAccountSettings(const QVari
 {
     const QString chatType = textForKey(settings, KAChatAccountTypeKey);
     const QString pluginID = KADecisionTrace::noting(trace, "chat service", chatType, [&] {
-        for (const ChatRow &row : kChatPlugins) {
-            if (row.chatType == chatType)
-                return row.pluginID;
-        }
+        if (const QString known = kavell::pluginIDForChatType(chatType); !known.isNull())
+            return known;
         const bool ownServer =
             hasHaldenServerType(settings) || KAIsKnownHaldenServer(textForKey(settings, KAChatServerKey));
         return ownServer ? kKAHaldenServerPluginID : QString();
