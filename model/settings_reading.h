@@ -10,13 +10,9 @@
 #include <QtCore/QString>
 #include <QtCore/QVariantMap>
 
-namespace kavell {
+#include "platform/qt/value_conversion.h"
 
-/// Whether a value stands for nothing: invalid, or a null text.
-[[nodiscard]] inline bool isNothing(const QVariant &value)
-{
-    return !value.isValid() || (value.metaType().id() == QMetaType::QString && value.isNull());
-}
+namespace kavell {
 
 /// The text of a value; null for nothing and for values of other types.
 [[nodiscard]] inline QString textOf(const QVariant &value)

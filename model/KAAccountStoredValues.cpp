@@ -1,0 +1,68 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+//
+// The side store of an account: values in the user's preferences, under "Accounts" by login name. Deliberately by
+// nothing else, so that accounts of one login name share them whatever their provider. Threading as KAAccount.
+
+#include <kavellaccounts/KAAccount.h>
+#include <kavellaccounts/KADefaults.h>
+
+#include "model/settings_reading.h"
+#include "platform/qt/value_conversion.h"
+
+using namespace kavell;
+
+namespace {
+
+const QString kAccountsKey = QStringLiteral("Accounts");
+
+QVariantMap storedAccounts()
+{
+    return KADefaults::shared()->objectForKey(kAccountsKey).toMap();
+}
+
+void storeAccounts(const QVariantMap &accounts)
+{
+    const auto defaults = KADefaults::shared();
+    defaults->setObject(accounts, kAccountsKey);
+    defaults->synchronize();
+}
+
+}  // namespace
+
+void KAAccount::storeValue(const QVariant &value, const QString &key)
+{
+    // Refused here, where the log can name the key.
+    if (!toStoreObject(value, key))
+        return;
+    QVariantMap accounts = storedAccounts();
+    QVariantMap entry = accounts.value(loginName()).toMap();
+    if (isNothing(value))
+        entry.remove(key);
+    else
+        entry.insert(key, value);
+    accounts.insert(loginName(), entry);
+    storeAccounts(accounts);
+}
+
+QVariant KAAccount::storedValueForKey(const QString &key) const
+{
+    return storedAccounts().value(loginName()).toMap().value(key);
+}
+
+void KAAccount::removeStoredData()
+{
+    if (!KADefaults::shared()->objectForKey(kAccountsKey).isValid())
+        return;
+    QVariantMap accounts = storedAccounts();
+    accounts.remove(loginName());
+    storeAccounts(accounts);
+}
+
+void KAAccount::mergeStoredData()
+{
+    const QVariantMap entry = storedAccounts().value(loginName()).toMap();
+    for (auto stored = entry.begin(); stored != entry.end(); ++stored)
+        if (isNothing(providerAttributeForKey(stored.key())))
+            setProviderAttribute(stored.value(), stored.key());
+}

@@ -1,0 +1,60 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+//
+// Between the toolkit's values and the store's objects. What goes in comes out the same:
+//
+//     QString           string         QVariantMap, QVariantHash                      dictionary
+//     bool              boolean        QVariantList, QStringList, QList<QVariantMap>  array
+//     whole numbers     integer        QByteArray                                     data
+//     double, float     real           QDateTime                                      date, in whole seconds and UTC
+//     QUrl              string, the URL's absolute text
+//
+// Whatever a property list cannot hold is refused on the way in, so that no account becomes one that cannot be saved.
+// Used by the object layer wherever it touches the store; any thread may call, nothing blocks.
+
+#ifndef KAVELL_PLATFORM_QT_VALUE_CONVERSION_H
+#define KAVELL_PLATFORM_QT_VALUE_CONVERSION_H
+
+#include <optional>
+
+#include <QtCore/QString>
+#include <QtCore/QVariant>
+#include <QtCore/QVariantMap>
+
+#include <kavellaccounts/CSKavellDictionary.h>
+#include <kavellaccounts/Ref.h>
+
+namespace kavell {
+
+/// Whether a value stands for nothing: invalid, or a null text.
+[[nodiscard]] inline bool isNothing(const QVariant &value)
+{
+    return !value.isValid() || (value.metaType().id() == QMetaType::QString && value.isNull());
+}
+
+/// The text of a string; null for none, and never null for an empty string.
+[[nodiscard]] QString toQString(CSKavellStringRef string);
+
+/// A string of the text, none for a null one. Halves of characters become U+FFFD.
+[[nodiscard]] Ref<CSKavellStringRef> toStoreString(const QString &text);
+
+/// The value of an object; invalid for none, for objects of other types than those above and URLs (which come out as
+/// QUrl), and for containers too deep for a property list. Whole numbers come out as qlonglong, or as qulonglong above
+/// its range. Members without a value are left out of their container.
+[[nodiscard]] QVariant toVariant(CSKavellTypeRef object);
+[[nodiscard]] QVariantMap toVariantMap(CSKavellDictionaryRef dictionary);
+
+/// The object to store under a key: none for a value that stands for nothing, which removes the key. Not set when a property list could not hold the key or the value; one line in the log then names
+/// the key and the type that was refused. A null key is let through: the store ignores it.
+[[nodiscard]] std::optional<Ref<CSKavellTypeRef>> toStoreObject(const QVariant &value, const QString &key);
+
+/// Whether a property list could hold the text as a key; if not, one line in the log says so. A null one is let through.
+[[nodiscard]] bool isStorableKey(const QString &key);
+
+/// The dictionary to store, without the keys whose values stand for nothing. Not set when a key or value is refused, as
+/// above.
+[[nodiscard]] std::optional<Ref<CSKavellDictionaryRef>> toStoreDictionary(const QVariantMap &map);
+
+}  // namespace kavell
+
+#endif
