@@ -35,6 +35,10 @@ class KAApplication;
 class KASheetMorpher;
 class KASheetWindow;
 
+namespace kavell {
+class DomainMatcher;
+}
+
 class KAVELL_ACCOUNTS_EXPORT KAAListPlugin : public KAPlugin {
     Q_OBJECT
 
@@ -145,6 +149,12 @@ protected:
     QPointer<QLabel> _appSelectionAccountName;
     QPointer<QPushButton> _appSelectionOKButton;
     /// @}
+
+private:
+    void enableAppSelectionOKButton();
+
+    mutable std::mutex m_domainsMutex;  // of the cached domains and what was made of them
+    std::shared_ptr<const kavell::DomainMatcher> m_domainMatcher;
 };
 
 #endif

@@ -81,7 +81,7 @@ protected:
     void accountSetupDidFinish(const std::shared_ptr<KAAccountSetupInput> &input,
                                const std::shared_ptr<KAAccountSetupResult> &result);
     void accountSetupDidFail(const std::shared_ptr<KAAccountSetupInput> &input, const KAError &error);
-    void handleCertificateError(const KAError &error);
+    bool handleCertificateError(const KAError &error);  ///< the delegate's bool answer; false without one
     void didCreateAccountUID(const QString &uid);
     void didChangeAccountUID(const QString &uid);
     void didDeleteAccountUID(const QString &uid);

@@ -17,10 +17,6 @@
 
 class KASheetWindow;
 
-namespace kavell {
-class CrossFadeView;
-}
-
 class KAVELL_ACCOUNTS_EXPORT KASheetMorpher : public KAObject {
 public:
     [[nodiscard]] static std::shared_ptr<KASheetMorpher>
@@ -31,9 +27,7 @@ public:
     void setHostSheet(std::shared_ptr<KASheetWindow> hostSheet);
 
     /// Makes `view` the sheet's content; nothing happens when it is so already. With `animate` returns when the
-    /// animation has ended (the event loop runs meanwhile), and at once where no event loop can run. The animation
-    /// lasts as long as the style's others (200 ms, usually). The view that is taken out is not deleted. A call that
-    /// comes meanwhile, from an event, wins.
+    /// animation has ended (the event loop runs meanwhile), and at once where no event loop can run.
     void setContentView(QWidget *view, bool animate);
 
     void describeFields(KAFieldList &fields) const override;
@@ -41,11 +35,7 @@ public:
 private:
     explicit KASheetMorpher(std::shared_ptr<KASheetWindow> hostSheet);
     std::shared_ptr<KASheetWindow> _hostSheet;
-    void swapAnimated(QWidget *view, const QRect &target);
-    void prepareCrossFadeView(QWidget *view);
-
-    std::unique_ptr<kavell::CrossFadeView> _crossFadeImageView;  ///< made on first use and kept
-    std::shared_ptr<int> m_swap;                                 ///< stands for the latest call
+    std::unique_ptr<QWidget> _crossFadeImageView;  ///< made on first use and kept
 };
 
 #endif
