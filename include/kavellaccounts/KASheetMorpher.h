@@ -17,6 +17,10 @@
 
 class KASheetWindow;
 
+namespace kavell {
+class CrossFadeView;
+}
+
 class KAVELL_ACCOUNTS_EXPORT KASheetMorpher : public KAObject {
 public:
     [[nodiscard]] static std::shared_ptr<KASheetMorpher>
@@ -27,7 +31,9 @@ public:
     void setHostSheet(std::shared_ptr<KASheetWindow> hostSheet);
 
     /// Makes `view` the sheet's content; nothing happens when it is so already. With `animate` returns when the
-    /// animation has ended (the event loop runs meanwhile), and at once where no event loop can run.
+    /// animation has ended (the event loop runs meanwhile), and at once where no event loop can run. The animation
+    /// lasts as long as the style's others (200 ms, usually). The view that is taken out is not deleted. A call that
+    /// comes meanwhile, from an event, wins.
     void setContentView(QWidget *view, bool animate);
 
     void describeFields(KAFieldList &fields) const override;
@@ -35,7 +41,11 @@ public:
 private:
     explicit KASheetMorpher(std::shared_ptr<KASheetWindow> hostSheet);
     std::shared_ptr<KASheetWindow> _hostSheet;
-    std::unique_ptr<QWidget> _crossFadeImageView;  ///< made on first use and kept
+    void swapAnimated(QWidget *view, const QRect &target);
+    void prepareCrossFadeView(QWidget *view);
+
+    std::unique_ptr<kavell::CrossFadeView> _crossFadeImageView;  ///< made on first use and kept
+    std::shared_ptr<int> m_swap;                                 ///< stands for the latest call
 };
 
 #endif
