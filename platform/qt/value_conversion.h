@@ -26,10 +26,11 @@
 
 namespace kavell {
 
-/// Whether a value stands for nothing: invalid, or a null text.
+/// Whether a value stands for nothing: invalid, or a null text. (A variant that holds a null text is not null itself.)
 [[nodiscard]] inline bool isNothing(const QVariant &value)
 {
-    return !value.isValid() || (value.metaType().id() == QMetaType::QString && value.isNull());
+    return !value.isValid() ||
+           (value.metaType().id() == QMetaType::QString && static_cast<const QString *>(value.constData())->isNull());
 }
 
 /// The text of a string; null for none, and never null for an empty string.
