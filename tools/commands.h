@@ -23,6 +23,13 @@ ExitCode runDoctor(const Words &words);
 ExitCode runImport(const Words &words);
 ExitCode runExport(const Words &words);
 
+// These load the object layer (object_layer.h).
+ExitCode runPlugins(const Words &words);
+ExitCode runIdentify(const Words &words);
+ExitCode runMatch(const Words &words);
+ExitCode runChildren(const Words &words);
+ExitCode runServers(const Words &words);
+
 /// Hidden: the words of one kind, one a line, for shell completion.
 ExitCode runWords(const Words &words);
 

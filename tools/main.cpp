@@ -25,7 +25,7 @@ struct Command {
     ExitCode (*run)(const Words &words);
 };
 
-constexpr std::array<Command, 12> commands{{
+constexpr std::array<Command, 17> commands{{
     {"list", "List the accounts", runList},
     {"show", "Show one account with its attributes", runShow},
     {"add", "Add an account", runAdd},
@@ -37,6 +37,11 @@ constexpr std::array<Command, 12> commands{{
     {"doctor", "Find, and with --repair mend, what is wrong", runDoctor},
     {"import", "Add accounts from a JSON file", runImport},
     {"export", "Write accounts as JSON, without passwords", runExport},
+    {"plugins", "List the plug-ins, and why one was refused", runPlugins},
+    {"identify", "Tell which plug-in an address, server or settings belong to", runIdentify},
+    {"match", "Find the account that an application's account belongs to", runMatch},
+    {"children", "List the applications' accounts of one account", runChildren},
+    {"servers", "List, add or remove organisation servers", runServers},
     {"words", "", runWords},
 }};
 
