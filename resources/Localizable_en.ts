@@ -95,5 +95,55 @@
         <extracomment>Button: do not trust the server</extracomment>
         <translation>Cancel</translation>
     </message>
+    <message id="CERT_PANEL_HELP">
+        <source></source>
+        <extracomment>Button of the certificate panel</extracomment>
+        <translation>Help</translation>
+    </message>
+    <message id="CERT_PANEL_HELP_TEXT">
+        <source></source>
+        <extracomment>What the help button of the certificate panel shows</extracomment>
+        <translation>A certificate tells you whose server this is. When it cannot be verified, someone may be posing as the server to get at your password. Continue only when you know why the certificate cannot be verified.</translation>
+    </message>
+    <message id="CERT_PANEL_CHAIN">
+        <source></source>
+        <extracomment>The list of certificates, for screen readers</extracomment>
+        <translation>Certificates of the server</translation>
+    </message>
+    <message id="CERT_PANEL_DETAILS">
+        <source></source>
+        <extracomment>Details of the selected certificate, for screen readers</extracomment>
+        <translation>Certificate details</translation>
+    </message>
+    <message id="CERT_PANEL_SUBJECT">
+        <source></source>
+        <extracomment>Label in the certificate's details</extracomment>
+        <translation>Issued to:</translation>
+    </message>
+    <message id="CERT_PANEL_ISSUER">
+        <source></source>
+        <extracomment>Label in the certificate's details</extracomment>
+        <translation>Issued by:</translation>
+    </message>
+    <message id="CERT_PANEL_VALID_FROM">
+        <source></source>
+        <extracomment>Label in the certificate's details</extracomment>
+        <translation>Valid from:</translation>
+    </message>
+    <message id="CERT_PANEL_VALID_UNTIL">
+        <source></source>
+        <extracomment>Label in the certificate's details</extracomment>
+        <translation>Valid until:</translation>
+    </message>
+    <message id="CERT_PANEL_NAMES">
+        <source></source>
+        <extracomment>Label in the certificate's details: host names</extracomment>
+        <translation>Names:</translation>
+    </message>
+    <message id="CERT_PANEL_FINGERPRINT">
+        <source></source>
+        <extracomment>Label in the certificate's details</extracomment>
+        <translation>SHA-256 fingerprint:</translation>
+    </message>
 </context>
 </TS>
