@@ -5,7 +5,7 @@
 
 #include <QtCore/QCryptographicHash>
 #include <QtCore/QLocale>
-#include <QtNetwork/QSsl>
+#include <QtGui/QTextOption>
 #include <QtWidgets/QDialogButtonBox>
 #include <QtWidgets/QHeaderView>
 #include <QtWidgets/QLabel>
@@ -75,6 +75,8 @@ void CertificatePanel::addChain()
     m_tree->setTextElideMode(Qt::ElideMiddle);
     m_details = new QPlainTextEdit;
     m_details->setReadOnly(true);
+    m_details->setWordWrapMode(QTextOption::WrapAtWordBoundaryOrAnywhere);
+    m_details->setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
     m_details->setTabChangesFocus(true);
     m_details->setAccessibleName(m_texts.detailsName);
 
