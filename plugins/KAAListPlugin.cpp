@@ -28,7 +28,9 @@ const QString kDomainsType = QStringLiteral("plist");
 
 }  // namespace
 
-KAAListPlugin::KAAListPlugin(std::shared_ptr<KABundle> bundle) : KAPlugin(std::move(bundle)) {}
+KAAListPlugin::KAAListPlugin(std::shared_ptr<KABundle> bundle) : KAPlugin(std::move(bundle))
+{
+}
 
 KAAListPlugin::~KAAListPlugin()
 {
@@ -52,7 +54,9 @@ void KAAListPlugin::back(QObject *)
     showView(_validationView, true);
 }
 
-void KAAListPlugin::continueButton(QObject *) {}
+void KAAListPlugin::continueButton(QObject *)
+{
+}
 
 void KAAListPlugin::addAccount(QObject *)
 {
@@ -139,9 +143,13 @@ QImage KAAListPlugin::imageForAccount(const std::shared_ptr<KAAccount> &)
     throw KARequiredMethodException("-[KAAListPlugin imageForAccount:]");
 }
 
-void KAAListPlugin::signInAccount(const std::shared_ptr<KAAccount> &, QWidget *) {}
+void KAAListPlugin::signInAccount(const std::shared_ptr<KAAccount> &, QWidget *)
+{
+}
 
-void KAAListPlugin::createAccountInWindowWithWayfenArgs(QWidget *, const QVariantMap &) {}
+void KAAListPlugin::createAccountInWindowWithWayfenArgs(QWidget *, const QVariantMap &)
+{
+}
 
 void KAAListPlugin::createAccountInWindow(QWidget *)
 {
@@ -159,9 +167,13 @@ void KAAListPlugin::setEnabled(bool, const std::shared_ptr<KAApplication> &, con
     throw KARequiredMethodException("-[KAAListPlugin setEnabled:application:account:inWindow:]");
 }
 
-void KAAListPlugin::configViewDidLoad() {}
+void KAAListPlugin::configViewDidLoad()
+{
+}
 
-void KAAListPlugin::configViewWillLoad() {}
+void KAAListPlugin::configViewWillLoad()
+{
+}
 
 QWidget *KAAListPlugin::signInView()
 {

@@ -59,7 +59,8 @@ static void makeLibraryStringsAvailable()
 struct KABundle::Contents {
     Contents(QString bundlePath, QString resourceDirectory, QVariantMap info)
         : path(std::move(bundlePath)), resources(std::move(resourceDirectory)), information(std::move(info)),
-          strings(resources, QStringLiteral("Localizable")), localizedInformation(resources, QStringLiteral("InfoPlist"))
+          strings(resources, QStringLiteral("Localizable")),
+          localizedInformation(resources, QStringLiteral("InfoPlist"))
     {
     }
 
@@ -72,7 +73,9 @@ struct KABundle::Contents {
     void *handle = nullptr;
 };
 
-KABundle::KABundle(std::shared_ptr<Contents> contents) : m_contents(std::move(contents)) {}
+KABundle::KABundle(std::shared_ptr<Contents> contents) : m_contents(std::move(contents))
+{
+}
 
 KABundle::~KABundle() = default;
 
@@ -113,9 +116,9 @@ std::shared_ptr<KABundle> KABundle::bundleWithPath(const QString &path)
 std::shared_ptr<KABundle> KABundle::libraryBundle()
 {
     makeLibraryStringsAvailable();
-    static const std::shared_ptr<KABundle> bundle(new KABundle(std::make_shared<Contents>(
-        kLibraryResources, kLibraryResources,
-        QVariantMap{{kIdentifierKey, QStringLiteral("com.corvane.kavellaccounts")}})));
+    static const std::shared_ptr<KABundle> bundle(new KABundle(
+        std::make_shared<Contents>(kLibraryResources, kLibraryResources,
+                                   QVariantMap{{kIdentifierKey, QStringLiteral("com.corvane.kavellaccounts")}})));
     return bundle;
 }
 

@@ -39,7 +39,9 @@ void send(QObject *delegate, const char *message, KADataPlugin *plugin, const Ar
 
 }  // namespace
 
-KADataPlugin::KADataPlugin(std::shared_ptr<KABundle> bundle) : KAPlugin(std::move(bundle)) {}
+KADataPlugin::KADataPlugin(std::shared_ptr<KABundle> bundle) : KAPlugin(std::move(bundle))
+{
+}
 
 KADataPlugin::~KADataPlugin() = default;
 
@@ -55,11 +57,17 @@ void KADataPlugin::setDelegate(QObject *delegate)
     _delegate = delegate;
 }
 
-void KADataPlugin::nbsAccountStartedMigration(const std::shared_ptr<KAAccount> &) {}
+void KADataPlugin::nbsAccountStartedMigration(const std::shared_ptr<KAAccount> &)
+{
+}
 
-void KADataPlugin::deactivateAccountUID(const QString &) {}
+void KADataPlugin::deactivateAccountUID(const QString &)
+{
+}
 
-void KADataPlugin::activateAccountUID(const QString &) {}
+void KADataPlugin::activateAccountUID(const QString &)
+{
+}
 
 QImage KADataPlugin::imageForAccountUID(const QString &)
 {

@@ -17,7 +17,9 @@ const QString kBundleNameKey = QStringLiteral("KABundleName");
 
 }  // namespace
 
-KAPlugin::KAPlugin(std::shared_ptr<KABundle> bundle) : _bundle(std::move(bundle)) {}
+KAPlugin::KAPlugin(std::shared_ptr<KABundle> bundle) : _bundle(std::move(bundle))
+{
+}
 
 KAPlugin::~KAPlugin() = default;
 
@@ -87,9 +89,13 @@ QString KAPlugin::userVisibleProviderName() const
     return plain.metaType() == QMetaType::fromType<QString>() ? plain.toString() : identifier();
 }
 
-void KAPlugin::willSelectAccount(const std::shared_ptr<KAAccount> &) {}
+void KAPlugin::willSelectAccount(const std::shared_ptr<KAAccount> &)
+{
+}
 
-void KAPlugin::pluginDidLoad() {}
+void KAPlugin::pluginDidLoad()
+{
+}
 
 void KAPlugin::describeFields(KAFieldList &fields) const
 {

@@ -95,9 +95,8 @@ bool DomainMatcher::isExcluded(const QString &domain) const
 {
     if (m_excluded.contains(domain))
         return true;
-    return !m_excludedSubTrees.isEmpty() && anyAfterADot(domain, [this](QStringView rest) {
-        return m_excludedSubTrees.contains(rest.toString());
-    });
+    return !m_excludedSubTrees.isEmpty() &&
+           anyAfterADot(domain, [this](QStringView rest) { return m_excludedSubTrees.contains(rest.toString()); });
 }
 
 bool DomainMatcher::beginsWithAnEntry(QStringView text) const

@@ -29,7 +29,9 @@ QStringList languages()
 
 }  // namespace
 
-StringTable::StringTable(QString directory, QString name) : m_directory(std::move(directory)), m_name(std::move(name)) {}
+StringTable::StringTable(QString directory, QString name) : m_directory(std::move(directory)), m_name(std::move(name))
+{
+}
 
 StringTable::~StringTable() = default;
 

@@ -1,0 +1,37 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+
+// Principal classes that fail in one way each.
+
+#include <stdexcept>
+
+#include <kavellaccounts/KADataPlugin.h>
+
+class ThrowingInFactory : public KADataPlugin {
+public:
+    explicit ThrowingInFactory(std::shared_ptr<KABundle> bundle) : KADataPlugin(std::move(bundle))
+    {
+        throw std::runtime_error("no constructor today");
+    }
+};
+
+class ThrowingInDidLoad : public KADataPlugin {
+public:
+    explicit ThrowingInDidLoad(std::shared_ptr<KABundle> bundle) : KADataPlugin(std::move(bundle)) {}
+    void pluginDidLoad() override { throw 7; }
+};
+
+class Working : public KADataPlugin {
+public:
+    explicit Working(std::shared_ptr<KABundle> bundle) : KADataPlugin(std::move(bundle)) {}
+};
+
+KA_EXPORT_PLUGIN(ThrowingInFactory)
+KA_EXPORT_PLUGIN(ThrowingInDidLoad)
+KA_EXPORT_PLUGIN(Working)
+
+extern "C" __attribute__((visibility("default"))) KAPlugin *
+KAPluginFactory_AnsweringNull(const std::shared_ptr<KABundle> &)
+{
+    return nullptr;
+}
