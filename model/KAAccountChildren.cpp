@@ -1,8 +1,8 @@
 // SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
-// The child accounts of an account-list account, kept in one provider attribute: a dictionary from the UID that a client
-// application knows its account by to the child's settings.
+// The child accounts of an account-list account, kept in one provider attribute: a dictionary from the UID that a
+// client application knows its account by to the child's settings.
 
 #include <kavellaccounts/KAAccount.h>
 #include <kavellaccounts/KAConstants.h>
@@ -25,8 +25,8 @@ std::optional<QVariantMap> childrenOf(const KAAccount &account)
     return children.metaType().id() == QMetaType::QVariantMap ? std::optional(children.toMap()) : std::nullopt;
 }
 
-/// Whether a child belongs to the plug-in. One without a plug-in identifier belongs to nobody, which differs from an empty
-/// identifier.
+/// Whether a child belongs to the plug-in. One without a plug-in identifier belongs to nobody, which differs from an
+/// empty identifier.
 bool belongsTo(const QVariant &child, const QString &pluginID)
 {
     const QString own = textForKey(child.toMap(), kPluginIDKey);
@@ -43,7 +43,7 @@ bool isDictionary(const QVariant &value)
 bool isInactive(const QString &pluginID, const QString &uid)
 {
     auto *const plugin = qobject_cast<KADataPlugin *>(KAPluginManager::shared()->pluginWithIdentifier(pluginID));
-    return plugin && plugin->settingsForAccountUID(uid).value(KAMailInactiveAccountKey).toBool();
+    return plugin && kavell::isTrueForKey(plugin->settingsForAccountUID(uid), KAMailInactiveAccountKey);
 }
 
 }  // namespace
@@ -59,7 +59,8 @@ QVariantMap KAAccount::childDictionaryWithSettings(const QVariantMap &settings, 
     }
     // Password and inactive flag stay with the client application. A setting called "uid" or "pluginID" wins.
     for (auto setting = settings.begin(); setting != settings.end(); ++setting) {
-        if (setting.key() != KAMailInactiveAccountKey && setting.key() != KAMailPasswordKey)
+        const bool staysBehind = setting.key() == KAMailInactiveAccountKey || setting.key() == KAMailPasswordKey;
+        if (!staysBehind && !kavell::isNothing(setting.value()))
             child.insert(setting.key(), setting.value());
     }
     return child;
@@ -89,7 +90,7 @@ std::optional<QVariantMap> KAAccount::childAccountWithPluginID(const QString &pl
 std::optional<QVariantMap> KAAccount::childAccountWithUID(const QString &uid) const
 {
     const std::optional<QVariantMap> children = childrenOf(*this);
-    const QVariant child = children ? children->value(uid) : QVariant();
+    const QVariant child = children && !uid.isNull() ? children->value(uid) : QVariant();
     return isDictionary(child) ? std::optional(child.toMap()) : std::nullopt;
 }
 
@@ -108,7 +109,8 @@ void KAAccount::removeChildAccountWithUID(const QString &uid)
     std::optional<QVariantMap> children = childrenOf(*this);
     if (!children)
         return;
-    children->remove(uid);
+    if (!uid.isNull())
+        children->remove(uid);
     setProviderAttribute(*children, kKAAccountSettingChildAccounts);
     commitPendingChanges();
 }

@@ -18,8 +18,8 @@ namespace {
 
 using Keys = std::initializer_list<const QString *>;
 
-/// Forms an identifier from the texts that `valueForKey` finds. The fall-backs stand in for a missing user and a missing
-/// server; a settings dictionary has neither, so that what says nothing gets no identity.
+/// Forms an identifier from the texts that `valueForKey` finds. The fall-backs stand in for a missing user and a
+/// missing server; a settings dictionary has neither, so that what says nothing gets no identity.
 template <typename ValueForKey>
 QString identifier(ValueForKey &&valueForKey, const QString &userFallback, const QString &serverFallback)
 {

@@ -15,8 +15,8 @@
 
 namespace {
 
-/// What an application's settings can hold that the library knows. The password among them is deliberate: settings carry
-/// it in plain text under a key that they share with the contacts application.
+/// What an application's settings can hold that the library knows. The password among them is deliberate: settings
+/// carry it in plain text under a key that they share with the contacts application.
 const QStringList &knownKeys()
 {
     static const QStringList keys{
@@ -76,8 +76,10 @@ QVariantMap KAAccount::dictionaryRepresentationMergedWithChildDict(const std::op
     insert("provider", provider());
     insert("loginName", loginName());
     insert("password", password());
-    if (child)
-        flat.insert(*child);
+    for (const auto &[key, value] : child.value_or(QVariantMap()).asKeyValueRange()) {
+        if (!kavell::isNothing(value))
+            flat.insert(key, value);
+    }
     return flat;
 }
 

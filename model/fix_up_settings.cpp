@@ -91,7 +91,7 @@ void assembleServerURL(const QVariantMap &input, const ServerKeys &keys, QVarian
 {
     if (!hasValueForKey(input, keys.host) || hasValueForKey(input, keys.url))
         return;
-    QString text = input.value(keys.useSSL).toBool() ? QStringLiteral("https://") : QStringLiteral("http://");
+    QString text = isTrueForKey(input, keys.useSSL) ? QStringLiteral("https://") : QStringLiteral("http://");
     text += textForKey(input, keys.host);
     if (hasValueForKey(input, keys.port))
         text += u':' + QString::number(input.value(keys.port).toInt());

@@ -32,6 +32,18 @@ namespace kavell {
     return found != settings.cend() ? textOf(*found) : QString();
 }
 
+/// Whether the key holds something that means yes: true, a number other than 0, or a text that begins with "y", "t" (in
+/// any case) or a digit other than 0, since settings files write flags as text too.
+[[nodiscard]] inline bool isTrueForKey(const QVariantMap &settings, const QString &key)
+{
+    const QVariant value = settings.value(key);
+    const QString text = textOf(value);
+    if (text.isNull())
+        return value.toBool();
+    const QChar first = text.isEmpty() ? QChar() : text.at(0).toLower();
+    return first == u'y' || first == u't' || (first >= u'1' && first <= u'9');
+}
+
 /// Whether the key holds a text that is not empty.
 [[nodiscard]] inline bool hasTextForKey(const QVariantMap &settings, const QString &key)
 {
