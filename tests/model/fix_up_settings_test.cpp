@@ -1,0 +1,178 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+
+#include <QtCore/QUrl>
+
+#include <gtest/gtest.h>
+
+#include <kavellaccounts/KAExtras.h>
+
+using KAExtras::fixUpSettings;
+
+TEST(FixUpSettings, LeavesItsInputAndUnknownKeysAlone)
+{
+    const QVariantMap settings{{"KAChatLoginName", "anna"}, {"other", 3}};
+    const QVariantMap fixed = fixUpSettings(settings);
+    EXPECT_EQ(settings.size(), 2);
+    EXPECT_EQ(fixed.value("other"), 3);
+}
+
+TEST(FixUpSettings, AChatLoginBecomesTheUserNameAndAnAddress)
+{
+    const struct {
+        const char *type;
+        const char *address;
+    } rows[] = {{"aim", "anna@aol.com"},
+                {"nimbrel", "anna@nimbrel.example"},
+                {"dorvex", "anna@dorvex.example"},
+                {"google", "anna@gmail.com"},
+                {"Yahoo!", "anna@yahoo.com"}};
+    for (const auto &row : rows) {
+        const QVariantMap fixed = fixUpSettings({{"KAChatLoginName", "anna"}, {"KAChatAccountType", row.type}});
+        EXPECT_EQ(fixed.value("userName"), "anna") << row.type;
+        EXPECT_EQ(fixed.value("emailAddress"), row.address) << row.type;
+    }
+}
+
+TEST(FixUpSettings, OtherChatTypesGiveNoAddress)
+{
+    for (const char *type : {"jabber", "com.corvane.Parlex.services.Yahoo", "yahoo!", ""}) {
+        const QVariantMap fixed = fixUpSettings({{"KAChatLoginName", "anna"}, {"KAChatAccountType", type}});
+        EXPECT_EQ(fixed.value("userName"), "anna");
+        EXPECT_FALSE(fixed.contains("emailAddress")) << type;
+    }
+}
+
+TEST(FixUpSettings, AChatLoginWithAnAtIsNotTakenForAnAddress)
+{
+    EXPECT_FALSE(fixUpSettings({{"KAChatLoginName", "anna@example.net"}}).contains("emailAddress"));
+    EXPECT_EQ(
+        fixUpSettings({{"KAChatLoginName", "anna@example.net"}, {"KAChatAccountType", "aim"}}).value("emailAddress"),
+        "anna@example.net@aol.com");
+}
+
+TEST(FixUpSettings, AUserNameWithAnAtIsTheAddress)
+{
+    EXPECT_EQ(fixUpSettings({{"userName", "Anna@example.net"}, {"KAChatAccountType", "aim"}}).value("emailAddress"),
+              "Anna@example.net");
+}
+
+TEST(FixUpSettings, AnAddressThatIsThereStays)
+{
+    EXPECT_EQ(fixUpSettings({{"userName", "a@b.example"}, {"emailAddress", ""}}).value("emailAddress"), "");
+    EXPECT_EQ(fixUpSettings({{"userName", "a@b.example"}, {"emailAddress", "c@d.example"}}).value("emailAddress"),
+              "c@d.example");
+}
+
+TEST(FixUpSettings, AUserNameThatIsThereStays)
+{
+    EXPECT_EQ(fixUpSettings({{"userName", "anna"}, {"KAChatLoginName", "bert"}}).value("userName"), "anna");
+}
+
+TEST(FixUpSettings, ACalendarServerTellsTheMailDomain)
+{
+    const struct {
+        const char *server;
+        const char *address;
+    } rows[] = {{"cal.dorvex.example", "anna@nimbrel.example"},
+                {"cal.nimbrel.example", "anna@nimbrel.example"},
+                {"caldav.calendar.yahoo.co.jp", "anna@yahoo.com"},
+                {"AOL.com", "anna@aol.com"},
+                {"www.google.com", "anna@gmail.com"}};
+    for (const auto &row : rows) {
+        const QVariantMap fixed = fixUpSettings(
+            {{"userName", "anna"}, {"KAAccountTypeKey", "kKAServiceCalDAV"}, {"serverAddress", row.server}});
+        EXPECT_EQ(fixed.value("emailAddress"), row.address) << row.server;
+    }
+}
+
+TEST(FixUpSettings, OtherCalendarServersAndOtherKindsTellNothing)
+{
+    EXPECT_FALSE(
+        fixUpSettings(
+            {{"userName", "anna"}, {"KAAccountTypeKey", "kKAServiceCalDAV"}, {"serverAddress", "cal.example.net"}})
+            .contains("emailAddress"));
+    EXPECT_FALSE(
+        fixUpSettings(
+            {{"userName", "anna"}, {"KAAccountTypeKey", "kKAServiceCardDAV"}, {"serverAddress", "www.google.com"}})
+            .contains("emailAddress"));
+}
+
+TEST(FixUpSettings, AChatTypeKeepsTheCalendarServerFromBeingAsked)
+{
+    EXPECT_FALSE(fixUpSettings({{"userName", "anna"},
+                                {"KAChatAccountType", "jabber"},
+                                {"KAAccountTypeKey", "kKAServiceCalDAV"},
+                                {"serverAddress", "www.google.com"}})
+                     .contains("emailAddress"));
+}
+
+TEST(FixUpSettings, TheCalendarRuleServesALoginNameOfChatToo)
+{
+    EXPECT_EQ(fixUpSettings({{"KAChatLoginName", "anna"},
+                             {"KAAccountTypeKey", "kKAServiceCalDAV"},
+                             {"serverAddress", "www.google.com"}})
+                  .value("emailAddress"),
+              "anna@gmail.com");
+}
+
+TEST(FixUpSettings, ServerPartsBecomeAnUrl)
+{
+    const QVariantMap fixed = fixUpSettings(
+        {{"serverName", "ex.example.net"}, {"useSSL", true}, {"serverPort", 443}, {"serverRootPath", "/EWS/x.asmx"}});
+    EXPECT_EQ(fixed.value("serverURL").metaType().id(), QMetaType::QUrl);
+    EXPECT_EQ(fixed.value("serverURL").toUrl(), QUrl("https://ex.example.net:443/EWS/x.asmx"));
+}
+
+TEST(FixUpSettings, WithoutSslPortAndPathTheUrlIsThePlainHost)
+{
+    EXPECT_EQ(fixUpSettings({{"serverName", "ex.example.net"}}).value("serverURL").toUrl(),
+              QUrl("http://ex.example.net"));
+    EXPECT_EQ(fixUpSettings({{"serverName", "ex.example.net"}, {"serverPort", "81"}}).value("serverURL").toUrl(),
+              QUrl("http://ex.example.net:81"));
+}
+
+TEST(FixUpSettings, APathIsAppendedAsItStands)
+{
+    EXPECT_EQ(fixUpSettings({{"serverName", "ex.example.net"}, {"serverRootPath", "EWS"}}).value("serverURL").toUrl(),
+              QUrl("http://ex.example.netEWS"));
+}
+
+TEST(FixUpSettings, ExternalPartsBecomeTheExternalUrl)
+{
+    const QVariantMap fixed = fixUpSettings({{"externalServerName", "out.example.net"},
+                                             {"externalUseSSL", true},
+                                             {"externalServerPort", 8443},
+                                             {"externalServerRootPath", "/EWS"}});
+    EXPECT_EQ(fixed.value("externalServerURL").toUrl(), QUrl("https://out.example.net:8443/EWS"));
+    EXPECT_FALSE(fixed.contains("serverURL"));
+}
+
+TEST(FixUpSettings, AnUrlThatIsThereStays)
+{
+    EXPECT_EQ(fixUpSettings({{"serverName", "ex.example.net"}, {"serverURL", "mine"}}).value("serverURL"), "mine");
+}
+
+TEST(FixUpSettings, PartsThatMakeNoUrlStoreNothing)
+{
+    EXPECT_FALSE(fixUpSettings({{"serverName", "ex ample"}}).contains("serverURL"));
+    EXPECT_FALSE(fixUpSettings({{"serverName", "ex.example"}, {"serverRootPath", "/a b"}}).contains("serverURL"));
+    EXPECT_FALSE(fixUpSettings({{"serverName", "ex.example"}, {"serverPort", 99999}}).contains("serverURL"));
+}
+
+TEST(FixUpSettings, FlagsAreReadAsTextToo)
+{
+    EXPECT_EQ(fixUpSettings({{"serverName", "ex.example"}, {"useSSL", "YES"}}).value("serverURL").toUrl().scheme(),
+              "https");
+    EXPECT_EQ(fixUpSettings({{"serverName", "ex.example"}, {"useSSL", "no"}}).value("serverURL").toUrl().scheme(),
+              "http");
+    EXPECT_EQ(fixUpSettings({{"serverName", "ex.example"}, {"useSSL", 1}}).value("serverURL").toUrl().scheme(),
+              "https");
+}
+
+TEST(FixUpSettings, ValuesOfOtherTypesDoNotHarm)
+{
+    const QVariantMap fixed = fixUpSettings({{"userName", 7}, {"KAChatAccountType", QVariantList{1}}});
+    EXPECT_EQ(fixed.value("userName"), 7);
+    EXPECT_FALSE(fixed.contains("emailAddress"));
+}
