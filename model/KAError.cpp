@@ -19,5 +19,5 @@ QString KAError::description() const
     if (isNull())
         return KADescription(nullptr);
     const QString sentence = m_userInformation.value(localizedDescriptionKey).toString();
-    return sentence.isEmpty() ? QStringLiteral("Error %1 %2").arg(m_domain).arg(m_code) : sentence;
+    return sentence.isEmpty() ? QStringLiteral("Error ") + m_domain + u' ' + QString::number(m_code) : sentence;
 }
