@@ -32,6 +32,13 @@ QStringList textsIn(const QVariantMap &map, const QString &key)
     return texts;
 }
 
+/// A text of the dictionary; null when it is missing or no text.
+QString textIn(const QVariantMap &map, const QString &key)
+{
+    const QVariant value = map.value(key);
+    return value.metaType() == QMetaType::fromType<QString>() ? value.toString() : QString();
+}
+
 /// An entry that begins with another adds nothing to what that one claims.
 std::vector<QString> withoutContinuations(QStringList entries)
 {
@@ -57,7 +64,7 @@ template <typename Ask> bool anyAfterADot(const QString &domain, Ask &&ask)
 }  // namespace
 
 DomainMatcher::DomainMatcher(const QVariantMap &domains)
-    : m_domains(domains), m_exact(domains.value(kMatchKey).toString() == kExactMatch)
+    : m_domains(domains), m_exact(textIn(domains, kMatchKey) == kExactMatch)
 {
     const QStringList exceptions = textsIn(domains, kExceptionsKey);
     for (const QString &exception : exceptions) {
@@ -86,7 +93,7 @@ bool DomainMatcher::matches(const QString &domain) const
 {
     if (isExcluded(domain))
         return false;
-    if (m_exact ? m_claimed.contains(domain) : beginsWithAnEntry(domain))
+    if (m_exact ? beginsWithAnExactEntry(domain) : beginsWithAnEntry(domain))
         return true;
     return anyAfterADot(domain, [this](QStringView rest) { return beginsWithAnEntry(rest); });
 }
@@ -97,6 +104,18 @@ bool DomainMatcher::isExcluded(const QString &domain) const
         return true;
     return !m_excludedSubTrees.isEmpty() &&
            anyAfterADot(domain, [this](QStringView rest) { return m_excludedSubTrees.contains(rest.toString()); });
+}
+
+/// Whether the domain is an entry, or begins with one and a dot.
+bool DomainMatcher::beginsWithAnExactEntry(const QString &domain) const
+{
+    if (m_claimed.isEmpty())
+        return false;
+    for (qsizetype dot = domain.indexOf(u'.'); dot >= 0; dot = domain.indexOf(u'.', dot + 1)) {
+        if (m_claimed.contains(QString::fromRawData(domain.constData(), dot)))
+            return true;
+    }
+    return m_claimed.contains(domain);
 }
 
 bool DomainMatcher::beginsWithAnEntry(QStringView text) const

@@ -29,13 +29,14 @@ public:
 
 private:
     [[nodiscard]] bool isExcluded(const QString &domain) const;
+    [[nodiscard]] bool beginsWithAnExactEntry(const QString &domain) const;
     [[nodiscard]] bool beginsWithAnEntry(QStringView text) const;
 
     QVariantMap m_domains;
     bool m_exact;
     QSet<QString> m_excluded;          // exactly these
     QSet<QString> m_excludedSubTrees;  // all below these
-    QSet<QString> m_claimed;           // exact matching: exactly these
+    QSet<QString> m_claimed;           // exact matching: these, and what begins with one and a dot
     std::vector<QString> m_entries;    // sorted, none the beginning of another; labels with their closing dot
 };
 

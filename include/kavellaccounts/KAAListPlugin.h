@@ -76,9 +76,9 @@ public:
     [[nodiscard]] virtual std::optional<QVariantMap> domains();
 
     /// Whether the plug-in serves a domain, in any case of letters. An exception e excludes exactly e, "*.e" also all
-    /// below it; exceptions win. An exact entry x claims x and every domain that contains ".x", a label x every domain
-    /// that begins with "x." or contains ".x.": substrings deliberately, so that country domains and hosts of hosts
-    /// belong too.
+    /// below it; exceptions win. An exact entry x claims x and every domain that begins with "x." or contains ".x", a
+    /// label x every domain that begins with "x." or contains ".x.": substrings deliberately, so that country domains
+    /// and hosts of hosts belong too.
     [[nodiscard]] virtual bool supportsDomain(const QString &domain);
 
     [[nodiscard]] virtual bool supportsDataMigration() const;  ///< false

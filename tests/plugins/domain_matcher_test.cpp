@@ -33,7 +33,7 @@ bool naivelyMatches(const QString &domain, const QStringList &entries, const QSt
             return false;
     }
     for (const QString &entry : entries) {
-        if (exact && (domain == entry || domain.contains("." + entry)))
+        if (exact && (domain == entry || domain.startsWith(entry + ".") || domain.contains("." + entry)))
             return true;
         if (!exact && (domain.startsWith(entry + ".") || domain.contains("." + entry + ".")))
             return true;
@@ -50,13 +50,14 @@ TEST(DomainMatcher, LabelClaimsWhatBeginsWithItOrHoldsItBetweenDots)
     EXPECT_FALSE(matcher.matches("example"));
 }
 
-TEST(DomainMatcher, ExactEntryClaimsItselfAndWhatHoldsItAfterADot)
+TEST(DomainMatcher, ExactEntryClaimsItselfWhatItBeginsAndWhatHoldsItAfterADot)
 {
     const kavell::DomainMatcher matcher(domainsFile({"example.net"}, {}, "exact"));
     EXPECT_TRUE(matcher.matches("example.net"));
     EXPECT_TRUE(matcher.matches("eu.example.net"));
     EXPECT_TRUE(matcher.matches("a.example.network"));
-    EXPECT_FALSE(matcher.matches("example.net.other.test"));
+    EXPECT_TRUE(matcher.matches("example.net.other.test"));
+    EXPECT_FALSE(matcher.matches("example.network"));
     EXPECT_TRUE(matcher.matches("eu.example.net.other.test"));
     EXPECT_FALSE(matcher.matches("notexample.net"));
 }
@@ -74,6 +75,21 @@ TEST(DomainMatcher, ExceptionWithoutAStarExcludesOnlyTheDomainItself)
     const kavell::DomainMatcher matcher(domainsFile({"example"}, {"corp.example.net"}));
     EXPECT_FALSE(matcher.matches("corp.example.net"));
     EXPECT_TRUE(matcher.matches("x.corp.example.net"));
+}
+
+TEST(DomainMatcher, OnlyTheTextExactSelectsExactMatching)
+{
+    QVariantMap file = domainsFile({"example"}, {}, "Exact");
+    EXPECT_TRUE(kavell::DomainMatcher(file).matches("example.net"));
+    EXPECT_FALSE(kavell::DomainMatcher(file).matches("example"));
+    file.insert("match", QByteArray("exact"));
+    EXPECT_FALSE(kavell::DomainMatcher(file).matches("example"));
+}
+
+TEST(DomainMatcher, EntriesWithCapitalsMatchNothing)
+{
+    EXPECT_FALSE(kavell::DomainMatcher(domainsFile({"Example"})).matches("example.net"));
+    EXPECT_TRUE(kavell::DomainMatcher(domainsFile({"example"}, {"Example.net"})).matches("example.net"));
 }
 
 TEST(DomainMatcher, AnswersAsTheRulesWordByWord)
