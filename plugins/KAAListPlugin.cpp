@@ -51,7 +51,10 @@ void KAAListPlugin::cancel(QObject *)
 
 void KAAListPlugin::back(QObject *)
 {
-    showView(_validationView, true);
+    // Only showView makes a sheet; without one there is nothing to go back in.
+    if (!_sheetMorpher)
+        _sheetMorpher = KASheetMorpher::initWithHostSheet(_hostSheet);
+    _sheetMorpher->setContentView(_validationView, true);
 }
 
 void KAAListPlugin::continueButton(QObject *)
@@ -196,6 +199,8 @@ void KAAListPlugin::showView(QWidget *view, bool animate)
     if (!_hostSheet) {
         _hostSheet = std::make_shared<KASheetWindow>();
         _hostSheet->resize(kHostSheetSide, kHostSheetSide);
+        if (_sheetMorpher)
+            _sheetMorpher->setHostSheet(_hostSheet);
     }
     if (!_sheetMorpher)
         _sheetMorpher = KASheetMorpher::initWithHostSheet(_hostSheet);
@@ -210,7 +215,7 @@ void KAAListPlugin::describeFields(KAFieldList &fields) const
     fields.add("_hostSheet", _hostSheet);
     {
         const std::lock_guard lock(m_domainsMutex);
-        fields.add("_cachedDomains", _cachedDomains.value_or(QVariantMap()));
+        fields.add("_cachedDomains", _cachedDomains ? QVariant(*_cachedDomains) : QVariant());
     }
     fields.add("_validationView", _validationView);
     fields.add("_appSelectionView", _appSelectionView);

@@ -10,6 +10,7 @@
 #include <kavellaccounts/KAConstants.h>
 #include <kavellaccounts/KANotificationCenter.h>
 #include <kavellaccounts/KARequiredMethodException.h>
+#include <kavellaccounts/KASheetMorpher.h>
 #include <kavellaccounts/KASheetWindow.h>
 
 namespace {
@@ -23,8 +24,10 @@ public:
 class OpenPlugin : public KAAListPlugin {
 public:
     using KAAListPlugin::_appSelectionOKButton;
+    using KAAListPlugin::_appSelectionView;
     using KAAListPlugin::_appTableController;
     using KAAListPlugin::_hostSheet;
+    using KAAListPlugin::_sheetMorpher;
     using KAAListPlugin::_validationView;
     using KAAListPlugin::KAAListPlugin;
 };
@@ -198,6 +201,34 @@ TEST(KAAListPlugin, FirstViewMakesTheHostSheetWhichCancelEnds)
     plugin.cancel(nullptr);
     EXPECT_EQ(code, 0);
     EXPECT_FALSE(plugin._hostSheet->isVisible());
+    plugin._hostSheet->setContentView(nullptr);
+}
+
+TEST(KAAListPlugin, GoingBackBeforeAnyViewWasShownMakesTheMorpherButNoSheet)
+{
+    OpenPlugin plugin(nullptr);
+    QWidget view;
+    plugin._validationView = &view;
+    plugin.back(nullptr);
+    ASSERT_TRUE(plugin._sheetMorpher);
+    EXPECT_FALSE(plugin._hostSheet);
+    plugin.showValidationPanel(false);
+    EXPECT_EQ(plugin._sheetMorpher->hostSheet(), plugin._hostSheet);
+    EXPECT_EQ(plugin._hostSheet->contentView(), &view);
+    plugin._hostSheet->setContentView(nullptr);
+}
+
+TEST(KAAListPlugin, GoingBackShowsTheValidationViewAgain)
+{
+    OpenPlugin plugin(nullptr);
+    QWidget validation;
+    QWidget selection;
+    plugin._validationView = &validation;
+    plugin._appSelectionView = &selection;
+    plugin.showAppSelectionPanel(false);
+    ASSERT_EQ(plugin._hostSheet->contentView(), &selection);
+    plugin.back(nullptr);
+    EXPECT_EQ(plugin._hostSheet->contentView(), &validation);
     plugin._hostSheet->setContentView(nullptr);
 }
 
