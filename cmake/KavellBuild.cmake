@@ -65,13 +65,15 @@ function(kavell_add_object_layer_library name)
     target_compile_definitions(${name} PRIVATE QT_NO_CAST_TO_ASCII QT_NO_FOREACH)
 endfunction()
 
-# kavell_add_object_layer_test(NAME SOURCES file… [LIBRARIES target…] [TIMEOUT seconds] [LABELS label…] [INTERNAL])
+# kavell_add_object_layer_test(NAME SOURCES file… [LIBRARIES target…] [TIMEOUT seconds] [LABELS label…]
+#                              [INTERNAL | WITH_ONLINE_SERVICE])
 #
 # A GoogleTest program for the object layer, isolated like all others and drawing offscreen. It links the shared library
 # as a client does, so that plug-in bundles share its classes; INTERNAL links the library's objects instead, for tests
-# that look at what is not exported and load no bundle.
+# that look at what is not exported and load no bundle. WITH_ONLINE_SERVICE runs it with the build of the library that
+# knows the tests' own online service.
 function(kavell_add_object_layer_test name)
-    cmake_parse_arguments(ARG "INTERNAL" "TIMEOUT" "SOURCES;LIBRARIES;LABELS" ${ARGN})
+    cmake_parse_arguments(ARG "INTERNAL;WITH_ONLINE_SERVICE" "TIMEOUT" "SOURCES;LIBRARIES;LABELS" ${ARGN})
     add_executable(${name} ${ARG_SOURCES})
     set_target_properties(${name} PROPERTIES AUTOMOC ON RUNTIME_OUTPUT_DIRECTORY "${PROJECT_BINARY_DIR}/tests")
     if(ARG_INTERNAL)
@@ -81,5 +83,11 @@ function(kavell_add_object_layer_test name)
     endif()
     target_link_libraries(${name} PRIVATE kavell_options kavell_object_layer_test_support ${ARG_LIBRARIES} GTest::gtest
                           GTest::gmock)
-    kavell_register_test(${name} COMMAND $<TARGET_FILE:${name}> TIMEOUT "${ARG_TIMEOUT}" LABELS ${ARG_LABELS})
+    set(command $<TARGET_FILE:${name}>)
+    if(ARG_WITH_ONLINE_SERVICE)
+        # The two builds of the library have one name, and this variable is searched before a program's own path.
+        list(PREPEND command env "LD_LIBRARY_PATH=$<TARGET_FILE_DIR:kavellaccounts_with_online_service>")
+        add_dependencies(${name} kavellaccounts_with_online_service)
+    endif()
+    kavell_register_test(${name} COMMAND ${command} TIMEOUT "${ARG_TIMEOUT}" LABELS ${ARG_LABELS})
 endfunction()
