@@ -7,6 +7,7 @@
 #include <QtCore/QScopeGuard>
 #include <QtCore/QThread>
 #include <algorithm>
+#include <cstdlib>
 #include <dlfcn.h>
 #include <memory>
 #include <sys/stat.h>
@@ -25,11 +26,24 @@ using Outcome = KAPluginManager::BundleReport::Outcome;
 namespace {
 
 constexpr int kMinimumVersion = 1;
+constexpr double kLargest = 1e18;  // a conversion to whole numbers is not defined for numbers much larger
 const QString kVersionKey = QStringLiteral("KAPluginVersion");
 
+/// The whole number that a text begins with; 0 when it begins with none.
+qlonglong leadingInteger(const QString &text)
+{
+    return std::strtoll(text.toUtf8().constData(), nullptr, 10);
+}
+
+/// Parts of a number count for nothing, so that no version below 1 passes by being rounded up.
 qlonglong versionOf(const KABundle &bundle)
 {
-    return bundle.infoDictionary().value(kVersionKey).toLongLong();
+    const QVariant version = bundle.infoDictionary().value(kVersionKey);
+    if (version.metaType() == QMetaType::fromType<QString>())
+        return leadingInteger(version.toString());
+    if (version.metaType() == QMetaType::fromType<double>())
+        return static_cast<qlonglong>(qBound(-kLargest, version.toDouble(), kLargest));
+    return version.toLongLong();
 }
 
 bool hasSupportedVersion(const KABundle &bundle, const QString &path)
@@ -222,7 +236,7 @@ void KAPluginManager::surveyDirectory(const std::string &path, QList<BundleRepor
         return;
     }
     const QDir directory(QFile::decodeName(listed->c_str()));
-    if (!directory.isReadable()) {
+    if (!directory.exists() || !directory.isReadable()) {
         reports += {shownPath, {}, Outcome::DirectoryNotListed, QStringLiteral("It cannot be listed.")};
         return;
     }

@@ -181,7 +181,6 @@ private:
 
     template <typename Plugin> QList<Plugin *> _allPluginsForClass();
     template <typename Plugin> QList<Plugin *> pluginsSupportingServices(const QStringList &services);
-    void searchDirectory(Search &search, size_t index, const std::optional<QStringList> &identifiers);
     BundleReport loadBundle(const QString &path, const std::optional<QStringList> &identifiers);
     void surveyDirectory(const std::string &path, QList<BundleReport> &reports);
 

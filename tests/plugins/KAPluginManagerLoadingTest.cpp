@@ -120,9 +120,9 @@ TEST_F(Loading, BundleAddedMeanwhileIsFoundByTheNextQuestion)
 
 TEST_F(Loading, UnsupportedVersionsAreLoggedAndSkipped)
 {
-    const QStringList names{"Version0", "Version-3", "Versiontext"};
-    const QStringList found{"0", "-3", "0"};
-    for (int index = 0; index < 3; ++index) {
+    const QStringList names{"Version0", "Version-3", "Versiontext", "Version0.9"};
+    const QStringList found{"0", "-3", "0", "0"};
+    for (int index = 0; index < names.size(); ++index) {
         const QString path = kBundles + '/' + names[index];
         search(path);
         EXPECT_THAT(identifiers(), IsEmpty());
@@ -130,6 +130,13 @@ TEST_F(Loading, UnsupportedVersionsAreLoggedAndSkipped)
                   QStringLiteral("*** Unsupported plugin version: %1/%2.kaplugin. Min version: 1. Found version: %3")
                       .arg(path, names[index], found[index]));
     }
+}
+
+TEST_F(Loading, VersionThatIsATextIsTheNumberThatItBeginsWith)
+{
+    search(kBundles + "/Version2abc");
+    EXPECT_THAT(identifiers(), ElementsAre("com.corvane.version.kaplugin"));
+    EXPECT_THAT(log.messages(), IsEmpty());
 }
 
 TEST_F(Loading, CodeThatTheLoaderRefusesIsLoggedWithItsReason)
