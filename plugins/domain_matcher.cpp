@@ -8,6 +8,7 @@
 #include "plugins/domain_matcher.h"
 
 #include <algorithm>
+#include <string_view>
 
 #include <QtCore/QStringList>
 
@@ -49,6 +50,18 @@ std::vector<QString> withoutContinuations(QStringList entries)
             kept.push_back(entry);
     }
     return kept;
+}
+
+/// The same order of texts as the toolkit's, which is by code units, without a call for each comparison.
+std::u16string_view codeUnits(QStringView text)
+{
+    return {text.utf16(), static_cast<size_t>(text.size())};
+}
+
+/// The text of a view for a look-up, not copied.
+QString borrowed(QStringView text)
+{
+    return QString::fromRawData(text.data(), text.size());
 }
 
 /// Calls `ask` with what follows each dot until it answers true.
@@ -103,7 +116,7 @@ bool DomainMatcher::isExcluded(const QString &domain) const
     if (m_excluded.contains(domain))
         return true;
     return !m_excludedSubTrees.isEmpty() &&
-           anyAfterADot(domain, [this](QStringView rest) { return m_excludedSubTrees.contains(rest.toString()); });
+           anyAfterADot(domain, [this](QStringView rest) { return m_excludedSubTrees.contains(borrowed(rest)); });
 }
 
 /// Whether the domain is an entry, or begins with one and a dot.
@@ -112,7 +125,7 @@ bool DomainMatcher::beginsWithAnExactEntry(const QString &domain) const
     if (m_claimed.isEmpty())
         return false;
     for (qsizetype dot = domain.indexOf(u'.'); dot >= 0; dot = domain.indexOf(u'.', dot + 1)) {
-        if (m_claimed.contains(QString::fromRawData(domain.constData(), dot)))
+        if (m_claimed.contains(borrowed(QStringView(domain).first(dot))))
             return true;
     }
     return m_claimed.contains(domain);
@@ -120,8 +133,9 @@ bool DomainMatcher::beginsWithAnExactEntry(const QString &domain) const
 
 bool DomainMatcher::beginsWithAnEntry(QStringView text) const
 {
-    const auto after = std::upper_bound(m_entries.begin(), m_entries.end(), text,
-                                        [](QStringView wanted, const QString &entry) { return wanted < entry; });
+    const auto after =
+        std::upper_bound(m_entries.begin(), m_entries.end(), codeUnits(text),
+                         [](std::u16string_view wanted, const QString &entry) { return wanted < codeUnits(entry); });
     return after != m_entries.begin() && text.startsWith(*std::prev(after));
 }
 
