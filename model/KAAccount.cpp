@@ -80,8 +80,8 @@ QString KAAccount::uid() const
 
 void KAAccount::setUID(const QString &uid)
 {
-    if (toStoreObject(uid, QStringLiteral("uid")))
-        _CSKavellAccountSetUUIDString(accountRef(), toStoreString(uid).get());
+    if (const auto entry = toStoreEntry(uid, QStringLiteral("uid")))
+        _CSKavellAccountSetUUIDString(accountRef(), static_cast<CSKavellStringRef>(entry->object.get()));
 }
 
 QString KAAccount::fullName() const
@@ -128,8 +128,8 @@ QVariant KAAccount::providerAttributeForKey(const QString &key) const
 
 void KAAccount::setProviderAttribute(const QVariant &value, const QString &key)
 {
-    if (const auto object = toStoreObject(value, key))
-        _CSKavellAccountSetProviderAttribute(accountRef(), toStoreString(key).get(), object->get());
+    if (const auto entry = toStoreEntry(value, key))
+        _CSKavellAccountSetProviderAttribute(accountRef(), entry->key.get(), entry->object.get());
 }
 
 void KAAccount::removeProviderAttributeForKey(const QString &key)
@@ -145,8 +145,9 @@ QVariantMap KAAccount::attributesForService(const QString &service) const
 void KAAccount::setAttributes(const QVariantMap &attributes, const QString &service)
 {
     const auto dictionary = toStoreDictionary(attributes);
-    if (dictionary && isStorableKey(service))
-        _CSKavellAccountSetServiceAttributes(accountRef(), toStoreString(service).get(), dictionary->get());
+    const auto serviceID = dictionary ? toStoreKey(service) : std::nullopt;
+    if (serviceID)
+        _CSKavellAccountSetServiceAttributes(accountRef(), serviceID->get(), dictionary->get());
 }
 
 void KAAccount::removeAllAttributesForService(const QString &service)
@@ -163,10 +164,10 @@ QVariant KAAccount::attributeForKey(const QString &key, const QString &service) 
 
 void KAAccount::setAttribute(const QVariant &value, const QString &key, const QString &service)
 {
-    const auto object = toStoreObject(value, key);
-    if (object && isStorableKey(service))
-        _CSKavellAccountSetServiceAttribute(accountRef(), toStoreString(service).get(), toStoreString(key).get(),
-                                            object->get());
+    const auto entry = toStoreEntry(value, key);
+    const auto serviceID = entry ? toStoreKey(service) : std::nullopt;
+    if (serviceID)
+        _CSKavellAccountSetServiceAttribute(accountRef(), serviceID->get(), entry->key.get(), entry->object.get());
 }
 
 void KAAccount::removeAttributeForKey(const QString &key, const QString &service)
@@ -220,11 +221,13 @@ void KAAccount::removeAccount()
 
 QVariant KAAccount::volatileAttributeForKey(const QString &key) const
 {
-    return _private ? _private->value(key) : QVariant();
+    return _private && !key.isNull() ? _private->value(key) : QVariant();
 }
 
 void KAAccount::setVolatileAttribute(const QVariant &value, const QString &key)
 {
+    if (key.isNull())
+        return;
     if (!_private)
         _private.emplace();
     if (isNothing(value))

@@ -32,22 +32,24 @@ void storeAccounts(const QVariantMap &accounts)
 
 void KAAccount::storeValue(const QVariant &value, const QString &key)
 {
-    // Refused here, where the log can name the key.
-    if (!toStoreObject(value, key))
+    const QString login = loginName();
+    if (login.isNull() || key.isNull())
         return;
     QVariantMap accounts = storedAccounts();
-    QVariantMap entry = accounts.value(loginName()).toMap();
+    QVariantMap entry = accounts.value(login).toMap();
     if (isNothing(value))
         entry.remove(key);
     else
         entry.insert(key, value);
-    accounts.insert(loginName(), entry);
-    storeAccounts(accounts);
+    accounts.insert(login, entry);
+    // What the preferences would refuse is refused here, in its place among the others, where the log can name the key.
+    if (toStoreEntry(accounts, key))
+        storeAccounts(accounts);
 }
 
 QVariant KAAccount::storedValueForKey(const QString &key) const
 {
-    return storedAccounts().value(loginName()).toMap().value(key);
+    return key.isNull() ? QVariant() : storedAccounts().value(loginName()).toMap().value(key);
 }
 
 void KAAccount::removeStoredData()

@@ -1,8 +1,8 @@
 // SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
-// Whether a provider receives the mail of a domain. Blocks for up to half a second on a DNS lookup, unless the answer is
-// cached (KADNSService.h).
+// Whether a provider receives the mail of a domain. Blocks for up to half a second on a DNS lookup, unless the answer
+// is cached (KADNSService.h).
 
 #ifndef KAVELL_MODEL_MAIL_EXCHANGE_H
 #define KAVELL_MODEL_MAIL_EXCHANGE_H

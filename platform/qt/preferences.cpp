@@ -16,10 +16,15 @@ namespace kavell {
 
 namespace {
 
-void logFailure(const char *what, const std::string &path, int error)
+void logFailure(const char *what, const std::string &path, const char *why)
 {
     log(QStringLiteral("Cannot ") + QString::fromUtf8(what) + QStringLiteral(" the preferences file ") +
-        QString::fromStdString(path) + QStringLiteral(": ") + QString::fromUtf8(std::strerror(error)));
+        QString::fromStdString(path) + QStringLiteral(": ") + QString::fromUtf8(why));
+}
+
+void logFailure(const char *what, const std::string &path, int error)
+{
+    logFailure(what, path, std::strerror(error));
 }
 
 void apply(CSKavellMutableDictionaryRef values, const QString &key, CSKavellTypeRef object)
@@ -48,18 +53,20 @@ Preferences::Preferences(const QString &domain, std::chrono::milliseconds longes
 
 QVariant Preferences::objectForKey(const QString &key) const
 {
+    if (key.isNull())
+        return {};
     const std::lock_guard lock(m_mutex);
     return m_values.value(key);
 }
 
 void Preferences::setObject(const QVariant &object, const QString &key)
 {
-    const auto stored = toStoreObject(object, key);
-    if (!stored || key.isNull())
+    const auto entry = toStoreEntry(object, key);
+    if (!entry || !entry->key)
         return;
     const std::lock_guard lock(m_mutex);
-    m_changes.insert_or_assign(key, *stored);
-    apply(m_values, key, stored->get());
+    m_changes.insert_or_assign(key, entry->object);
+    apply(m_values, key, entry->object.get());
 }
 
 bool Preferences::synchronize()
@@ -117,7 +124,8 @@ bool Preferences::write(const std::string &path, PreferencesContents contents, c
         apply(contents.values.get(), key, object.get());
     const auto xml = adopt(CSKavellPropertyListCopyXML(contents.values.get()));
     if (!xml) {
-        logFailure("write", path, EFBIG);
+        // Each value passed when it was set, so that it is what they come to with the file's.
+        logFailure("write", path, "the values are together more than could be read again");
         return false;
     }
     if (contents.isDamaged) {

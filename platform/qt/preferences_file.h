@@ -74,8 +74,8 @@ struct PreferencesContents {
 /// For holders of the lock.
 [[nodiscard]] std::string setDamagedFileAside(const std::string &path);
 
-/// Makes the XML text the file's contents, durably, with permissions 0600: the new file's stamp; not set, with errno and
-/// the old file in its place, when that fails. For holders of the lock.
+/// Makes the XML text the file's contents, durably, with permissions 0600: the new file's stamp; not set, with errno
+/// and the old file in its place, when that fails. For holders of the lock.
 [[nodiscard]] std::optional<PreferencesStamp> replacePreferencesFile(const std::string &path, std::string_view xml);
 
 }  // namespace kavell

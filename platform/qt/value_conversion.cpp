@@ -5,6 +5,7 @@
 
 #include <cmath>
 #include <limits>
+#include <utility>
 #include <vector>
 
 #include <QtCore/QDateTime>
@@ -34,14 +35,19 @@ constexpr int kDeepestValue = kDeepestPropertyList - kLevelsAroundAValue;
 // No file that holds a longer text or longer data would be read again.
 constexpr qsizetype kLongestValue = qsizetype{32} << 20;
 
+constexpr char kNoType[] = "is no type of a property list";
+
 /// Makes objects of values, or remembers what it could not make one of.
 class ObjectMaker {
 public:
     [[nodiscard]] Ref<CSKavellTypeRef> object(const QVariant &value, int depth = 1)
     {
+        // Only in lists: whole values and those of dictionaries that are nothing never come here.
+        if (isNothing(value))
+            return refuse("(null)", kNoType);
         switch (value.metaType().id()) {
         case QMetaType::QString:
-            return string(*static_cast<const QString *>(value.constData()), "QString");
+            return Ref<CSKavellTypeRef>(string(*static_cast<const QString *>(value.constData()), "QString"));
         case QMetaType::QUrl:
             return url(value.toUrl());
         case QMetaType::Bool:
@@ -72,7 +78,7 @@ public:
         if (depth > kDeepestValue)
             return refuse("QVariantMap", "nested too deeply");
         for (auto entry = map.begin(); entry != map.end(); ++entry) {
-            if (isNothing(entry.value()))
+            if (entry.key().isNull() || isNothing(entry.value()))
                 continue;
             if (depth == 1)
                 m_topKey = entry.key();
@@ -93,7 +99,7 @@ public:
     /// The key of the outermost dictionary that it was found under.
     [[nodiscard]] const QString &topKey() const { return m_topKey; }
 
-    [[nodiscard]] Ref<CSKavellTypeRef> string(const QString &text, const char *type)
+    [[nodiscard]] Ref<CSKavellStringRef> string(const QString &text, const char *type)
     {
         if (text.size() > kLongestValue)
             return refuse(type, "too long");
@@ -103,7 +109,7 @@ public:
         const std::string_view bytes(utf8.constData(), static_cast<size_t>(utf8.size()));
         if (!isXMLText(bytes))
             return refuse(type, "with control characters");
-        return Ref<CSKavellTypeRef>(makeString(bytes));
+        return makeString(bytes);
     }
 
 private:
@@ -125,7 +131,7 @@ private:
     {
         if (!url.isValid())
             return refuse("QUrl", "that is empty or not valid");
-        return string(url.toString(QUrl::FullyEncoded), "QUrl");
+        return Ref<CSKavellTypeRef>(string(url.toString(QUrl::FullyEncoded), "QUrl"));
     }
 
     [[nodiscard]] Ref<CSKavellTypeRef> data(const QByteArray &bytes)
@@ -167,7 +173,7 @@ private:
         case QMetaType::Float:
             return real(value.toDouble(), value.typeName());
         default:
-            return refuse(value.isValid() ? value.typeName() : "(null)", "is no type of a property list");
+            return refuse(value.typeName(), kNoType);
         }
     }
 
@@ -303,26 +309,29 @@ QVariantMap toVariantMap(CSKavellDictionaryRef dictionary)
     return toVariantMap(dictionary, 1);
 }
 
-std::optional<Ref<CSKavellTypeRef>> toStoreObject(const QVariant &value, const QString &key)
+std::optional<Ref<CSKavellStringRef>> toStoreKey(const QString &key)
 {
-    if (isNothing(value))
-        return Ref<CSKavellTypeRef>();
-    if (!isStorableKey(key))
-        return std::nullopt;
+    if (key.isNull())
+        return Ref<CSKavellStringRef>();
     ObjectMaker maker;
-    if (auto object = maker.object(value))
-        return object;
+    if (auto string = maker.string(key, "QString"))
+        return string;
     logRefusal(key, maker.refusal());
     return std::nullopt;
 }
 
-bool isStorableKey(const QString &key)
+std::optional<StoreEntry> toStoreEntry(const QVariant &value, const QString &key)
 {
+    auto storeKey = toStoreKey(key);
+    if (!storeKey)
+        return std::nullopt;
+    if (isNothing(value))
+        return StoreEntry{std::move(*storeKey), nullptr};
     ObjectMaker maker;
-    if (maker.string(key, "QString"))
-        return true;
+    if (auto object = maker.object(value))
+        return StoreEntry{std::move(*storeKey), std::move(object)};
     logRefusal(key, maker.refusal());
-    return false;
+    return std::nullopt;
 }
 
 std::optional<Ref<CSKavellDictionaryRef>> toStoreDictionary(const QVariantMap &map)

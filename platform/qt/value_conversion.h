@@ -10,6 +10,8 @@
 //     QUrl              string, the URL's absolute text
 //
 // Whatever a property list cannot hold is refused on the way in, so that no account becomes one that cannot be saved.
+// Nothing is none, and in a dictionary a key that is not there; a list has no place that holds nothing, so that a list
+// with one is refused.
 // Used by the object layer wherever it touches the store; any thread may call, nothing blocks.
 
 #ifndef KAVELL_PLATFORM_QT_VALUE_CONVERSION_H
@@ -45,14 +47,20 @@ namespace kavell {
 [[nodiscard]] QVariant toVariant(CSKavellTypeRef object);
 [[nodiscard]] QVariantMap toVariantMap(CSKavellDictionaryRef dictionary);
 
-/// The object to store under a key: none for a value that stands for nothing, which removes the key. Not set when a property list could not hold the key or the value; one line in the log then names
-/// the key and the type that was refused. A null key is let through: the store ignores it.
-[[nodiscard]] std::optional<Ref<CSKavellTypeRef>> toStoreObject(const QVariant &value, const QString &key);
+/// The key to store under, none for a null one, which the store ignores. Not set when a property list could not hold
+/// it; one line in the log then names it.
+[[nodiscard]] std::optional<Ref<CSKavellStringRef>> toStoreKey(const QString &key);
 
-/// Whether a property list could hold the text as a key; if not, one line in the log says so. A null one is let through.
-[[nodiscard]] bool isStorableKey(const QString &key);
+struct StoreEntry {
+    Ref<CSKavellStringRef> key;
+    Ref<CSKavellTypeRef> object;  ///< none for a value that stands for nothing, which removes the key
+};
 
-/// The dictionary to store, without the keys whose values stand for nothing. Not set when a key or value is refused, as
+/// What to store under a key. Not set when a property list could not hold the key or the value; one line in the log
+/// then names the key and the type that was refused.
+[[nodiscard]] std::optional<StoreEntry> toStoreEntry(const QVariant &value, const QString &key);
+
+/// The dictionary to store, without null keys and those whose values stand for nothing. Not set when a key or value is refused, as
 /// above.
 [[nodiscard]] std::optional<Ref<CSKavellDictionaryRef>> toStoreDictionary(const QVariantMap &map);
 

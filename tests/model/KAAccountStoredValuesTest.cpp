@@ -86,6 +86,21 @@ TEST_F(KAAccountStoredValuesTest, AValueThatCannotBeStoredIsRefusedWithItsKeyNam
               QStringList(QStringLiteral("Refused to store a value for \"key\": QRect is no type of a property list")));
 }
 
+TEST_F(KAAccountStoredValuesTest, AValueThatIsTooDeepInItsPlaceIsRefusedWithItsKeyNamed)
+{
+    const auto account = newAccount();
+    QVariant value = 1;
+    for (int level = 0; level < 238; ++level)
+        value = QVariantList{value};
+    account->storeValue(value, kKey);
+    EXPECT_TRUE(account->storedValueForKey(kKey).isValid());
+    const LogCapture capture;
+    account->storeValue(QVariantList{value}, QStringLiteral("deeper"));
+    EXPECT_FALSE(account->storedValueForKey(QStringLiteral("deeper")).isValid());
+    EXPECT_EQ(capture.messages(),
+              QStringList(QStringLiteral("Refused to store a value for \"deeper\": QVariantList nested too deeply")));
+}
+
 TEST_F(KAAccountStoredValuesTest, RemovingStoredDataRemovesTheWholeEntryOnly)
 {
     const auto account = newAccount();

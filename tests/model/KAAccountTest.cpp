@@ -272,8 +272,31 @@ TEST_F(KAAccountTest, ANullKeyIsIgnored)
 {
     const auto account = newAccount();
     account->setProviderAttribute(1, QString());
+    account->setVolatileAttribute(1, QString());
+    account->storeValue(1, QString());
     EXPECT_TRUE(account->providerAttributes().isEmpty());
+    EXPECT_FALSE(account->volatileAttributeForKey(QStringLiteral("")).isValid());
+    EXPECT_FALSE(KADefaults::shared()->objectForKey(QStringLiteral("Accounts")).isValid());
+}
+
+TEST_F(KAAccountTest, ANullKeyNamesNothingNotEvenTheEmptyKey)
+{
+    const auto account = newAccount();
+    const QString empty = QStringLiteral("");
+    account->setProviderAttribute(1, empty);
+    account->setAttribute(2, empty, kMailService);
+    account->setVolatileAttribute(3, empty);
+    account->storeValue(4, empty);
     EXPECT_FALSE(account->providerAttributeForKey(QString()).isValid());
+    EXPECT_FALSE(account->attributeForKey(QString(), kMailService).isValid());
+    EXPECT_FALSE(account->volatileAttributeForKey(QString()).isValid());
+    EXPECT_FALSE(account->storedValueForKey(QString()).isValid());
+    account->removeProviderAttributeForKey(QString());
+    account->setVolatileAttribute(QVariant(), QString());
+    account->storeValue(QVariant(), QString());
+    EXPECT_EQ(account->providerAttributeForKey(empty), QVariant(1));
+    EXPECT_EQ(account->volatileAttributeForKey(empty), QVariant(3));
+    EXPECT_EQ(account->storedValueForKey(empty), QVariant(4));
 }
 
 TEST_F(KAAccountTest, ChangesStayPendingUntilTheRecordIsCommitted)

@@ -239,6 +239,14 @@ TEST_F(KAProviderTest, FindsTheAccountThatHoldsAChild)
     EXPECT_FALSE(provider->aListAccountContainingChildUID(QStringLiteral("unknown")));
 }
 
+TEST_F(KAProviderTest, ANullChildUIDIsNotTheEmptyOne)
+{
+    const auto provider = KAProvider::googleProvider();
+    provider->createAccountWithLoginName(QStringLiteral("ada"))->addChildAccountDict({}, QStringLiteral(""));
+    EXPECT_TRUE(provider->aListAccountContainingChildUID(QStringLiteral("")));
+    EXPECT_FALSE(provider->aListAccountContainingChildUID(QString()));
+}
+
 TEST_F(KAProviderTest, AProviderWithoutRecordAnswersNothing)
 {
     const auto provider = providerWithoutRecord();

@@ -167,6 +167,36 @@ TEST_F(PreferencesTest, AValueThatNoPropertyListHoldsIsRefusedAndTheOldOneStays)
     EXPECT_EQ(capture.messages().size(), 1);
 }
 
+TEST_F(PreferencesTest, ANullKeyNamesNothingNotEvenTheEmptyKey)
+{
+    Preferences preferences(domain);
+    preferences.setObject(1, QStringLiteral(""));
+    preferences.setObject(2, QString());
+    EXPECT_FALSE(preferences.objectForKey(QString()).isValid());
+    EXPECT_EQ(preferences.objectForKey(QStringLiteral("")), QVariant(1));
+    ASSERT_TRUE(preferences.synchronize());
+    EXPECT_EQ(onDisk(QStringLiteral("")), QVariant(1));
+}
+
+TEST_F(PreferencesTest, ValuesThatAreTogetherTooManyAreNotWrittenAndTheLogSaysWhy)
+{
+    Preferences preferences(domain);
+    preferences.setObject(0, kOne);
+    ASSERT_TRUE(preferences.synchronize());
+    QVariantMap many;
+    for (int number = 0; number < 6000; ++number)
+        many.insert(QString::number(number), number);
+    preferences.setObject(many, kTwo);
+    preferences.setObject(many, kThree);
+    const LogCapture capture;
+    EXPECT_FALSE(preferences.synchronize());
+    EXPECT_EQ(onDisk(kOne), QVariant(0));
+    EXPECT_FALSE(onDisk(kTwo).isValid());
+    EXPECT_EQ(capture.messages(),
+              QStringList(QStringLiteral("Cannot write the preferences file ") + QString::fromStdString(path) +
+                          QStringLiteral(": the values are together more than could be read again")));
+}
+
 TEST_F(PreferencesTest, ProcessesThatSetDifferentKeysBothKeepTheirs)
 {
     Preferences preferences(domain);

@@ -26,9 +26,9 @@ const QString kKey = QStringLiteral("key");
 /// The object that a value that is accepted becomes.
 Ref<CSKavellTypeRef> stored(const QVariant &value)
 {
-    const auto object = toStoreObject(value, kKey);
-    EXPECT_TRUE(object.has_value());
-    return object.value_or(nullptr);
+    const auto entry = toStoreEntry(value, kKey);
+    EXPECT_TRUE(entry.has_value());
+    return entry ? entry->object : nullptr;
 }
 
 bool areEqual(const Ref<CSKavellTypeRef> &object, CSKavellTypeRef owned)
@@ -47,7 +47,7 @@ QVariant roundTrip(const QVariant &value)
 QString refusalOf(const QVariant &value, const QString &key = kKey)
 {
     const test::LogCapture capture;
-    if (toStoreObject(value, key))
+    if (toStoreEntry(value, key))
         return QStringLiteral("(accepted)");
     EXPECT_EQ(capture.messages().size(), 1);
     return capture.messages().join(u'\n');
@@ -196,6 +196,15 @@ TEST(ValueConversionTest, DictionariesKeepKeysThatHaveAValueOnly)
     EXPECT_EQ(back.keys(), QStringList({QStringLiteral(""), QStringLiteral("text")}));
     EXPECT_EQ(roundTrip(QVariantHash{{kKey, 2}}).toMap().value(kKey).toInt(), 2);
     EXPECT_EQ(roundTrip(QVariantMap()).metaType().id(), QMetaType::QVariantMap);
+    const QVariantMap inner{{QStringLiteral("null"), QString()}, {kKey, 3}};
+    EXPECT_EQ(roundTrip(QVariantList{inner}), QVariant(QVariantList{QVariantMap{{kKey, 3}}}));
+}
+
+TEST(ValueConversionTest, DictionariesLeaveANullKeyOut)
+{
+    EXPECT_EQ(roundTrip(QVariantMap{{QString(), 1}, {kKey, 2}}), QVariant(QVariantMap{{kKey, 2}}));
+    EXPECT_EQ(roundTrip(QVariantHash{{QString(), 1}}), QVariant(QVariantMap()));
+    EXPECT_EQ(CSKavellDictionaryGetCount(toStoreDictionary({{QString(), 1}})->get()), 0u);
 }
 
 TEST(ValueConversionTest, AURLBecomesItsAbsoluteText)
@@ -289,10 +298,18 @@ TEST(ValueConversionTest, RefusesAtAnyDepth)
     const QVariantMap inner{{QStringLiteral("port"), QRect()}};
     EXPECT_EQ(refusalOf(QVariantList{QVariantMap{{QStringLiteral("servers"), inner}}}),
               QStringLiteral("Refused to store a value for \"key\": QRect is no type of a property list"));
-    EXPECT_EQ(refusalOf(QVariantList{QVariant()}),
-              QStringLiteral("Refused to store a value for \"key\": (null) is no type of a property list"));
     EXPECT_EQ(refusalOf(QVariantMap{{QStringLiteral("a\u0001"), 1}}),
               QStringLiteral("Refused to store a value for \"key\": QString with control characters"));
+}
+
+TEST(ValueConversionTest, RefusesListsWithAPlaceThatHoldsNothing)
+{
+    const QString refusal =
+        QStringLiteral("Refused to store a value for \"key\": (null) is no type of a property list");
+    EXPECT_EQ(refusalOf(QVariantList{QVariant()}), refusal);
+    EXPECT_EQ(refusalOf(QVariantList{1, QString()}), refusal);
+    EXPECT_EQ(refusalOf(QStringList{QStringLiteral("a"), QString()}), refusal);
+    EXPECT_EQ(refusalOf(QVariantMap{{QStringLiteral("inner"), QVariantList{QString()}}}), refusal);
 }
 
 TEST(ValueConversionTest, RefusesWhatIsNestedTooDeeply)
@@ -334,9 +351,16 @@ TEST(ValueConversionTest, RefusesKeysWithControlCharactersInOneLine)
     EXPECT_EQ(refusalOf(1, QStringLiteral("a\u0001\nb")),
               QStringLiteral("Refused to store a value for \"a\uFFFD\uFFFDb\": QString with control characters"));
     const test::LogCapture capture;
-    EXPECT_FALSE(isStorableKey(QStringLiteral("a\u0001")));
-    EXPECT_TRUE(isStorableKey(QStringLiteral("a")));
+    EXPECT_FALSE(toStoreKey(QStringLiteral("a\u0001")));
     EXPECT_EQ(capture.messages().size(), 1);
+}
+
+TEST(ValueConversionTest, ANullKeyIsNoneAndNotRefused)
+{
+    const auto key = toStoreKey(QString());
+    ASSERT_TRUE(key.has_value());
+    EXPECT_FALSE(*key);
+    EXPECT_EQ(toStdString(toStoreEntry(1, kKey)->key.get()), "key");
 }
 
 TEST(ValueConversionTest, ARefusedDictionaryNamesTheKeyThatIsToBlame)
