@@ -30,7 +30,7 @@ ExitCode runExport(const Words &words)
     std::string provider;
     line.addValue("-p,--provider", provider, "TYPE", "Only the accounts of this provider, such as google");
     line.parse(words);
-    const std::string file = line.positionals().empty() ? "-" : line.takeWord();
+    const std::string file = line.positionals().empty() ? "-" : line.takeWord("the file is missing");
     line.expectNoMore();
     const std::optional<std::string> type =
         provider.empty() ? std::nullopt : std::optional<std::string>(providerTypeOf(provider));

@@ -101,7 +101,8 @@ ExitCode runMatch(const Words &words)
     bool why = false;
     line.addFlag("-w,--why", why, "Show each rule and login name that was tried");
     line.parse(words);
-    const std::string pluginID = pluginOfKind(line.takeWord());
+    const std::string pluginID =
+        pluginOfKind(line.takeWord("say what kind of account it is: mail, calendar, contacts or chat"));
     const Json answer = askObjectLayer("match", {{"settings", settingsOf(line.positionals())}, {"pluginID", pluginID}});
     const Json &account = answer.at("account");
     if (line.json) {

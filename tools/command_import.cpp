@@ -200,9 +200,7 @@ ExitCode runImport(const Words &words)
     line.addFlag("--skip-existing", options.skip, "Leave existing accounts as they are");
     line.addFlag("-n,--dry-run", options.dryRun, "Only say what would be done");
     line.parse(words);
-    if (line.positionals().empty())
-        refuse("the file is missing; name it, or write - for standard input");
-    const std::string file = line.takeWord();
+    const std::string file = line.takeWord("the file is missing; name it, or write - for standard input");
     line.expectNoMore();
     if (options.merge + options.replace + options.skip > 1)
         refuse("--merge, --replace and --skip-existing exclude each other; say one of them");

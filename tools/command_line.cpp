@@ -177,8 +177,10 @@ Address CommandLine::takeAccount()
     return address;
 }
 
-std::string CommandLine::takeWord()
+std::string CommandLine::takeWord(const std::string &missing)
 {
+    if (m_positionals.empty())
+        refuse(missing);
     std::string word = m_positionals.front();
     m_positionals.erase(m_positionals.begin());
     m_servicesOfPositionals.erase(m_servicesOfPositionals.begin());

@@ -66,8 +66,8 @@ public:
     /// Takes the account's address off the positionals.
     [[nodiscard]] Address takeAccount();
 
-    /// Takes the next word off the positionals, of which there must be one.
-    [[nodiscard]] std::string takeWord();
+    /// Takes the next word off the positionals; refuses with this sentence when there is none.
+    [[nodiscard]] std::string takeWord(const std::string &missing);
 
     /// Refuses positionals that are left over.
     void expectNoMore() const;

@@ -165,10 +165,9 @@ ExitCode runPassword(const Words &words)
 {
     CommandLine line(help);
     line.parse(words);
-    if (line.positionals().empty())
-        refuse("say what to do with the password: set, get or remove, such as 'kavell-accounts password set google "
-               "anna@gmail.com'");
-    const std::string action = line.takeWord();
+    const std::string action = line.takeWord(
+        "say what to do with the password: set, get or remove, such as 'kavell-accounts password set google "
+        "anna@gmail.com'");
     constexpr std::array<std::pair<std::string_view, ExitCode (*)(const CommandLine &, const Address &)>, 3> actions{
         {{"set", setPassword}, {"get", getPassword}, {"remove", removePassword}}};
     for (const auto &[name, run] : actions)

@@ -72,10 +72,10 @@ Json serversQuestion(CommandLine &line)
     Json question = Json::object();
     if (line.positionals().empty())
         return question;
-    const std::string action = line.takeWord();
+    const std::string action = line.takeWord("say what to do: add or remove");
     if (action != "add" && action != "remove")
         refuse("unknown action " + inQuotes(action) + "; known are add and remove");
-    question[action] = line.takeWord();
+    question[action] = line.takeWord("the server is missing; name its host, such as mail.example.net");
     if (action == "add")
         question["services"] = line.positionals();
     else
@@ -125,6 +125,8 @@ ExitCode runChildren(const Words &words)
 ExitCode runServers(const Words &words)
 {
     CommandLine line(serversHelp);
+    bool namesOnly = false;
+    line.addFlag("--names", namesOnly, "List only the servers' names, a line each");
     line.parse(words);
     const Json question = serversQuestion(line);
     if (question.contains("remove")) {
@@ -137,7 +139,10 @@ ExitCode runServers(const Words &words)
     }
     const Json answer = askObjectLayer("servers", question);
     const Json &servers = answer.at("servers");
-    if (line.json) {
+    if (namesOnly) {
+        for (const Json &entry : servers)
+            print(textMember(entry, "server", "") + "\n");
+    } else if (line.json) {
         print(textOf(answer));
     } else if (!question.empty()) {
         const bool added = question.contains("add");

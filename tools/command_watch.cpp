@@ -153,7 +153,7 @@ Wanted wantedOf(CommandLine &line, std::optional<double> count, std::optional<do
         wanted.providerType = address.providerType;
         wanted.login = address.login;
     } else if (!line.positionals().empty()) {
-        wanted.providerType = providerTypeOf(line.takeWord());
+        wanted.providerType = providerTypeOf(line.takeWord("the provider is missing"));
     }
     line.expectNoMore();
     return wanted;

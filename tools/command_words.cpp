@@ -5,6 +5,7 @@
 
 #include "tools/commands.h"
 #include "tools/names.h"
+#include "tools/settings_words.h"
 #include "tools/text.h"
 
 namespace kavell::tools {
@@ -19,6 +20,14 @@ std::string linesOf(std::span<const ShortName> table)
     return lines;
 }
 
+std::string linesOf(std::span<const std::string_view> words)
+{
+    std::string lines;
+    for (const std::string_view word : words)
+        lines.append(word).append("\n");
+    return lines;
+}
+
 }  // namespace
 
 ExitCode runWords(const Words &words)
@@ -30,8 +39,10 @@ ExitCode runWords(const Words &words)
         print(linesOf(services()));
     else if (kind == "keys")
         print(linesOf(attributeKeys()));
+    else if (kind == "settings")
+        print(linesOf(settingKeys()));
     else
-        refuse("the kinds of words are providers, services and keys");
+        refuse("the kinds of words are providers, services, keys and settings");
     return ExitCode::Done;
 }
 

@@ -3,7 +3,7 @@
 
 #include "tools/settings_words.h"
 
-#include <cmath>
+#include <array>
 #include <cstdio>
 #include <vector>
 
@@ -20,6 +20,10 @@ namespace {
 
 constexpr char addressKey[] = "emailAddress";
 constexpr char serverKey[] = "serverAddress";
+
+constexpr std::array<std::string_view, 9> keys{addressKey,           "userName",         serverKey,
+                                               "incomingMailServer", "KAAccountTypeKey", "serverRootPath",
+                                               "KAChatAccountType",  "KAChatLoginName",  "KAChatServer"};
 
 bool looksLikeFile(const std::string &word)
 {
@@ -80,6 +84,11 @@ Json settingsOf(const Words &words)
             refuse(inQuotes(word) + " is no address, server, file or KEY=VALUE");
     }
     return settings;
+}
+
+std::span<const std::string_view> settingKeys()
+{
+    return keys;
 }
 
 std::string textMember(const Json &object, const char *key, std::string_view missing)

@@ -6,7 +6,9 @@
 #ifndef KAVELL_TOOLS_SETTINGS_WORDS_H
 #define KAVELL_TOOLS_SETTINGS_WORDS_H
 
+#include <span>
 #include <string>
+#include <string_view>
 
 #include "tools/account_access.h"
 #include "tools/json_value.h"
@@ -17,6 +19,9 @@ namespace kavell::tools {
 /// lists or JSON objects; "-" is standard input), an e-mail address, or a server or domain. Later words win. Refuses
 /// words that mean nothing, and none at all.
 [[nodiscard]] Json settingsOf(const Words &words);
+
+/// The keys that the rules look at.
+[[nodiscard]] std::span<const std::string_view> settingKeys();
 
 /// The steps of a decision as a table, or a sentence when there was none.
 [[nodiscard]] std::string stepsTable(const Json &steps);

@@ -33,6 +33,7 @@ protected:
         ASSERT_NE(mkdtemp(pattern.data()), nullptr);
         m_home = pattern;
         setenv("HOME", m_home.c_str(), 1);
+        setenv("XDG_CONFIG_HOME", (m_home + "/config").c_str(), 1);
         setenv("KAVELL_CREDENTIAL_STORE", "none", 1);
     }
 

@@ -30,7 +30,25 @@ protected:
 
 TEST_F(BashCompletion, OffersCommands)
 {
-    EXPECT_THAT(complete("kavell-accounts s"), testing::ElementsAre("show", "set"));
+    EXPECT_THAT(complete("kavell-accounts s"), testing::ElementsAre("show", "set", "servers"));
+}
+
+TEST_F(BashCompletion, OffersKindsOfDataAndTheKeysOfSettings)
+{
+    EXPECT_THAT(complete("kavell-accounts match c"), testing::ElementsAre("calendar", "contacts", "chat"));
+    EXPECT_THAT(complete("kavell-accounts match mail email"), testing::ElementsAre("emailAddress="));
+    EXPECT_THAT(complete("kavell-accounts identify KAChat"),
+                testing::ElementsAre("KAChatAccountType=", "KAChatLoginName=", "KAChatServer="));
+    EXPECT_THAT(complete("kavell-accounts match --w"), testing::ElementsAre("--why"));
+}
+
+TEST_F(BashCompletion, OffersTheServersThatCanBeRemoved)
+{
+    run({"servers", "add", "mail.example.net"});
+
+    EXPECT_THAT(complete("kavell-accounts servers "), testing::ElementsAre("add", "remove"));
+    EXPECT_THAT(complete("kavell-accounts servers remove "), testing::ElementsAre("mail.example.net"));
+    EXPECT_THAT(complete("kavell-accounts servers add "), testing::IsEmpty());
 }
 
 TEST_F(BashCompletion, OffersProvidersForAnAccount)

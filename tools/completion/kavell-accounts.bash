@@ -16,7 +16,8 @@ _kavell_accounts_offer()
 
 _kavell_accounts()
 {
-    local commands='list show add set unset remove password watch doctor import export'
+    local commands='list show add set unset remove password watch doctor import export plugins identify
+        match children servers'
     local words word previous='' current command='' action='' provider='' position=0 index
     COMPREPLY=()
 
@@ -35,7 +36,7 @@ _kavell_accounts()
             *)
                 if [[ -z $command ]]; then
                     command=$word
-                elif [[ $command = password && -z $action ]]; then
+                elif [[ ($command = password || $command = servers || $command = match) && -z $action ]]; then
                     action=$word
                 else
                     ((++position))
@@ -76,6 +77,8 @@ _kavell_accounts()
             doctor) options+=' --repair' ;;
             import) options+=' --merge --replace --skip-existing --dry-run' ;;
             export) options+=' --provider' ;;
+            identify | match) options+=' --why' ;;
+            servers) options+=' --names' ;;
         esac
         _kavell_accounts_offer "$current" < <(printf '%s\n' $options)
         return
@@ -89,12 +92,22 @@ _kavell_accounts()
             compopt -o filenames 2>/dev/null
             mapfile -t COMPREPLY < <(compgen -f -- "$current")
             return ;;
-        list | doctor)
+        list | doctor | plugins)
             return ;;
     esac
 
     if [[ $command = password && -z $action ]]; then
         _kavell_accounts_offer "$current" < <(printf '%s\n' set get remove)
+    elif [[ $command = match && -z $action ]]; then
+        _kavell_accounts_offer "$current" < <(printf '%s\n' mail calendar contacts chat)
+    elif [[ $command = identify || $command = match ]]; then
+        compopt -o filenames -o nospace 2>/dev/null
+        _kavell_accounts_offer "$current" < <(kavell-accounts words settings 2>/dev/null | sed 's/$/=/'; compgen -f -- "$current")
+    elif [[ $command = servers && -z $action ]]; then
+        _kavell_accounts_offer "$current" < <(printf '%s\n' add remove)
+    elif [[ $command = servers ]]; then
+        [[ $action = remove && $position = 0 ]] &&
+            _kavell_accounts_offer "$current" < <(kavell-accounts servers --names 2>/dev/null)
     elif [[ $position = 0 ]]; then
         _kavell_accounts_offer "$current" < <(kavell-accounts words providers 2>/dev/null)
     elif [[ $position = 1 && $command != add ]]; then
