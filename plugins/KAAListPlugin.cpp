@@ -16,6 +16,7 @@
 #include <kavellaccounts/KASheetMorpher.h>
 #include <kavellaccounts/KASheetWindow.h>
 
+#include "platform/qt/interface_file.h"
 #include "plugins/domain_matcher.h"
 #include "plugins/information_dictionary.h"
 
@@ -25,6 +26,7 @@ constexpr int kHostSheetSide = 200;
 
 const QString kDomainsResource = QStringLiteral("domains");
 const QString kDomainsType = QStringLiteral("plist");
+const QString kInterfaceType = QStringLiteral("ui");
 
 }  // namespace
 
@@ -207,6 +209,22 @@ void KAAListPlugin::showView(QWidget *view, bool animate)
     _sheetMorpher->setContentView(view, animate);
 }
 
+bool KAAListPlugin::loadInterfaceFile(const QString &name)
+{
+    const std::shared_ptr<KABundle> own = bundle();
+    auto interface = kavell::InterfaceFile::load(own ? own->pathForResource(name, kInterfaceType) : QString());
+    if (!interface)
+        return false;
+    bool complete = interface->connectOutlet(_validationView, QStringLiteral("validationView"));
+    complete &= interface->connectOutlet(_appSelectionView, QStringLiteral("appSelectionView"));
+    complete &= interface->connectOutlet(_appTableContainer, QStringLiteral("appTableContainer"));
+    complete &= interface->connectOutlet(_appSelectionAccountName, QStringLiteral("appSelectionAccountName"));
+    complete &= interface->connectOutlet(_appSelectionOKButton, QStringLiteral("appSelectionOKButton"));
+    complete &= interface->connectActions(this);
+    m_interfaces.push_back(std::move(interface));
+    return complete;
+}
+
 void KAAListPlugin::describeFields(KAFieldList &fields) const
 {
     fields.add("_appTableController", _appTableController);
@@ -215,7 +233,7 @@ void KAAListPlugin::describeFields(KAFieldList &fields) const
     fields.add("_hostSheet", _hostSheet);
     {
         const std::lock_guard lock(m_domainsMutex);
-        fields.add("_cachedDomains", _cachedDomains ? QVariant(*_cachedDomains) : QVariant());
+        fields.add("_cachedDomains", _cachedDomains);
     }
     fields.add("_validationView", _validationView);
     fields.add("_appSelectionView", _appSelectionView);

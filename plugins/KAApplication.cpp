@@ -4,6 +4,7 @@
 #include <kavellaccounts/KAApplication.h>
 
 #include <array>
+#include <optional>
 
 #include <kavellaccounts/KABundle.h>
 #include <kavellaccounts/KAConstants.h>
@@ -145,7 +146,7 @@ void KAApplication::describeFields(KAFieldList &fields) const
     fields.add("_displayName", _displayName);
     fields.add("_imagePath", _imagePath);
     fields.add("_image", _image);
-    fields.add("_userInfo", _userInfo ? QVariant(*_userInfo) : QVariant());
+    fields.add("_userInfo", _userInfo ? std::optional(*_userInfo) : std::nullopt);
     fields.add("_enabled", _enabled);
     KAObject::describeFields(fields);
 }

@@ -17,6 +17,7 @@
 #include <memory>
 #include <mutex>
 #include <optional>
+#include <vector>
 
 #include <QtCore/QList>
 #include <QtCore/QPointer>
@@ -37,7 +38,8 @@ class KASheetWindow;
 
 namespace kavell {
 class DomainMatcher;
-}
+class InterfaceFile;
+}  // namespace kavell
 
 class KAVELL_ACCOUNTS_EXPORT KAAListPlugin : public KAPlugin {
     Q_OBJECT
@@ -135,6 +137,13 @@ public:
     void describeFields(KAFieldList &fields) const override;
 
 protected:
+    /// Reads the bundle's interface file NAME.ui, made in Qt Designer, and connects it: the outlets below with the
+    /// widgets that have their names without the underscore, and the buttons whose dynamic property "action" names a
+    /// method of the plug-in that takes a QObject * ("cancel", "addAccount", …) with that method. An outlet without a
+    /// widget keeps its value. The widgets belong to the plug-in and go with it. False, with a line in the log, when
+    /// there is no such file, a widget is of the wrong class, or an action has no method.
+    bool loadInterfaceFile(const QString &name);
+
     std::shared_ptr<KAAppTableController> _appTableController;
     std::shared_ptr<KAAccount> _provisionalAccount;  ///< the account being made in the sheet
     std::shared_ptr<KASheetMorpher> _sheetMorpher;
@@ -155,6 +164,7 @@ private:
 
     mutable std::mutex m_domainsMutex;  // of the cached domains and what was made of them
     std::shared_ptr<const kavell::DomainMatcher> m_domainMatcher;
+    std::vector<std::unique_ptr<kavell::InterfaceFile>> m_interfaces;
 };
 
 #endif

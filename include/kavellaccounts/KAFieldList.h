@@ -19,6 +19,7 @@
 
 #include <concepts>
 #include <memory>
+#include <optional>
 #include <type_traits>
 #include <typeinfo>
 #include <vector>
@@ -62,6 +63,13 @@ public:
     template <typename T> void add(const char *name, const kavell::Ref<T> &reference)
     {
         addPointer(name, reference.get());
+    }
+    template <typename T> void add(const char *name, const std::optional<T> &value)
+    {
+        if (value)
+            add(name, *value);
+        else
+            addObject(name, QString::fromLatin1(QMetaType::fromType<T>().name()), nullptr, KADescription(nullptr));
     }
     template <typename T> void add(const char *name, T *pointer)
     {

@@ -196,8 +196,10 @@ private:
 [[nodiscard]] KAVELL_ACCOUNTS_EXPORT std::weak_ordering KAPluginIDCompare(const QString &first, const QString &second,
                                                                           void *context = nullptr);
 
-/// Deletes whatever is at "~/Library/Kavell Accounts/V1/PROVIDER TYPE" and posts KADidResetDataNotification to all
-/// processes. Done on the main thread; a call on another waits for that.
+/// Deletes whatever is at "~/Library/Kavell Accounts/V1/PROVIDER TYPE" and posts KADidResetDataNotification, with the
+/// provider type as its object, to all processes. Done on the main thread; a call on another waits for that. What is no
+/// single name (null, empty, ".", "..", or with "/" or a NUL in it) would reach the data of others: it is refused with a
+/// line in the log.
 KAVELL_ACCOUNTS_EXPORT void KAResetDataForProviderID(const QString &providerType);
 
 #endif

@@ -4,31 +4,15 @@
 #include <kavellaccounts/KAAListPlugin.h>
 
 #include <gtest/gtest.h>
-#include <kavellaccounts/KAAppTableController.h>
 #include <kavellaccounts/KAApplication.h>
 #include <kavellaccounts/KABundle.h>
 #include <kavellaccounts/KAConstants.h>
-#include <kavellaccounts/KANotificationCenter.h>
 #include <kavellaccounts/KARequiredMethodException.h>
-#include <kavellaccounts/KASheetMorpher.h>
-#include <kavellaccounts/KASheetWindow.h>
 
 namespace {
 
-class FixedTable : public KAAppTableController {
-public:
-    QList<std::shared_ptr<KAApplication>> selectedApps() const override { return apps; }
-    QList<std::shared_ptr<KAApplication>> apps;
-};
-
 class OpenPlugin : public KAAListPlugin {
 public:
-    using KAAListPlugin::_appSelectionOKButton;
-    using KAAListPlugin::_appSelectionView;
-    using KAAListPlugin::_appTableController;
-    using KAAListPlugin::_hostSheet;
-    using KAAListPlugin::_sheetMorpher;
-    using KAAListPlugin::_validationView;
     using KAAListPlugin::KAAListPlugin;
 };
 
@@ -155,81 +139,6 @@ TEST(KAAListPlugin, ProviderNameIsLocalizedElsePlainElseTheIdentifier)
     EXPECT_EQ(OpenPlugin(bundleNamed("good/ExampleList.kaplugin")).userVisibleProviderName(), "Zorbo Online");
     EXPECT_EQ(OpenPlugin(bundleNamed("Working/Working.kaplugin")).userVisibleProviderName(),
               "com.corvane.Working.kaplugin");
-}
-
-TEST(KAAListPlugin, OKButtonIsEnabledWhileAnApplicationIsSelected)
-{
-    OpenPlugin plugin(nullptr);
-    QPushButton button;
-    const auto table = std::make_shared<FixedTable>();
-    plugin._appSelectionOKButton = &button;
-    plugin._appTableController = table;
-    EXPECT_TRUE(plugin.appToggle(nullptr));
-    EXPECT_FALSE(button.isEnabled());
-    table->apps = {KAApplication::initWithBundleID(kKAMailAppID)};
-    EXPECT_TRUE(plugin.appToggle(nullptr));
-    EXPECT_TRUE(button.isEnabled());
-}
-
-TEST(KAAListPlugin, AddingAnAccountTellsThePluginAndTheSelectedApplications)
-{
-    OpenPlugin plugin(nullptr);
-    const auto table = std::make_shared<FixedTable>();
-    table->apps = {KAApplication::initWithBundleID(kKAMailAppID)};
-    plugin._appTableController = table;
-    QList<KANotification> posted;
-    const auto observation = KANotificationCenter::shared().addObserver(
-        KACreatedAccountsNotification, [&](const KANotification &notification) { posted += notification; });
-    plugin.addAccount(nullptr);
-    ASSERT_EQ(posted.size(), 1);
-    EXPECT_EQ(posted.first().userInformation.value("plugin").value<KAAListPlugin *>(), &plugin);
-    EXPECT_EQ(posted.first().userInformation.value("selectedApps").value<QList<std::shared_ptr<KAApplication>>>(),
-              table->apps);
-}
-
-TEST(KAAListPlugin, FirstViewMakesTheHostSheetWhichCancelEnds)
-{
-    OpenPlugin plugin(nullptr);
-    QWidget view;
-    plugin._validationView = &view;
-    plugin.showValidationPanel(false);
-    ASSERT_TRUE(plugin._hostSheet);
-    EXPECT_EQ(plugin._hostSheet->contentView(), &view);
-    int code = -1;
-    QObject::connect(plugin._hostSheet.get(), &QDialog::finished, [&](int result) { code = result; });
-    plugin._hostSheet->beginSheet(nullptr);
-    plugin.cancel(nullptr);
-    EXPECT_EQ(code, 0);
-    EXPECT_FALSE(plugin._hostSheet->isVisible());
-    plugin._hostSheet->setContentView(nullptr);
-}
-
-TEST(KAAListPlugin, GoingBackBeforeAnyViewWasShownMakesTheMorpherButNoSheet)
-{
-    OpenPlugin plugin(nullptr);
-    QWidget view;
-    plugin._validationView = &view;
-    plugin.back(nullptr);
-    ASSERT_TRUE(plugin._sheetMorpher);
-    EXPECT_FALSE(plugin._hostSheet);
-    plugin.showValidationPanel(false);
-    EXPECT_EQ(plugin._sheetMorpher->hostSheet(), plugin._hostSheet);
-    EXPECT_EQ(plugin._hostSheet->contentView(), &view);
-    plugin._hostSheet->setContentView(nullptr);
-}
-
-TEST(KAAListPlugin, GoingBackShowsTheValidationViewAgain)
-{
-    OpenPlugin plugin(nullptr);
-    QWidget validation;
-    QWidget selection;
-    plugin._validationView = &validation;
-    plugin._appSelectionView = &selection;
-    plugin.showAppSelectionPanel(false);
-    ASSERT_EQ(plugin._hostSheet->contentView(), &selection);
-    plugin.back(nullptr);
-    EXPECT_EQ(plugin._hostSheet->contentView(), &validation);
-    plugin._hostSheet->setContentView(nullptr);
 }
 
 }  // namespace

@@ -1,0 +1,83 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+
+#include "platform/qt/interface_file.h"
+
+#include <QtCore/QFile>
+#include <QtCore/QMetaMethod>
+#include <QtUiTools/QUiLoader>
+#include <QtWidgets/QAbstractButton>
+
+#include <kavellaccounts/KADescription.h>
+
+#include "platform/qt/log.h"
+
+namespace kavell {
+
+std::unique_ptr<InterfaceFile> InterfaceFile::load(const QString &path)
+{
+    QFile file(path);
+    QUiLoader loader;
+    QWidget *const root = file.open(QIODevice::ReadOnly) ? loader.load(&file) : nullptr;
+    if (!root) {
+        const QString reason = file.isOpen() ? loader.errorString() : file.errorString();
+        log(QStringLiteral("*** Cannot read the interface file %1: %2").arg(KADescription(path), reason));
+        return nullptr;
+    }
+    return std::unique_ptr<InterfaceFile>(new InterfaceFile(path, root));
+}
+
+InterfaceFile::InterfaceFile(QString path, QWidget *root) : m_path(std::move(path)), m_root(root)
+{
+}
+
+InterfaceFile::~InterfaceFile()
+{
+    for (const QPointer<QWidget> &widget : std::as_const(m_taken))
+        delete widget;
+    delete m_root;
+}
+
+bool InterfaceFile::connectActions(QObject *receiver)
+{
+    bool complete = true;
+    const QList<QAbstractButton *> buttons = m_root->findChildren<QAbstractButton *>();
+    for (QAbstractButton *button : buttons) {
+        const QByteArray action = button->property("action").toByteArray();
+        if (action.isEmpty())
+            continue;
+        const QMetaObject *const metaObject = receiver->metaObject();
+        const QMetaMethod method = metaObject->method(metaObject->indexOfMethod(action + "(QObject*)"));
+        if (!method.isValid()) {
+            log(QStringLiteral("*** The interface file %1 names the action %2, which %3 does not have")
+                    .arg(m_path, QString::fromUtf8(action), QString::fromLatin1(metaObject->className())));
+            complete = false;
+            continue;
+        }
+        QObject::connect(button, &QAbstractButton::clicked, receiver, [receiver, method, button] {
+            method.invoke(receiver, Qt::DirectConnection, Q_ARG(QObject *, button));
+        });
+    }
+    return complete;
+}
+
+QWidget *InterfaceFile::widgetNamed(const QString &name)
+{
+    for (const QPointer<QWidget> &widget : std::as_const(m_taken)) {
+        if (widget && widget->objectName() == name)
+            return widget;
+    }
+    QWidget *const widget = m_root->objectName() == name ? m_root.data() : m_root->findChild<QWidget *>(name);
+    if (widget && widget != m_root)
+        m_taken += widget;
+    return widget;
+}
+
+void InterfaceFile::logOtherClass(const QWidget *widget, const char *wanted) const
+{
+    log(QStringLiteral("*** The interface file %1 has a %2 named %3 where a %4 is expected")
+            .arg(m_path, QString::fromLatin1(widget->metaObject()->className()), widget->objectName(),
+                 QString::fromLatin1(wanted)));
+}
+
+}  // namespace kavell
