@@ -141,7 +141,10 @@ public:
     /// Searches the directories for these plug-ins, or for all of them when `identifiers` is null; nothing is searched
     /// when all are registered, an empty list included.
     void loadPlugins(const std::optional<QStringList> &identifiers);
-    void _loadPlugins(const std::optional<QStringList> &identifiers);
+
+    /// The search itself, which loadPlugins calls under the registry's lock. What escapes from it, from a subclass's
+    /// too, ends the load with a line in the log.
+    virtual void _loadPlugins(const std::optional<QStringList> &identifiers);
     void _loadPluginAtPath(const QString &path, const std::optional<QStringList> &identifiers);
 
     /// A plug-in of any bundle, outside the registry and without pluginDidLoad; the caller owns it. Null, with a line in

@@ -1,60 +1,27 @@
 // SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
 
-// Each test has a fresh manager and copies or links bundles into directories of its own, named by the real variable.
-
 #include <kavellaccounts/KAPluginManager.h>
 
+#include <thread>
+
 #include <gmock/gmock.h>
-#include <gtest/gtest.h>
 
 #include <QtCore/QCoreApplication>
-#include <QtCore/QDir>
-#include <QtCore/QFile>
-#include <QtCore/QTemporaryDir>
+
 #include <kavellaccounts/KAAListPlugin.h>
 #include <kavellaccounts/KABundle.h>
 #include <kavellaccounts/KADataPlugin.h>
-#include <thread>
 
-#include "tests/support/log_capture.h"
+#include "tests/plugins/loading_fixture.h"
 
 namespace {
 
+using kavell::test::kBundles;
+using kavell::test::kExampleID;
+using kavell::test::Loading;
 using testing::ElementsAre;
 using testing::IsEmpty;
-
-const QString kBundles = QStringLiteral(KAVELL_TEST_BUNDLES);
-const QString kExampleID = QStringLiteral("com.corvane.examplelist.kaplugin");
-
-class Loading : public testing::Test {
-protected:
-    ~Loading() override { qunsetenv("VESK_FRAMEWORK_PATH"); }
-
-    void search(const QString &path) { qputenv("VESK_FRAMEWORK_PATH", path.toUtf8()); }
-
-    /// A directory below the scratch one, which holds links to bundles.
-    QString directory(const QString &name)
-    {
-        const QString path = scratch.filePath(name);
-        QDir().mkpath(path);
-        return path;
-    }
-
-    void link(const QString &bundle, const QString &place) { ASSERT_TRUE(QFile::link(kBundles + '/' + bundle, place)); }
-
-    QStringList identifiers()
-    {
-        QStringList found;
-        for (const KAPlugin *plugin : manager.allPlugins())
-            found += plugin->identifier();
-        return found;
-    }
-
-    QTemporaryDir scratch;
-    KAPluginManager manager;
-    kavell::test::LogCapture log;
-};
 
 TEST_F(Loading, UnsetVariableFindsNothingAndSaysNothing)
 {
