@@ -4,6 +4,7 @@
 #include <kavellaccounts/KASheetWindow.h>
 
 #include <QtGui/QResizeEvent>
+#include <QtGui/QWindow>
 
 KASheetWindow::KASheetWindow(QWidget *parent) : QDialog(parent)
 {
@@ -37,13 +38,30 @@ void KASheetWindow::setContentView(QWidget *view)
 
 void KASheetWindow::beginSheet(QWidget *window)
 {
-    setParent(window, windowFlags() | Qt::Dialog);
+    QObject::disconnect(m_windowGone);
     setWindowModality(Qt::WindowModal);
+    (void)winId();  // makes the handle
+    if (window) {
+        QWidget *const topLevel = window->window();
+        (void)topLevel->winId();
+        // Not its child: whoever made the sheet owns it, and the window would delete it.
+        windowHandle()->setTransientParent(topLevel->windowHandle());
+        m_windowGone = connect(topLevel, &QObject::destroyed, this, [this] {
+            if (isVisible())
+                endSheet(Rejected);
+        });
+        QRect centred = geometry();
+        centred.moveCenter(topLevel->geometry().center());
+        setGeometry(centred);
+    } else {
+        windowHandle()->setTransientParent(nullptr);
+    }
     show();
 }
 
 void KASheetWindow::endSheet(int returnCode)
 {
+    QObject::disconnect(m_windowGone);
     done(returnCode);
 }
 

@@ -24,7 +24,8 @@ public:
     [[nodiscard]] QWidget *contentView() const;
     void setContentView(QWidget *view);
 
-    /// Shows the sheet over a window (null: on its own), modal to it. Returns at once; `finished` tells the end.
+    /// Shows the sheet over a window (null: on its own), modal to it. Returns at once; `finished` tells the end. The
+    /// window does not own the sheet; when it is destroyed first, the sheet ends with 0.
     void beginSheet(QWidget *window);
 
     /// Ends the sheet with a return code (0: cancelled) and takes it off the screen.
@@ -36,6 +37,7 @@ protected:
 
 private:
     QPointer<QWidget> m_contentView;
+    QMetaObject::Connection m_windowGone;
 };
 
 #endif

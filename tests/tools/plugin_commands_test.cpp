@@ -128,6 +128,22 @@ TEST_F(IdentifyCommand, TellsAPluginThatIsNotInstalled)
     EXPECT_THAT(result.output, StartsWith("Plug-in:     com.google.kaplugin (not installed)\nProvider:    -\n"));
 }
 
+TEST_F(IdentifyCommand, ABrokenBundleIsReportedOnceThoughSeveralRulesSearch)
+{
+    addGoogle();
+    for (const auto &entry : std::filesystem::directory_iterator(pluginPath("com.google.kaplugin/Contents"))) {
+        if (entry.path().filename().string().starts_with("Linux-"))
+            std::filesystem::remove_all(entry.path());
+    }
+
+    const std::string error = client({"identify", "anna@nobody.example"}).error;
+
+    const std::string line =
+        "kavell-accounts: *** Loading bundle at path " + pluginPath("com.google.kaplugin") + " failed\n";
+    EXPECT_THAT(error, HasSubstr(line));
+    EXPECT_EQ(error.find(line), error.rfind(line));
+}
+
 TEST_F(IdentifyCommand, WhyShowsEachRuleWithItsAnswerAndTime)
 {
     addGoogle();

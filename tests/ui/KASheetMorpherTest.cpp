@@ -5,6 +5,7 @@
 
 #include <QtCore/QVariantAnimation>
 #include <QtGui/QPainter>
+#include <QtGui/QWindow>
 #include <QtWidgets/QProxyStyle>
 
 #include <gtest/gtest.h>
@@ -189,7 +190,47 @@ TEST(KASheetWindowTest, EndingTheSheetTellsItsCodeAndHidesIt)
     sheet.orderOut();
     EXPECT_EQ(code, 7);
     EXPECT_FALSE(sheet.isVisible());
-    sheet.setParent(nullptr);
+}
+
+TEST(KASheetWindowTest, ASheetIsModalToItsWindowAndStandsOverItsCentre)
+{
+    QWidget parent;
+    parent.setGeometry(100, 100, 400, 300);
+    parent.show();
+    KASheetWindow sheet;
+    sheet.resize(200, 100);
+    sheet.beginSheet(&parent);
+    ASSERT_TRUE(parent.windowHandle());
+    EXPECT_EQ(sheet.windowHandle()->transientParent(), parent.windowHandle());
+    EXPECT_EQ(sheet.geometry().center(), parent.geometry().center());
+}
+
+TEST(KASheetWindowTest, ASheetOutlivesItsWindowAndEnds)
+{
+    const auto sheet = std::make_shared<KASheetWindow>();
+    int endings = 0;
+    QObject::connect(sheet.get(), &QDialog::finished, [&](int result) { endings += result == 0 ? 1 : 100; });
+    {
+        QWidget parent;
+        parent.show();
+        sheet->beginSheet(&parent);
+    }
+    EXPECT_EQ(endings, 1);
+    EXPECT_FALSE(sheet->isVisible());
+}
+
+TEST(KASheetWindowTest, AWindowThatGoesAfterTheSheetEndedIsNoSecondEnd)
+{
+    const auto sheet = std::make_shared<KASheetWindow>();
+    int endings = 0;
+    QObject::connect(sheet.get(), &QDialog::finished, [&] { ++endings; });
+    {
+        QWidget parent;
+        parent.show();
+        sheet->beginSheet(&parent);
+        sheet->reject();
+    }
+    EXPECT_EQ(endings, 1);
 }
 
 }  // namespace

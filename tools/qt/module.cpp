@@ -9,6 +9,8 @@
 #include <exception>
 #include <functional>
 #include <map>
+#include <mutex>
+#include <set>
 
 #include <QtCore/QJsonDocument>
 #include <QtWidgets/QApplication>
@@ -45,10 +47,16 @@ QJsonObject answerOrError(const QJsonObject &question)
     }
 }
 
-/// Lets the library's own messages through and drops the toolkit's, which mean nothing to whoever asked.
+/// Lets the library's own messages through, each once though one question may search for plug-ins several times, and
+/// drops the toolkit's, which mean nothing to whoever asked. Any thread.
 void showOwnMessages(QtMsgType, const QMessageLogContext &context, const QString &message)
 {
-    if (context.category && std::strcmp(context.category, "com.corvane.kavellaccounts") == 0)
+    if (!context.category || std::strcmp(context.category, "com.corvane.kavellaccounts") != 0)
+        return;
+    static std::mutex mutex;
+    static std::set<QString> shown;
+    const std::lock_guard lock(mutex);
+    if (shown.insert(message).second)
         std::fprintf(stderr, "kavell-accounts: %s\n", qUtf8Printable(message));
 }
 
