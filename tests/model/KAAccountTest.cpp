@@ -17,7 +17,6 @@
 
 #include "tests/model/account_fixture.h"
 #include "tests/support/log_capture.h"
-#include "tests/support/process.h"
 #include "tests/support/standard_error_capture.h"
 
 using namespace kavell;
@@ -29,6 +28,7 @@ const QString kKey = QStringLiteral("key");
 const QString kMailService = QStringLiteral("com.corvane.service.Mail");
 
 using KAAccountTest = AccountTest;
+using KAAccountPasswordTest = AccountWithVaultTest;
 
 Ref<CSKavellAccountRef> record(const char *providerType, const char *loginName = "ada")
 {
@@ -365,25 +365,6 @@ TEST_F(KAAccountTest, TheFieldsAreTheRecordAndTheVolatileAttributes)
     account->describeFields(after);
     EXPECT_EQ(after.fields()[1].value, QStringLiteral("{key = 1;}"));
 }
-
-namespace {
-
-/// With the vault as credential store, which is chosen once for the whole program.
-class KAAccountPasswordTest : public AccountTest {
-protected:
-    void SetUp() override
-    {
-        AccountTest::SetUp();
-        const std::string passphrase = homePath("passphrase");
-        writeFile(passphrase, "correct horse\n");
-        std::filesystem::permissions(passphrase, std::filesystem::perms::owner_read);
-        setenv("KAVELL_CREDENTIAL_STORE", "vault", 1);
-        setenv("KAVELL_VAULT_PASSPHRASE_FILE", passphrase.c_str(), 1);
-        setenv("XDG_DATA_HOME", homePath("data").c_str(), 1);
-    }
-};
-
-}  // namespace
 
 TEST_F(KAAccountPasswordTest, APasswordIsStoredReadAndRemoved)
 {

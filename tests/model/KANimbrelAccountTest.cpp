@@ -12,12 +12,12 @@ using namespace kavell::test;
 
 namespace {
 
-class KANimbrelAccountTest : public AccountTest {
+class KANimbrelAccountTest : public AccountWithVaultTest {
 protected:
     void TearDown() override
     {
         KANimbrelAccount::setMemberAccountFactory(nullptr);
-        AccountTest::TearDown();
+        AccountWithVaultTest::TearDown();
     }
 };
 
@@ -65,6 +65,19 @@ TEST_F(KANimbrelAccountTest, TheMemberAccountIsMadeOnceWithTheAccountsNames)
     EXPECT_EQ(name, QStringLiteral("ada"));
     EXPECT_FALSE(hasPassword);
     EXPECT_EQ(applicationID, QStringLiteral("com.corvane.nimbrel.kaplugin"));
+}
+
+TEST_F(KANimbrelAccountTest, TheMemberAccountGetsTheStoredPassword)
+{
+    QString given;
+    KANimbrelAccount::setMemberAccountFactory([&](const QString &, const QString &password, const QString &) {
+        given = password;
+        return std::make_shared<int>(7);
+    });
+    const auto account = newMember();
+    ASSERT_TRUE(account->setPassword(QStringLiteral("secret")));
+    EXPECT_TRUE(account->nimbrelMemberAccount());
+    EXPECT_EQ(given, QStringLiteral("secret"));
 }
 
 TEST_F(KANimbrelAccountTest, AFailureIsNotRemembered)

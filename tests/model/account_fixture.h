@@ -20,6 +20,8 @@
 #include <kavellaccounts/KAConstants.h>
 #include <kavellaccounts/KADefaults.h>
 
+#include "tests/support/process.h"
+
 /// So that a failed comparison reads well.
 inline void PrintTo(const QString &text, std::ostream *stream)
 {
@@ -60,6 +62,22 @@ protected:
 
 private:
     std::string m_home;
+};
+
+/// With a vault as credential store, which a program chooses once for its life: whoever reads or sets a password is to
+/// be one of these.
+class AccountWithVaultTest : public AccountTest {
+protected:
+    void SetUp() override
+    {
+        AccountTest::SetUp();
+        const std::string passphrase = homePath("passphrase");
+        writeFile(passphrase, "correct horse\n");
+        std::filesystem::permissions(passphrase, std::filesystem::perms::owner_read);
+        setenv("KAVELL_CREDENTIAL_STORE", "vault", 1);
+        setenv("KAVELL_VAULT_PASSPHRASE_FILE", passphrase.c_str(), 1);
+        setenv("XDG_DATA_HOME", homePath("data").c_str(), 1);
+    }
 };
 
 }  // namespace kavell::test
