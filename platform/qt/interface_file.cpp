@@ -18,9 +18,10 @@ std::unique_ptr<InterfaceFile> InterfaceFile::load(const QString &path)
 {
     QFile file(path);
     QUiLoader loader;
-    QWidget *const root = file.open(QIODevice::ReadOnly) ? loader.load(&file) : nullptr;
+    const bool isOpen = !path.isEmpty() && file.open(QIODevice::ReadOnly);
+    QWidget *const root = isOpen ? loader.load(&file) : nullptr;
     if (!root) {
-        const QString reason = file.isOpen() ? loader.errorString() : file.errorString();
+        const QString reason = isOpen ? loader.errorString() : QStringLiteral("It cannot be opened.");
         log(QStringLiteral("*** Cannot read the interface file %1: %2").arg(KADescription(path), reason));
         return nullptr;
     }

@@ -235,8 +235,8 @@ TEST(KAAListPluginSheet, MissingInterfaceFileIsLogged)
     const kavell::test::LogCapture log;
     OpenPlugin plugin(exampleBundle());
     EXPECT_FALSE(plugin.loadInterfaceFile("NoSuchSheet"));
-    ASSERT_EQ(log.messages().size(), 1);
-    EXPECT_TRUE(log.messages().first().startsWith("*** Cannot read the interface file (null): "));
+    EXPECT_THAT(log.messages(),
+                testing::ElementsAre("*** Cannot read the interface file (null): It cannot be opened."));
 }
 
 }  // namespace
