@@ -6,6 +6,7 @@
 
 #include <QtGui/QPainter>
 #include <QtWidgets/QFormLayout>
+#include <QtWidgets/QHBoxLayout>
 #include <QtWidgets/QLineEdit>
 #include <QtWidgets/QPushButton>
 
@@ -24,6 +25,7 @@ const QString kProviderType = QStringLiteral("com.example.account.zorbo");
 const QString kEnabledKey = QStringLiteral("com.example.zorbo.enabled.");  // and the application's identifier
 
 constexpr int kImageSide = 32;
+constexpr int kAddressLength = 32;  // that can be seen at once
 
 }  // namespace
 
@@ -63,6 +65,7 @@ public:
         m_address->clear();
         showView(m_form.get(), false);
         _hostSheet->beginSheet(window);
+        m_address->setFocus();
     }
 
     void setEnabled(bool enabled, const std::shared_ptr<KAApplication> &application,
@@ -78,10 +81,16 @@ private:
         m_form = std::make_unique<QWidget>();
         auto *const layout = new QFormLayout(m_form.get());
         m_address = new QLineEdit;
+        m_address->setMinimumWidth(m_address->fontMetrics().averageCharWidth() * kAddressLength);
         layout->addRow(userNameFieldLabel(), m_address);
         auto *const add = new QPushButton(bundle()->localizedString(QStringLiteral("ADD")));
         auto *const cancelButton = new QPushButton(bundle()->localizedString(QStringLiteral("CANCEL")));
-        layout->addRow(cancelButton, add);
+        auto *const buttons = new QHBoxLayout;
+        buttons->addStretch();
+        buttons->addWidget(cancelButton);
+        buttons->addWidget(add);
+        layout->addRow(buttons);
+        cancelButton->setAutoDefault(false);
         add->setDefault(true);
         add->setEnabled(false);
         connect(m_address, &QLineEdit::textChanged, add,
