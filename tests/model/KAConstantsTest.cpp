@@ -186,8 +186,11 @@ TEST(KAConstantsTest, KeysThatShareAValueAddressOneEntry)
 
 TEST(KAConstantsTest, OnlyTheChatKeysAreWritableVariables)
 {
-    EXPECT_FALSE(std::is_const_v<decltype(KAChatAccountTypeKey)>);
-    EXPECT_FALSE(std::is_const_v<decltype(KAChatUseSSLKey)>);
+    QString *const writable[] = {
+        &KAChatAccountDescriptionKey, &KAChatAccountTypeKey, &KAChatEmailAddressKey, &KAChatInactiveAccountKey,
+        &KAChatLoginNameKey,          &KAChatPasswordKey,    &KAChatServerKey,       &KAChatServerPortKey,
+        &KAChatUseKerberosV5Key,      &KAChatUseSSLKey};
+    EXPECT_EQ(std::size(writable), 10u);
     EXPECT_TRUE(std::is_const_v<decltype(KAMailUserNameKey)>);
     EXPECT_TRUE(std::is_const_v<decltype(KAChatAcctTypeAIM)>);
 }

@@ -31,6 +31,8 @@ public:
         fields.add("_word", "text");
         fields.add("_name", QStringLiteral("Anna"));
         fields.add("_PassWord", QStringLiteral("secret"));
+        fields.add("PASSWORD", QStringLiteral("secret"));
+        fields.add("_passwordHint", QStringLiteral("a river"));
         fields.add("_where", static_cast<const void *>(nullptr));
         KAObject::describeFields(fields);
     }
@@ -103,6 +105,14 @@ TEST(KAExtras, TheDomainOfAServerAddressIsItsHost)
     EXPECT_EQ(urlDomain("dav.example.net/home/anna"), "dav.example.net");
     EXPECT_EQ(urlDomain("  dav.example.net/x"), "dav.example.net");
     EXPECT_EQ(urlDomain("://dav.example.net/x"), "dav.example.net");
+    EXPECT_EQ(urlDomain("dav.example.net/?back=http://other.example"), "dav.example.net");
+}
+
+TEST(KAExtras, NothingBeforeASlashIsAnEmptyDomain)
+{
+    EXPECT_FALSE(urlDomain("/home").isNull());
+    EXPECT_TRUE(urlDomain("/home").isEmpty());
+    EXPECT_FALSE(urlDomain("").isNull());
 }
 
 TEST(KAExtras, TheDomainOfAWholeUrlIsItsSchemeWithTheColon)
@@ -125,6 +135,8 @@ TEST(KAExtras, AUserOfOneOnlineServiceHasAnAddressAtTheOther)
     EXPECT_EQ(otherNimbrelOrDorvexEmail("anna@dorvex.example"), "anna@nimbrel.example");
     EXPECT_TRUE(otherNimbrelOrDorvexEmail("anna@example.net").isNull());
     EXPECT_TRUE(otherNimbrelOrDorvexEmail("anna@").isNull());
+    EXPECT_TRUE(otherNimbrelOrDorvexEmail("anna@mail.nimbrel.example").isNull());
+    EXPECT_EQ(otherNimbrelOrDorvexEmail("@nimbrel.example"), "@dorvex.example");
 }
 
 TEST(KAExtras, AFieldGivesATrimmedAddressInLowerCase)
@@ -132,6 +144,8 @@ TEST(KAExtras, AFieldGivesATrimmedAddressInLowerCase)
     QLineEdit field;
     field.setText("  Anna@Example.NET ");
     EXPECT_EQ(validatedEmailAddressStringValue(&field), "anna@example.net");
+    field.clear();
+    EXPECT_FALSE(validatedEmailAddressStringValue(&field).isNull());
 }
 
 TEST(KAExtras, TheHashIsWhatFollowsTheNumberSign)
@@ -214,10 +228,12 @@ TEST(KAExtras, ADescriptionMasksThePasswordOfTheTopLevelOnly)
 TEST(KAExtras, ADumpHasALineForEachFieldInItsOrder)
 {
     const Example example;
-    EXPECT_EQ(linesOf(_ivarDump(&example)), (QStringList{"\t_flag <c>: true", "\t_small <s>: -3", "\t_count <i>: 7",
-                                                         "\t_long <l>: 8", "\t_huge <Q>: -1", "\t_ratio <d>: 1.500000",
-                                                         "\t_word <*>: text", "\t_name <@\"QString\">: Anna",
-                                                         "\t_PassWord <@\"QString\">: secret", "\t_where <^v>: 0x0"}));
+    EXPECT_EQ(
+        linesOf(_ivarDump(&example)),
+        (QStringList{"\t_flag <c>: true", "\t_small <s>: -3", "\t_count <i>: 7", "\t_long <l>: 8", "\t_huge <Q>: -1",
+                     "\t_ratio <d>: 1.500000", "\t_word <*>: text", "\t_name <@\"QString\">: Anna",
+                     "\t_PassWord <@\"QString\">: secret", "\tPASSWORD <@\"QString\">: secret",
+                     "\t_passwordHint <@\"QString\">: a river", "\t_where <^v>: 0x0"}));
 }
 
 TEST(KAExtras, ADumpWithoutPasswordsMasksThemInAnyCaseOfLetters)
@@ -225,6 +241,8 @@ TEST(KAExtras, ADumpWithoutPasswordsMasksThemInAnyCaseOfLetters)
     const Example example;
     const QStringList lines = linesOf(_ivarDumpNoPasswords(&example));
     EXPECT_TRUE(lines.contains("\t_PassWord <@\"QString\">: ***"));
+    EXPECT_TRUE(lines.contains("\tPASSWORD <@\"QString\">: ***"));
+    EXPECT_TRUE(lines.contains("\t_passwordHint <@\"QString\">: a river"));
     EXPECT_TRUE(lines.contains("\t_name <@\"QString\">: Anna"));
 }
 

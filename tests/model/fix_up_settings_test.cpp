@@ -64,9 +64,39 @@ TEST(FixUpSettings, AnAddressThatIsThereStays)
               "c@d.example");
 }
 
-TEST(FixUpSettings, AUserNameThatIsThereStays)
+TEST(FixUpSettings, AUserNameThatIsThereStaysEvenWhenItIsEmpty)
 {
     EXPECT_EQ(fixUpSettings({{"userName", "anna"}, {"KAChatLoginName", "bert"}}).value("userName"), "anna");
+    const QVariantMap fixed =
+        fixUpSettings({{"userName", ""}, {"KAChatLoginName", "bert"}, {"KAChatAccountType", "aim"}});
+    EXPECT_EQ(fixed.value("userName"), "");
+    EXPECT_EQ(fixed.value("emailAddress"), "@aol.com");
+}
+
+TEST(FixUpSettings, ValuesThatAreNothingCountAsMissing)
+{
+    const QVariantMap fixed = fixUpSettings({{"userName", QString()},
+                                             {"emailAddress", QString()},
+                                             {"KAChatLoginName", "anna"},
+                                             {"KAChatAccountType", "aim"},
+                                             {"serverName", "ex.example.net"},
+                                             {"serverURL", QVariant()}});
+    EXPECT_EQ(fixed.value("userName"), "anna");
+    EXPECT_EQ(fixed.value("emailAddress"), "anna@aol.com");
+    EXPECT_EQ(fixed.value("serverURL").toUrl(), QUrl("http://ex.example.net"));
+}
+
+TEST(FixUpSettings, AnEmptyChatLoginIsAUserName)
+{
+    const QVariantMap fixed = fixUpSettings({{"KAChatLoginName", ""}, {"KAChatAccountType", "google"}});
+    EXPECT_TRUE(fixed.contains("userName"));
+    EXPECT_EQ(fixed.value("emailAddress"), "@gmail.com");
+}
+
+TEST(FixUpSettings, WithoutAUserNameNothingIsDerived)
+{
+    EXPECT_EQ(fixUpSettings({{"KAChatAccountType", "aim"}}), QVariantMap({{"KAChatAccountType", "aim"}}));
+    EXPECT_EQ(fixUpSettings({}), QVariantMap());
 }
 
 TEST(FixUpSettings, ACalendarServerTellsTheMailDomain)
@@ -100,11 +130,14 @@ TEST(FixUpSettings, OtherCalendarServersAndOtherKindsTellNothing)
 
 TEST(FixUpSettings, AChatTypeKeepsTheCalendarServerFromBeingAsked)
 {
-    EXPECT_FALSE(fixUpSettings({{"userName", "anna"},
-                                {"KAChatAccountType", "jabber"},
-                                {"KAAccountTypeKey", "kKAServiceCalDAV"},
-                                {"serverAddress", "www.google.com"}})
-                     .contains("emailAddress"));
+    for (const char *type : {"jabber", ""}) {
+        EXPECT_FALSE(fixUpSettings({{"userName", "anna"},
+                                    {"KAChatAccountType", type},
+                                    {"KAAccountTypeKey", "kKAServiceCalDAV"},
+                                    {"serverAddress", "www.google.com"}})
+                         .contains("emailAddress"))
+            << type;
+    }
 }
 
 TEST(FixUpSettings, TheCalendarRuleServesALoginNameOfChatToo)
@@ -148,9 +181,32 @@ TEST(FixUpSettings, ExternalPartsBecomeTheExternalUrl)
     EXPECT_FALSE(fixed.contains("serverURL"));
 }
 
+TEST(FixUpSettings, TheExternalUrlTakesItsOwnPartsOnly)
+{
+    const QVariantMap fixed = fixUpSettings({{"serverName", "in.example.net"},
+                                             {"useSSL", true},
+                                             {"serverPort", 443},
+                                             {"serverRootPath", "/in"},
+                                             {"externalServerName", "out.example.net"}});
+    EXPECT_EQ(fixed.value("serverURL").toUrl(), QUrl("https://in.example.net:443/in"));
+    EXPECT_EQ(fixed.value("externalServerURL").metaType().id(), QMetaType::QUrl);
+    EXPECT_EQ(fixed.value("externalServerURL").toUrl(), QUrl("http://out.example.net"));
+}
+
 TEST(FixUpSettings, AnUrlThatIsThereStays)
 {
     EXPECT_EQ(fixUpSettings({{"serverName", "ex.example.net"}, {"serverURL", "mine"}}).value("serverURL"), "mine");
+    EXPECT_EQ(fixUpSettings({{"serverName", "ex.example.net"}, {"serverURL", ""}}).value("serverURL"), "");
+    EXPECT_EQ(fixUpSettings({{"externalServerName", "ex.example.net"}, {"externalServerURL", "mine"}})
+                  .value("externalServerURL"),
+              "mine");
+}
+
+TEST(FixUpSettings, WithoutAHostThereIsNoUrl)
+{
+    EXPECT_FALSE(
+        fixUpSettings({{"useSSL", true}, {"serverPort", 443}, {"serverRootPath", "/x"}}).contains("serverURL"));
+    EXPECT_FALSE(fixUpSettings({{"externalServerPort", 443}}).contains("externalServerURL"));
 }
 
 TEST(FixUpSettings, PartsThatMakeNoUrlStoreNothing)

@@ -13,6 +13,7 @@
 #include <fcntl.h>
 #include <filesystem>
 #include <fstream>
+#include <iterator>
 #include <memory>
 #include <set>
 #include <sys/file.h>
@@ -255,6 +256,19 @@ TEST_F(PreferencesTest, ManyProcessesWritingAtOnceLoseNoKey)
     for (int writer = 0; writer < kProcesses; ++writer)
         for (int key = 0; key < kKeys; ++key)
             EXPECT_EQ(reader.objectForKey(QStringLiteral("%1-%2").arg(writer).arg(key)), QVariant(key));
+}
+
+TEST_F(PreferencesTest, WhoeverReadsWhileAnotherWritesHasTheWholeOldFile)
+{
+    setInAnotherProcess(kOne, QString(100000, u'x'));
+    const std::string before = readFile(path);
+    std::ifstream reader(path);
+    std::string found(50000, '\0');
+    reader.read(found.data(), static_cast<std::streamsize>(found.size()));
+    setInAnotherProcess(kOne, 1);
+    found.append(std::istreambuf_iterator<char>(reader), {});
+    EXPECT_EQ(found, before);
+    EXPECT_EQ(onDisk(kOne), QVariant(1));
 }
 
 TEST_F(PreferencesTest, AProcessKilledInTheMiddleOfWritingLosesNothing)
