@@ -12,17 +12,26 @@ namespace kavell {
 
 namespace {
 
-/// "de_AT" and then "de" for each of the user's languages, and English, which every bundle should have, at the end.
+/// For each of the user's languages "de_AT" and other long names, then "de"; and English, which every bundle should have,
+/// at the end.
 QStringList languages()
 {
     QStringList names;
+    QString base;
     const QStringList wanted = QLocale::system().uiLanguages();
     for (QString language : wanted) {
         language.replace(u'-', u'_');
-        for (; !language.isEmpty(); language.truncate(qMax(language.lastIndexOf(u'_'), qsizetype(0))))
+        // One language's long names ("zh_TW", "zh_Hant_TW") stand together; what they share comes after all of them.
+        if (const QString own = language.section(u'_', 0, 0); own != base) {
+            names += base;
+            base = own;
+        }
+        for (; language.contains(u'_'); language.truncate(language.lastIndexOf(u'_')))
             names += language;
     }
+    names += base;
     names += QStringLiteral("en");
+    names.removeAll(QString());
     names.removeDuplicates();
     return names;
 }

@@ -5,6 +5,7 @@
 
 #include <QtCore/QDir>
 #include <QtCore/QFileInfo>
+#include <QtCore/QSet>
 #include <QtCore/QStandardPaths>
 #include <QtCore/QThread>
 #include <QtGui/QGuiApplication>
@@ -74,11 +75,15 @@ QString entryPathByFileName(const QString &name)
 
 QString entryPathByName(const QString &name)
 {
+    QSet<QString> seen;  // the user's file takes the place of the system's of the same name, when it is hidden too
     const QStringList directories = entryDirectories();
     for (const QString &directory : directories) {
         const QFileInfoList files =
             QDir(directory).entryInfoList({QStringLiteral("*.desktop")}, QDir::Files, QDir::Name);
         for (const QFileInfo &file : files) {
+            if (seen.contains(file.fileName()))
+                continue;
+            seen.insert(file.fileName());
             const std::optional<DesktopEntry> entry = readDesktopEntry(file.filePath());
             if (entry && !entry->hidden && entry->name == name)
                 return file.filePath();

@@ -1,0 +1,21 @@
+<?xml version="1.0" encoding="utf-8"?>
+<!-- SPDX-FileCopyrightText: 2026 The Kavell Accounts developers -->
+<!-- SPDX-License-Identifier: LGPL-2.1-or-later -->
+<!DOCTYPE TS>
+<TS version="2.1" language="de" sourcelanguage="en">
+<context>
+    <name></name>
+    <message id="EVERYWHERE">
+        <source></source>
+        <translation>deutsch</translation>
+    </message>
+    <message id="GERMAN_ONLY">
+        <source></source>
+        <translation>nur deutsch</translation>
+    </message>
+    <message id="AUSTRIAN">
+        <source></source>
+        <translation>deutsch</translation>
+    </message>
+</context>
+</TS>

@@ -1,0 +1,17 @@
+<?xml version="1.0" encoding="utf-8"?>
+<!-- SPDX-FileCopyrightText: 2026 The Kavell Accounts developers -->
+<!-- SPDX-License-Identifier: LGPL-2.1-or-later -->
+<!DOCTYPE TS>
+<TS version="2.1" language="en" sourcelanguage="en">
+<context>
+    <name></name>
+    <message id="EVERYWHERE">
+        <source></source>
+        <translation>english</translation>
+    </message>
+    <message id="ENGLISH_ONLY">
+        <source></source>
+        <translation>only english</translation>
+    </message>
+</context>
+</TS>
