@@ -7,6 +7,7 @@
 #include <cerrno>
 #include <csignal>
 #include <cstdint>
+#include <iterator>
 #include <pthread.h>
 #include <sys/eventfd.h>
 #include <system_error>
@@ -16,9 +17,6 @@
 namespace kavell {
 
 namespace {
-
-/// A thread name holds 15 bytes.
-constexpr char kThreadName[] = "kavell.dnsquery";
 
 /// Keeps the program's signals away from a thread that is started meanwhile.
 class BlockedSignals {
@@ -52,8 +50,14 @@ QuerySource::~QuerySource() = default;
 QueryQueue &QueryQueue::shared()
 {
     // Never destroyed: its thread runs until the process ends.
-    static auto *const gDNSQueryDispatchQ = new QueryQueue;
+    static auto *const gDNSQueryDispatchQ = new QueryQueue("kavell.dnsquery");
     return *gDNSQueryDispatchQ;
+}
+
+QueryQueue &QueryQueue::services()
+{
+    static auto *const queue = new QueryQueue("kavell.dnssd");
+    return *queue;
 }
 
 int QueryQueue::add(std::shared_ptr<QuerySource> source)
@@ -95,14 +99,21 @@ void QueryQueue::wake() const
 
 std::vector<std::shared_ptr<QuerySource>> QueryQueue::sources()
 {
+    // What is done is freed after the lock is given back: that may block, and nobody who adds waits for it.
+    std::vector<std::shared_ptr<QuerySource>> done;
     const std::lock_guard lock(m_mutex);
-    std::erase_if(m_sources, [](const auto &source) { return source->isDone(); });
+    const auto isActive = [](const auto &source) {
+        return !source->isDone();
+    };
+    const auto firstDone = std::stable_partition(m_sources.begin(), m_sources.end(), isActive);
+    done.assign(std::move_iterator(firstDone), std::move_iterator(m_sources.end()));
+    m_sources.erase(firstDone, m_sources.end());
     return m_sources;
 }
 
 void QueryQueue::run()
 {
-    pthread_setname_np(pthread_self(), kThreadName);
+    pthread_setname_np(pthread_self(), m_threadName);
     std::vector<pollfd> descriptors;
     std::vector<size_t> ends;
     for (;;) {

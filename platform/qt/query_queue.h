@@ -2,7 +2,8 @@
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
 // A serial work queue for look-ups: one thread that waits for the descriptors of all active sources at once, so that a
-// slow server delays nobody else's answer. The record queries run on one such queue. Any thread may add.
+// slow server delays nobody else's answer. The record queries run on one such queue, what may block on another. Any
+// thread may add.
 
 #ifndef KAVELL_PLATFORM_QT_QUERY_QUEUE_H
 #define KAVELL_PLATFORM_QT_QUERY_QUEUE_H
@@ -15,7 +16,7 @@
 
 namespace kavell {
 
-/// Something with descriptors to wait for. The queue calls it on its own thread only.
+/// Something with descriptors to wait for. The queue calls it on its own thread only, and lets go of it there.
 class QuerySource {
 public:
     QuerySource() = default;
@@ -38,6 +39,9 @@ public:
     /// The process's queue "com.corvane.kavellaccounts.dnsquery", made by the first call and kept to the end.
     [[nodiscard]] static QueryQueue &shared();
 
+    /// The queue of what may block for long: the calls of the machine's DNS-SD service. Nobody waits for its sources.
+    [[nodiscard]] static QueryQueue &services();
+
     /// Has the source waited for until it is done. 0, or the number of the error that keeps the queue from running.
     [[nodiscard]] int add(std::shared_ptr<QuerySource> source);
 
@@ -48,11 +52,12 @@ public:
     void failAdditionsWith(int error) { m_additionError = error; }
 
 private:
-    QueryQueue() = default;
+    explicit QueryQueue(const char *threadName) : m_threadName(threadName) {}
     [[nodiscard]] int start();
     void run();
     [[nodiscard]] std::vector<std::shared_ptr<QuerySource>> sources();
 
+    const char *const m_threadName;  ///< at most 15 bytes
     std::mutex m_mutex;
     std::vector<std::shared_ptr<QuerySource>> m_sources;
     int m_wakeDescriptor = -1;

@@ -21,7 +21,7 @@ public:
     explicit RecordQueryBackEnd(RecordCallback callback) : m_callback(std::move(callback)) {}
 
     /// From here on the callback does not run; one that runs on another thread is waited for.
-    void cancel();
+    virtual void cancel();
 
     [[nodiscard]] bool isCancelled() const { return m_cancelled; }
 

@@ -6,8 +6,13 @@
 #include <atomic>
 #include <chrono>
 #include <cstdlib>
+#include <sys/socket.h>
+#include <sys/un.h>
 #include <thread>
+#include <unistd.h>
 #include <vector>
+
+#include <QtCore/QDir>
 
 #include <gtest/gtest.h>
 
@@ -138,7 +143,20 @@ TEST(KADNSServiceTest, ALateAnswerWithinTheLimitCounts)
     EXPECT_EQ(asked("late.example")->mailServers(), QStringList({"mx.example.org."}));
 }
 
-TEST(KADNSServiceTest, AMachineWithoutAResolverAnswersAtOnce)
+TEST(KADNSServiceTest, AnAnswerAfterTheLimitIsNeitherTakenNorCached)
+{
+    DnsServer server;
+    server.addMailExchanger("toolate.example", 10, "mx.example.org");
+    server.delay("toolate.example", 700ms);
+    server.addMailExchanger("meanwhile.example", 10, "mx.example.org");
+    server.delay("meanwhile.example", 400ms);
+    const auto service = asked("toolate.example");
+    EXPECT_EQ(asked("meanwhile.example")->mailServers().size(), 1);
+    EXPECT_TRUE(service->mailServers().isEmpty());
+    EXPECT_TRUE(asked("toolate.example")->mailServers().isEmpty());
+}
+
+TEST(KADNSServiceTest, AMachineWithoutAResolverHoldsTheTimeLimit)
 {
     setenv("KAVELL_DNS_SERVERS", "127.0.0.1:1", 1);
     EXPECT_LE(blockingTime("nobody.example"), 550ms);
@@ -235,6 +253,39 @@ TEST(KADNSServiceTest, ADomainAsHostMatchesTheExchangersInsideIt)
 TEST(KADNSServiceTest, WithoutServersNoHostMatches)
 {
     EXPECT_FALSE(KADNSService::initWithServerAddress("custom.example")->hasMailHost("example"));
+}
+
+// The next two go through the machine's own DNS-SD library, which reads the system bus's address once per process.
+
+TEST(KADNSServiceDeathTest, WithoutADaemonALocalNameGivesAnEmptyResultAtOnce)
+{
+    GTEST_FLAG_SET(death_test_style, "threadsafe");
+    const auto lookUp = [] {
+        setenv("DBUS_SYSTEM_BUS_ADDRESS", "unix:path=/nonexistent/bus", 1);
+        const auto time = blockingTime("nodaemon.local");
+        std::_Exit(asked("nodaemon.local")->mailServers().isEmpty() && time < 400ms ? 0 : 1);
+    };
+    EXPECT_EXIT(lookUp(), testing::ExitedWithCode(0), "^$");
+}
+
+TEST(KADNSServiceDeathTest, ABusThatNeverAnswersHoldsALocalNameToTheTimeLimit)
+{
+    GTEST_FLAG_SET(death_test_style, "threadsafe");
+    const auto lookUp = [] {
+        // Connecting to a listening socket succeeds; nobody ever answers what is sent there.
+        sockaddr_un address{};
+        address.sun_family = AF_UNIX;
+        const QByteArray path = QDir::tempPath().toLocal8Bit() + "/hung-bus";
+        qstrncpy(address.sun_path, path.constData(), sizeof address.sun_path);
+        const int bus = socket(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0);
+        if (bind(bus, reinterpret_cast<const sockaddr *>(&address), sizeof address) != 0 || listen(bus, 16) != 0)
+            std::_Exit(2);
+        setenv("DBUS_SYSTEM_BUS_ADDRESS", ("unix:path=" + path).constData(), 1);
+        const auto first = blockingTime("hungbus.local");
+        const auto second = blockingTime("otherhungbus.local");
+        std::_Exit(first >= 499ms && first <= 550ms && second <= 550ms ? 0 : 1);
+    };
+    EXPECT_EXIT(lookUp(), testing::ExitedWithCode(0), "^$");
 }
 
 TEST(KADNSServiceTest, AHungServerDelaysNobodyElse)
