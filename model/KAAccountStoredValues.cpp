@@ -21,6 +21,12 @@ QVariantMap storedAccounts()
     return KADefaults::shared()->objectForKey(kAccountsKey).toMap();
 }
 
+/// The values stored under a login name; none under a null one, which is not the empty one.
+QVariantMap storedValues(const QString &loginName)
+{
+    return loginName.isNull() ? QVariantMap() : storedAccounts().value(loginName).toMap();
+}
+
 void storeAccounts(const QVariantMap &accounts)
 {
     const auto defaults = KADefaults::shared();
@@ -49,21 +55,22 @@ void KAAccount::storeValue(const QVariant &value, const QString &key)
 
 QVariant KAAccount::storedValueForKey(const QString &key) const
 {
-    return key.isNull() ? QVariant() : storedAccounts().value(loginName()).toMap().value(key);
+    return key.isNull() ? QVariant() : storedValues(loginName()).value(key);
 }
 
 void KAAccount::removeStoredData()
 {
-    if (!KADefaults::shared()->objectForKey(kAccountsKey).isValid())
+    const QString login = loginName();
+    if (login.isNull() || !KADefaults::shared()->objectForKey(kAccountsKey).isValid())
         return;
     QVariantMap accounts = storedAccounts();
-    accounts.remove(loginName());
+    accounts.remove(login);
     storeAccounts(accounts);
 }
 
 void KAAccount::mergeStoredData()
 {
-    const QVariantMap entry = storedAccounts().value(loginName()).toMap();
+    const QVariantMap entry = storedValues(loginName());
     for (auto stored = entry.begin(); stored != entry.end(); ++stored)
         if (isNothing(providerAttributeForKey(stored.key())))
             setProviderAttribute(stored.value(), stored.key());

@@ -94,7 +94,7 @@ void assembleServerURL(const QVariantMap &input, const ServerKeys &keys, QVarian
     QString text = isTrueForKey(input, keys.useSSL) ? QStringLiteral("https://") : QStringLiteral("http://");
     text += textForKey(input, keys.host);
     if (hasValueForKey(input, keys.port))
-        text += u':' + QString::number(input.value(keys.port).toInt());
+        text += u':' + QString::number(integerForKey(input, keys.port));
     text += textForKey(input, keys.path);
     const QUrl url(text, QUrl::StrictMode);
     if (url.isValid())

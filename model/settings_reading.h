@@ -7,6 +7,9 @@
 #ifndef KAVELL_MODEL_SETTINGS_READING_H
 #define KAVELL_MODEL_SETTINGS_READING_H
 
+#include <algorithm>
+#include <cstdlib>
+
 #include <QtCore/QString>
 #include <QtCore/QVariantMap>
 
@@ -42,6 +45,17 @@ namespace kavell {
         return value.toBool();
     const QChar first = text.isEmpty() ? QChar() : text.at(0).toLower();
     return first == u'y' || first == u't' || (first >= u'1' && first <= u'9');
+}
+
+/// The whole number that the key holds: the one that a text begins with, a real without its fraction; 0 for none.
+[[nodiscard]] inline qlonglong integerForKey(const QVariantMap &settings, const QString &key)
+{
+    const QVariant value = settings.value(key);
+    if (const QString text = textOf(value); !text.isNull())
+        return std::strtoll(text.toUtf8().constData(), nullptr, 10);
+    const bool isReal = value.metaType().id() == QMetaType::Double || value.metaType().id() == QMetaType::Float;
+    constexpr double kLargest = 1e18;  // much larger ones cannot be converted
+    return isReal ? static_cast<qlonglong>(std::clamp(value.toDouble(), -kLargest, kLargest)) : value.toLongLong();
 }
 
 /// Whether the key holds a text that is not empty.

@@ -86,7 +86,8 @@ public:
     /// @}
 
     /// @name Attributes of the account and of its services. Setting a null value removes the key. A URL is kept as its
-    /// absolute text; a value that a property list cannot hold is refused with one line in the log
+    /// absolute text; a value that a property list cannot hold is refused with one line in the log. A null key names
+    /// nothing, and a null service the account itself; empty ones are names like any other
     /// @{
     [[nodiscard]] QVariantMap providerAttributes() const;
     void setProviderAttributes(const QVariantMap &attributes);
@@ -190,7 +191,7 @@ public:
     [[nodiscard]] static QVariantMap childDictionaryWithSettings(const QVariantMap &settings, const QString &uid,
                                                                  const QString &pluginID);
 
-    /// Stores a child, in place of any child of the same plug-in.
+    /// Stores a child, in place of any child of the same plug-in. A null UID stores nothing.
     void addChildAccountDict(const QVariantMap &child, const QString &accountUID);
 
     /// The child of a plug-in or of a UID; null when there is none.

@@ -125,6 +125,18 @@ TEST_F(KAAccountStoredValuesTest, RemovingWhereNothingWasStoredWritesNothing)
     EXPECT_FALSE(std::filesystem::exists(homePath("config/com.corvane.kavellaccounts.plist")));
 }
 
+TEST_F(KAAccountStoredValuesTest, AnAccountOverNoRecordHasNoEntryNotEvenTheEmptyNames)
+{
+    const QVariantMap foreign{{QStringLiteral(""), QVariantMap{{kKey, 1}}}};
+    KADefaults::shared()->setObject(foreign, kAccounts);
+    const auto account = KAAccount::initWithCSKavellAccount(nullptr);
+    EXPECT_FALSE(account->storedValueForKey(kKey).isValid());
+    account->storeValue(2, kKey);
+    account->removeStoredData();
+    account->mergeStoredData();
+    EXPECT_EQ(accountsInPreferences(), QVariant(foreign));
+}
+
 TEST_F(KAAccountStoredValuesTest, MergingSetsWhatTheAccountHasNoValueFor)
 {
     const auto account = newAccount();

@@ -224,6 +224,22 @@ TEST_F(KAAccountTest, AServicesAttributesAreItsOwn)
     EXPECT_FALSE(account->attributeForKey(kKey, kMailService).isValid());
 }
 
+TEST_F(KAAccountTest, ANullServiceIsTheAccountItselfAndAnEmptyOneIsNot)
+{
+    const auto account = newAccount();
+    account->setAttribute(1, kKey, QString());
+    EXPECT_EQ(account->providerAttributeForKey(kKey), QVariant(1));
+    EXPECT_EQ(account->attributeForKey(kKey, QString()), QVariant(1));
+    EXPECT_FALSE(account->attributeForKey(kKey, QStringLiteral("")).isValid());
+    account->setAttributes({{QStringLiteral("other"), 2}}, QString());
+    EXPECT_EQ(account->providerAttributes(), account->attributesForService(QString()));
+    EXPECT_EQ(account->providerAttributes(), QVariantMap({{QStringLiteral("other"), 2}}));
+    account->removeAttributeForKey(QStringLiteral("other"), QString());
+    account->setAttribute(1, kKey, QString());
+    account->removeAllAttributesForService(QString());
+    EXPECT_TRUE(account->providerAttributes().isEmpty());
+}
+
 TEST_F(KAAccountTest, AServicesAttributesAreReplacedAndRemovedAsAWhole)
 {
     const auto account = newAccount();

@@ -165,6 +165,20 @@ TEST(FixUpSettings, WithoutSslPortAndPathTheUrlIsThePlainHost)
               QUrl("http://ex.example.net:81"));
 }
 
+TEST(FixUpSettings, APortIsItsWholeNumber)
+{
+    const std::pair<QVariant, const char *> rows[] = {
+        {"8443 (TLS)", "http://ex.example.net:8443"},
+        {443.9, "http://ex.example.net:443"},
+        {qulonglong{80}, "http://ex.example.net:80"},
+        {"none", "http://ex.example.net:0"},
+    };
+    for (const auto &[port, url] : rows) {
+        const QVariantMap fixed = fixUpSettings({{"serverName", "ex.example.net"}, {"serverPort", port}});
+        EXPECT_EQ(fixed.value("serverURL").toUrl(), QUrl(url)) << url;
+    }
+}
+
 TEST(FixUpSettings, APathIsAppendedAsItStands)
 {
     EXPECT_EQ(fixUpSettings({{"serverName", "ex.example.net"}, {"serverRootPath", "EWS"}}).value("serverURL").toUrl(),
