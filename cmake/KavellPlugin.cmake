@@ -7,6 +7,10 @@
 # kavell_compile_strings(SOURCE.ts RESULT.qm): a string table whose texts are looked up by their ids.
 function(kavell_compile_strings source result)
     get_filename_component(source "${source}" ABSOLUTE)
+    # Asked for here: a project without string tables needs no tool for them.
+    if(NOT TARGET Qt6::lrelease)
+        find_package(Qt6 REQUIRED COMPONENTS LinguistTools)
+    endif()
     add_custom_command(OUTPUT "${result}" DEPENDS "${source}" VERBATIM
                        COMMAND Qt6::lrelease -silent -idbased "${source}" -qm "${result}")
 endfunction()

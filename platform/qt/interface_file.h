@@ -46,8 +46,8 @@ public:
         return view;
     }
 
-    /// Points an outlet at the widget of an object name; leaves it when there is none. False, with a line in the log, when
-    /// the widget is of another class.
+    /// Points an outlet at the widget of an object name; leaves it when there is none. False, with a line in the log,
+    /// when the widget is of another class.
     template <typename View> bool connectOutlet(QPointer<View> &outlet, const QString &name)
     {
         QWidget *const widget = widgetNamed(name);

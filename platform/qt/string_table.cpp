@@ -12,8 +12,8 @@ namespace kavell {
 
 namespace {
 
-/// For each of the user's languages "de_AT" and other long names, then "de"; and English, which every bundle should have,
-/// at the end.
+/// For each of the user's languages "de_AT" and other long names, then "de"; and English, which every bundle should
+/// have, at the end.
 QStringList languages()
 {
     QStringList names;

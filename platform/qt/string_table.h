@@ -1,8 +1,8 @@
 // SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
-// The texts of a bundle in the user's language, by key: compiled catalogues NAME_LANGUAGE.qm with ids, one per language,
-// in one directory. Used by KABundle. Any thread may look texts up; the files are read on the first look-up.
+// The texts of a bundle in the user's language, by key: compiled catalogues NAME_LANGUAGE.qm with ids, one per
+// language, in one directory. Used by KABundle. Any thread may look texts up; the files are read on the first look-up.
 
 #ifndef KAVELL_PLATFORM_QT_STRING_TABLE_H
 #define KAVELL_PLATFORM_QT_STRING_TABLE_H

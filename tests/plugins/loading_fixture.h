@@ -1,8 +1,8 @@
 // SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
-// A fresh plug-in manager for each test of searching and loading, and directories of its own, named by the real variable,
-// which hold links to the bundles that the build makes or bundles that the test describes itself.
+// A fresh plug-in manager for each test of searching and loading, and directories of its own, named by the real
+// variable, which hold links to the bundles that the build makes or bundles that the test describes itself.
 
 #ifndef KAVELL_TESTS_PLUGINS_LOADING_FIXTURE_H
 #define KAVELL_TESTS_PLUGINS_LOADING_FIXTURE_H
