@@ -448,6 +448,31 @@ TEST_F(PreferencesTest, WithoutAConfigurationDirectoryTheHomesIsUsed)
     setenv("XDG_CONFIG_HOME", directory.c_str(), 1);
 }
 
+TEST_F(PreferencesTest, WhatIsSetWhileAnotherThreadSynchronizesStaysAndIsWrittenTheNextTime)
+{
+    Preferences preferences(domain);
+    std::atomic<bool> done = false;
+    std::atomic<int> failures = 0;
+    std::thread writer([&] {
+        for (int round = 0; round < 100; ++round) {
+            preferences.setObject(round, kTwo);
+            failures += preferences.synchronize() ? 0 : 1;
+        }
+        done = true;
+    });
+    int number = 0, lost = 0;
+    while (!done) {
+        preferences.setObject(++number, kOne);
+        lost += preferences.objectForKey(kOne).toInt() == number ? 0 : 1;
+    }
+    writer.join();
+    EXPECT_EQ(failures, 0);
+    EXPECT_EQ(lost, 0);
+    ASSERT_TRUE(preferences.synchronize());
+    EXPECT_EQ(onDisk(kOne), QVariant(number));
+    EXPECT_EQ(onDisk(kTwo), QVariant(99));
+}
+
 TEST_F(PreferencesTest, ThreadsMayReadWriteAndSynchronizeAtOnce)
 {
     Preferences preferences(domain);
