@@ -4,10 +4,15 @@
 #include <kavellaccounts/KAAListPlugin.h>
 
 #include <gtest/gtest.h>
+
+#include <QtCore/QTemporaryDir>
+
 #include <kavellaccounts/KAApplication.h>
 #include <kavellaccounts/KABundle.h>
 #include <kavellaccounts/KAConstants.h>
 #include <kavellaccounts/KARequiredMethodException.h>
+
+#include "tests/support/process.h"
 
 namespace {
 
@@ -87,6 +92,39 @@ TEST(KAAListPlugin, ServiceNameIsItsOwnElseBrandAndTheLibrarysElseTheLibrarys)
     EXPECT_EQ(withoutBrand.serviceDisplayNameForService(kKAServiceExchangeContacts), "Contacts");
 }
 
+TEST(KAAListPlugin, EachServiceHasTheNameOfItsKind)
+{
+    const std::pair<QString, QString> rows[] = {
+        {kKAServiceIMAP, "Service Mail"},
+        {kKAServicePOP, "Service Mail"},
+        {kKAServiceExchangeMail, "Service Mail"},
+        {kKAServiceCalDAV, "Service Days"},
+        {kKAServiceExchangeCalendar, "Service Days"},
+        {kKAServiceIM, "Service Talk"},
+        {kKAServiceCardDAV, "Service People"},
+        {kKAServiceCustomContacts, "Service People"},
+        {kKAServiceExchangeContacts, "Service People"},
+    };
+    const OpenPlugin plugin(bundleNamed("Worded/Worded.kaplugin"));
+    for (const auto &[service, name] : rows)
+        EXPECT_EQ(plugin.serviceDisplayNameForService(service), name);
+}
+
+TEST(KAAListPlugin, EachApplicationsDataHasItsOwnName)
+{
+    const std::pair<QString, QString> rows[] = {
+        {"com.corvane.mail", "Our Mail"},
+        {"com.corvane.Tidewell", "Our Days"},
+        {"com.corvane.Parlex", "Our Talk"},
+        {"com.corvane.Cardell", "Our People"},
+    };
+    const OpenPlugin plugin(bundleNamed("Worded/Worded.kaplugin"));
+    for (const auto &[identifier, name] : rows)
+        EXPECT_EQ(plugin.displayNameForApplication(KAApplication::initWithBundleID(identifier)), name);
+    EXPECT_TRUE(plugin.displayNameForApplication(KAApplication::initWithBundleID("com.corvane.Luminel")).isNull());
+    EXPECT_EQ(plugin.autodiscoverDomain(), "discover.example");
+}
+
 TEST(KAAListPlugin, ServicesOutsideTheNineHaveNoName)
 {
     const OpenPlugin plugin(bundleNamed("good/ExampleList.kaplugin"));
@@ -121,6 +159,26 @@ TEST(KAAListPlugin, WithoutADomainsFileServesNone)
     EXPECT_FALSE(plugin.supportsDomain("example.net"));
 }
 
+TEST(KAAListPlugin, DomainsFileIsLookedForUntilThereIsOneAndReadOnce)
+{
+    const QTemporaryDir scratch;
+    const auto write = [&](const char *name, const std::string &entries) {
+        kavell::test::writeFile(scratch.filePath(name).toStdString(),
+                                "<plist version=\"1.0\"><dict>" + entries + "</dict></plist>");
+    };
+    const auto domain = [](const std::string &label) {
+        return "<key>domains</key><array><string>" + label + "</string></array>";
+    };
+    write("Contents/Info.plist", "<key>KABundleIdentifier</key><string>org.example</string>");
+    OpenPlugin plugin(KABundle::bundleWithPath(scratch.path()));
+    EXPECT_FALSE(plugin.supportsDomain("one.test"));
+    write("Contents/Resources/domains.plist", domain("one"));
+    EXPECT_TRUE(plugin.supportsDomain("one.test"));
+    write("Contents/Resources/domains.plist", domain("two"));
+    EXPECT_TRUE(plugin.supportsDomain("one.test"));
+    EXPECT_FALSE(plugin.supportsDomain("two.test"));
+}
+
 TEST(KAAListPlugin, FollowsASubclassThatChangesItsDomains)
 {
     struct Changing : KAAListPlugin {
@@ -137,6 +195,7 @@ TEST(KAAListPlugin, FollowsASubclassThatChangesItsDomains)
 TEST(KAAListPlugin, ProviderNameIsLocalizedElsePlainElseTheIdentifier)
 {
     EXPECT_EQ(OpenPlugin(bundleNamed("good/ExampleList.kaplugin")).userVisibleProviderName(), "Zorbo Online");
+    EXPECT_EQ(OpenPlugin(bundleNamed("Worded/Worded.kaplugin")).userVisibleProviderName(), "Plain Name");
     EXPECT_EQ(OpenPlugin(bundleNamed("Working/Working.kaplugin")).userVisibleProviderName(),
               "com.corvane.Working.kaplugin");
 }

@@ -4,8 +4,11 @@
 #include <kavellaccounts/KADataPlugin.h>
 
 #include <gtest/gtest.h>
+#include <kavellaccounts/KAAccount.h>
 #include <kavellaccounts/KAAccountSetupInput.h>
 #include <kavellaccounts/KAAccountSetupResult.h>
+#include <kavellaccounts/KABundle.h>
+#include <kavellaccounts/KAProvider.h>
 #include <kavellaccounts/KARequiredMethodException.h>
 
 namespace {
@@ -13,11 +16,14 @@ namespace {
 class OpenPlugin : public KADataPlugin {
 public:
     using KADataPlugin::accountSetupDidFail;
+    using KADataPlugin::accountSetupDidFinish;
     using KADataPlugin::accountSetupUpdate;
+    using KADataPlugin::didChangeAccountUID;
     using KADataPlugin::didCreateAccountUID;
     using KADataPlugin::didDeleteAccountUID;
     using KADataPlugin::handleCertificateError;
     using KADataPlugin::KADataPlugin;
+    using KADataPlugin::nbsAccountMigrationFinished;
 };
 
 class Delegate : public QObject {
@@ -45,6 +51,58 @@ public:
     QStringList created;
     QVariant lastStatus;
     qint64 failureCode = 0;
+};
+
+/// Notes all eight messages.
+class FullDelegate : public QObject {
+    Q_OBJECT
+
+public:
+    Q_INVOKABLE void pluginAccountSetupUpdate(KADataPlugin *plugin, const std::shared_ptr<KAAccountSetupInput> &input,
+                                              const QVariant &status)
+    {
+        note(plugin, "update " + status.toString());
+        lastInput = input;
+    }
+    Q_INVOKABLE void pluginAccountSetupDidFinish(KADataPlugin *plugin,
+                                                 const std::shared_ptr<KAAccountSetupInput> &input,
+                                                 const std::shared_ptr<KAAccountSetupResult> &result)
+    {
+        note(plugin, "finish");
+        lastInput = input;
+        lastResult = result;
+    }
+    Q_INVOKABLE void pluginAccountSetupDidFail(KADataPlugin *plugin, const std::shared_ptr<KAAccountSetupInput> &input,
+                                               const KAError &error)
+    {
+        note(plugin, "fail " + error.domain());
+        lastInput = input;
+    }
+    Q_INVOKABLE void pluginHandleCertificateError(KADataPlugin *plugin, const KAError &error)
+    {
+        note(plugin, "certificate " + error.domain());
+    }
+
+public Q_SLOTS:
+    void pluginDidCreateAccountUID(KADataPlugin *plugin, const QString &uid) { note(plugin, "create " + uid); }
+    void pluginDidChangeAccountUID(KADataPlugin *plugin, const QString &uid) { note(plugin, "change " + uid); }
+    void pluginDidDeleteAccountUID(KADataPlugin *plugin, const QString &uid) { note(plugin, "delete " + uid); }
+    void pluginNbsAccountMigrationFinished(KADataPlugin *plugin, const std::shared_ptr<KAAccount> &account)
+    {
+        note(plugin, "migrated " + account->loginName());
+    }
+
+public:
+    void note(KADataPlugin *plugin, const QString &message)
+    {
+        messages += message;
+        lastSender = plugin;
+    }
+
+    QStringList messages;
+    KADataPlugin *lastSender = nullptr;
+    std::shared_ptr<KAAccountSetupInput> lastInput;
+    std::shared_ptr<KAAccountSetupResult> lastResult;
 };
 
 template <typename Call> QString reasonOf(Call &&call)
@@ -111,6 +169,82 @@ TEST(KADataPlugin, AnswerToACertificateErrorComesBack)
     Delegate delegate;
     plugin.setDelegate(&delegate);
     EXPECT_TRUE(plugin.handleCertificateError({}));
+}
+
+TEST(KADataPlugin, EachMessageReachesTheDelegateWithWhatItIsAbout)
+{
+    OpenPlugin plugin(nullptr);
+    FullDelegate delegate;
+    plugin.setDelegate(&delegate);
+    const auto input = std::make_shared<KAAccountSetupInput>();
+    const auto result = std::make_shared<KAAccountSetupResult>();
+    plugin.accountSetupUpdate(input, "looking");
+    EXPECT_EQ(delegate.lastInput, input);
+    plugin.accountSetupDidFinish(input, result);
+    EXPECT_EQ(delegate.lastResult, result);
+    plugin.accountSetupDidFail(nullptr, KAError("failed", 1));
+    EXPECT_FALSE(delegate.lastInput);
+    EXPECT_FALSE(plugin.handleCertificateError(KAError("untrusted", 2)));  // this delegate answers nothing
+    plugin.didCreateAccountUID("a");
+    plugin.didChangeAccountUID("b");
+    plugin.didDeleteAccountUID("c");
+    plugin.nbsAccountMigrationFinished(KAAccount::initWithProviderType("com.corvane.account.mail", "anna"));
+    EXPECT_EQ(delegate.messages, (QStringList{"update looking", "finish", "fail failed", "certificate untrusted",
+                                              "create a", "change b", "delete c", "migrated anna"}));
+    EXPECT_EQ(delegate.lastSender, &plugin);
+}
+
+TEST(KADataPlugin, ClearedDelegateIsSentNothing)
+{
+    OpenPlugin plugin(nullptr);
+    FullDelegate delegate;
+    plugin.setDelegate(&delegate);
+    EXPECT_EQ(plugin.delegate(), &delegate);
+    plugin.setDelegate(nullptr);
+    plugin.didCreateAccountUID("a");
+    EXPECT_EQ(plugin.delegate(), nullptr);
+    EXPECT_TRUE(delegate.messages.isEmpty());
+}
+
+TEST(KADataPlugin, ImageOfAnAccountIsThatOfItsUid)
+{
+    struct Pictured : KADataPlugin {
+        using KADataPlugin::KADataPlugin;
+        QImage imageForAccountUID(const QString &uid) override
+        {
+            asked += uid;
+            return QImage(3, 5, QImage::Format_RGB32);
+        }
+        QStringList asked;
+    } plugin(nullptr);
+    const auto account = KAAccount::initWithProviderType("com.corvane.account.mail", "anna");
+    EXPECT_EQ(plugin.imageForAccount(account).size(), QSize(3, 5));
+    EXPECT_EQ(plugin.asked, QStringList{account->uid()});
+}
+
+TEST(KAPlugin, AccountOfAnyOtherPluginHasAGenericIcon)
+{
+    KAPlugin plugin(nullptr);
+    EXPECT_FALSE(plugin.imageForAccount(nullptr).isNull());
+}
+
+TEST(KAPlugin, KeepsBundleAccountAndProvider)
+{
+    KAPlugin plugin(nullptr);
+    EXPECT_TRUE(plugin.identifier().isNull());
+    EXPECT_TRUE(plugin.userVisibleProviderName().isNull());
+    const auto bundle = KABundle::bundleWithPath(KAVELL_TEST_BUNDLES "/Working/Working.kaplugin");
+    const auto account = KAAccount::initWithProviderType("com.corvane.account.mail", "anna");
+    const auto provider = KAProvider::initWithProviderType("com.corvane.account.mail");
+    plugin.setBundle(bundle);
+    plugin.setAccount(account);
+    plugin.setProvider(provider);
+    EXPECT_EQ(plugin.bundle(), bundle);
+    EXPECT_EQ(plugin.account(), account);
+    EXPECT_EQ(plugin.provider(), provider);
+    EXPECT_EQ(plugin.identifier(), "com.corvane.Working.kaplugin");
+    plugin.setProvider(nullptr);
+    EXPECT_FALSE(plugin.provider());
 }
 
 }  // namespace
