@@ -21,6 +21,7 @@
 #include <thread>
 #include <vector>
 
+#include <QtCore/QDateTime>
 #include <QtCore/QRect>
 #include <QtCore/QStringList>
 #include <QtCore/QUrl>
@@ -121,10 +122,14 @@ TEST_F(PreferencesTest, EveryTypeComesBackFromTheFile)
 {
     Preferences preferences(domain);
     const QVariantMap value{{QStringLiteral("text"), QStringLiteral("a<b>&\u00eb")},
+                            {QStringLiteral("blanks"), QStringLiteral(" a\r\nb\rc\t\n ")},
+                            {QStringLiteral("empty"), QStringLiteral("")},
+                            {QStringLiteral(" & \n"), QStringLiteral("key")},
                             {QStringLiteral("integer"), -3},
                             {QStringLiteral("real"), 0.25},
                             {QStringLiteral("boolean"), true},
                             {QStringLiteral("data"), QByteArray("\0\xFF", 2)},
+                            {QStringLiteral("date"), QDateTime::fromSecsSinceEpoch(1770087906, Qt::UTC)},
                             {QStringLiteral("list"), QVariantList{1, QStringLiteral("x")}}};
     preferences.setObject(value, kOne);
     ASSERT_TRUE(preferences.synchronize());
