@@ -10,6 +10,7 @@
 
 #include <concepts>
 #include <optional>
+#include <type_traits>
 
 #include <QtCore/QMap>
 #include <QtCore/QString>
@@ -17,6 +18,7 @@
 #include <QtCore/QVariantList>
 #include <QtCore/QVariantMap>
 
+#include <kavellaccounts/KADescription.h>
 #include <kavellaccounts/KAExport.h>
 #include <kavellaccounts/KAObject.h>
 
@@ -104,26 +106,32 @@ KAVELL_ACCOUNTS_EXPORT void removeDictionaryWithKey(QVariantList &list, const QS
 /// The value's description; of a dictionary with an entry "password", with "***" in its place (top level only).
 [[nodiscard]] KAVELL_ACCOUNTS_EXPORT QString descriptionNoPasswords(const QVariant &value);
 
+template <typename Object>
+concept Describable = std::derived_from<Object, KAObject> || std::derived_from<Object, QObject>;
+
+/// The root class that an object is described as.
+template <Describable Object> using RootOf = std::conditional_t<std::derived_from<Object, KAObject>, KAObject, QObject>;
+
+/// The object's own description: what it masks, its class decides.
+template <Describable Object> [[nodiscard]] QString descriptionNoPasswords(const Object *object)
+{
+    return KADescription(static_cast<const RootOf<Object> *>(object));
+}
+
 /// One line for each field of the object, "\tNAME <ENCODING, POINTER>: VALUE\n", its own class first and then each base
 /// class (KAFieldList.h). Without passwords, the value of a field named "password" or "_password" is "***". Null for a
 /// null object. Of a toolkit object that is no KAObject, its declared properties.
 [[nodiscard]] KAVELL_ACCOUNTS_EXPORT QString _ivarDumpCoreShowingPasswords(const KAObject *object, bool showPasswords);
 [[nodiscard]] KAVELL_ACCOUNTS_EXPORT QString _ivarDumpCoreShowingPasswords(const QObject *object, bool showPasswords);
 
-template <typename Object>
-    requires std::derived_from<Object, KAObject> || std::derived_from<Object, QObject>
-[[nodiscard]] QString _ivarDump(const Object *object)
+template <Describable Object> [[nodiscard]] QString _ivarDump(const Object *object)
 {
-    using Root = std::conditional_t<std::derived_from<Object, KAObject>, KAObject, QObject>;
-    return _ivarDumpCoreShowingPasswords(static_cast<const Root *>(object), true);
+    return _ivarDumpCoreShowingPasswords(static_cast<const RootOf<Object> *>(object), true);
 }
 
-template <typename Object>
-    requires std::derived_from<Object, KAObject> || std::derived_from<Object, QObject>
-[[nodiscard]] QString _ivarDumpNoPasswords(const Object *object)
+template <Describable Object> [[nodiscard]] QString _ivarDumpNoPasswords(const Object *object)
 {
-    using Root = std::conditional_t<std::derived_from<Object, KAObject>, KAObject, QObject>;
-    return _ivarDumpCoreShowingPasswords(static_cast<const Root *>(object), false);
+    return _ivarDumpCoreShowingPasswords(static_cast<const RootOf<Object> *>(object), false);
 }
 /// @}
 

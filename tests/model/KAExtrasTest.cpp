@@ -225,6 +225,15 @@ TEST(KAExtras, ADescriptionMasksThePasswordOfTheTopLevelOnly)
     EXPECT_EQ(descriptionNoPasswords({}), "(null)");
 }
 
+TEST(KAExtras, AnObjectDescribesItself)
+{
+    const Example example;
+    EXPECT_EQ(descriptionNoPasswords(&example), example.description());
+    QTimer timer;
+    EXPECT_TRUE(descriptionNoPasswords(&timer).startsWith("<QTimer: 0x"));
+    EXPECT_EQ(descriptionNoPasswords(static_cast<const Example *>(nullptr)), "(null)");
+}
+
 TEST(KAExtras, ADumpHasALineForEachFieldInItsOrder)
 {
     const Example example;
