@@ -8,17 +8,22 @@
 
 #include <QtCore/QCryptographicHash>
 #include <QtCore/QHash>
-#include <QtCore/QSet>
+#include <QtCore/QObject>
 #include <QtNetwork/QNetworkAccessManager>
 #include <QtNetwork/QNetworkReply>
 #include <QtNetwork/QSslSocket>
 
+#include "ui/acceptance_news.h"
+
 namespace {
+
+/// The property that marks a manager that is watched already.
+constexpr char kWatched[] = "_kavellWatchedForAcceptedCertificates";
 
 struct Acceptances {
     std::mutex mutex;
     QHash<QString, QByteArray> chains;  ///< by lower-case host
-    QSet<QNetworkAccessManager *> managers;
+    kavell::AcceptanceNews news;
 };
 
 Acceptances &acceptances()
@@ -53,12 +58,12 @@ void KAAcceptedCertificates::accept(const QString &host, const QList<QSslCertifi
     if (!isComplete(host, chain))
         return;
     Acceptances &all = acceptances();
-    const std::lock_guard lock(all.mutex);
-    all.chains.insert(host.toLower(), fingerprint(chain));
-    // A kept connection would go on with what was agreed to before.
-    for (QNetworkAccessManager *manager : std::as_const(all.managers))
-        QMetaObject::invokeMethod(
-            manager, [manager] { manager->clearConnectionCache(); }, Qt::QueuedConnection);
+    {
+        const std::lock_guard lock(all.mutex);
+        all.chains.insert(host.toLower(), fingerprint(chain));
+    }
+    // Not under the lock: the toolkit takes locks of its own to reach another thread's objects.
+    emit all.news.changed();
 }
 
 bool KAAcceptedCertificates::isAccepted(const QString &host, const QList<QSslCertificate> &chain)
@@ -73,17 +78,12 @@ bool KAAcceptedCertificates::isAccepted(const QString &host, const QList<QSslCer
 
 void KAAcceptedCertificates::watch(QNetworkAccessManager *manager)
 {
-    Acceptances &all = acceptances();
-    {
-        const std::lock_guard lock(all.mutex);
-        if (all.managers.contains(manager))
-            return;
-        all.managers.insert(manager);
-    }
-    QObject::connect(manager, &QObject::destroyed, [manager] {
-        const std::lock_guard lock(acceptances().mutex);
-        acceptances().managers.remove(manager);
-    });
+    if (manager->property(kWatched).toBool())
+        return;
+    manager->setProperty(kWatched, true);
+    // A kept connection would go on with what was agreed to before.
+    QObject::connect(&acceptances().news, &kavell::AcceptanceNews::changed, manager,
+                     &QNetworkAccessManager::clearConnectionCache, Qt::QueuedConnection);
     QObject::connect(manager, &QNetworkAccessManager::sslErrors, manager,
                      [](QNetworkReply *reply, const QList<QSslError> &errors) {
                          if (isAccepted(reply->url().host(), reply->sslConfiguration().peerCertificateChain()))

@@ -89,8 +89,8 @@ bool KAShowCertificatePanelForError(const KAError &error, const QString &title)
     const QString host = url.host();
     if (host.isEmpty())
         return refused(QStringLiteral("*** SSL policy creation failed: the URL names no host."));
-    if (std::all_of(chain.begin(), chain.end(), [](const auto &certificate) { return certificate.isNull(); }))
-        return refused(QStringLiteral("*** Trust creation failed: the chain holds no certificate."));
+    if (std::any_of(chain.begin(), chain.end(), [](const auto &certificate) { return certificate.isNull(); }))
+        return refused(QStringLiteral("*** Trust creation failed: the chain holds what is no certificate."));
     if (!qobject_cast<QApplication *>(QCoreApplication::instance()))
         return refused(QStringLiteral("*** Certificate panel not shown: the program has no user interface."));
 

@@ -3,14 +3,21 @@
 
 #include "ui/certificate_panel.h"
 
+#include <algorithm>
+#include <utility>
+
 #include <QtCore/QCryptographicHash>
 #include <QtCore/QLocale>
+#include <QtCore/QtMath>
+#include <QtGui/QTextCursor>
+#include <QtGui/QTextDocument>
 #include <QtGui/QTextOption>
+#include <QtGui/QTextTable>
 #include <QtWidgets/QDialogButtonBox>
 #include <QtWidgets/QHeaderView>
 #include <QtWidgets/QLabel>
-#include <QtWidgets/QPlainTextEdit>
 #include <QtWidgets/QPushButton>
+#include <QtWidgets/QTextEdit>
 #include <QtWidgets/QTreeWidget>
 #include <QtWidgets/QVBoxLayout>
 #include <QtWidgets/QWhatsThis>
@@ -19,9 +26,13 @@ namespace kavell {
 
 namespace {
 
-constexpr int kPanelWidth = 520;
-constexpr int kVisibleCertificates = 4;
-constexpr int kVisibleDetails = 8;
+constexpr int kPanelWidth = 560;
+constexpr int kMargin = 16;
+constexpr int kSpacing = 10;
+constexpr int kCellPadding = 2;
+constexpr float kDimmedOpacity = 0.65F;
+constexpr qsizetype kVisibleCertificates = 5;
+constexpr int kVisibleDetailLines = 14;
 
 QLabel *wrappedLabel(const QString &text)
 {
@@ -37,6 +48,45 @@ QString titleOf(const QSslCertificate &certificate)
     return name.isEmpty() ? QString::fromLatin1(certificate.serialNumber()) : name;
 }
 
+using DetailRow = std::pair<QString, QString>;
+
+/// As high as it must be, instead of the toolkit's fixed guess.
+class DetailsView : public QTextEdit {
+public:
+    [[nodiscard]] QSize sizeHint() const override { return {QTextEdit::sizeHint().width(), minimumHeight()}; }
+};
+
+/// Labels in one column, values in the other, beginning at the language's side; a row without a value is left out.
+void fillTable(QTextEdit *edit, QList<DetailRow> rows)
+{
+    rows.removeIf([](const DetailRow &row) { return row.second.isEmpty(); });
+    int widest = 0;
+    for (const auto &[label, value] : std::as_const(rows))
+        widest = std::max(widest, edit->fontMetrics().horizontalAdvance(label));
+    QTextTableFormat format;
+    format.setBorder(0);
+    format.setCellSpacing(0);
+    format.setCellPadding(kCellPadding);
+    const int labelColumn = edit->isRightToLeft() ? 1 : 0;
+    QList<QTextLength> widths(2);
+    widths[labelColumn] = QTextLength(QTextLength::FixedLength, widest + kSpacing);
+    format.setColumnWidthConstraints(widths);
+    QTextTable *table = edit->textCursor().insertTable(static_cast<int>(rows.size()), 2, format);
+    QTextCharFormat dimmed;
+    QColor colour = edit->palette().color(QPalette::Text);
+    colour.setAlphaF(kDimmedOpacity);
+    dimmed.setForeground(colour);
+    for (int row = 0; row < table->rows(); ++row) {
+        table->cellAt(row, labelColumn).firstCursorPosition().insertText(rows[row].first, dimmed);
+        const QString &value = rows[row].second;
+        QTextBlockFormat direction;
+        direction.setLayoutDirection(value.isRightToLeft() ? Qt::RightToLeft : Qt::LeftToRight);
+        QTextCursor cursor = table->cellAt(row, 1 - labelColumn).firstCursorPosition();
+        cursor.mergeBlockFormat(direction);
+        cursor.insertText(value);
+    }
+}
+
 }  // namespace
 
 CertificatePanel::CertificatePanel(const CertificatePanelTexts &texts, const QList<QSslCertificate> &chain)
@@ -44,11 +94,15 @@ CertificatePanel::CertificatePanel(const CertificatePanelTexts &texts, const QLi
 {
     setWindowTitle(texts.message);
     setModal(true);
-    new QVBoxLayout(this);
+    auto *column = new QVBoxLayout(this);
+    column->setContentsMargins(kMargin, kMargin, kMargin, kMargin);
+    column->setSpacing(kSpacing);
     addMessages();
     addChain();
+    addDetails();
     addButtons();
-    resize(kPanelWidth, sizeHint().height());
+    // The texts wrap: how high they are follows from the width.
+    resize(kPanelWidth, column->hasHeightForWidth() ? column->totalHeightForWidth(kPanelWidth) : sizeHint().height());
 }
 
 CertificatePanel::~CertificatePanel() = default;
@@ -70,19 +124,12 @@ void CertificatePanel::addMessages()
 void CertificatePanel::addChain()
 {
     m_tree = new QTreeWidget;
+    m_tree->setObjectName("chain");
     m_tree->setAccessibleName(m_texts.chainName);
     m_tree->setHeaderHidden(true);
+    m_tree->setRootIsDecorated(m_chain.size() > 1);
+    m_tree->setUniformRowHeights(true);
     m_tree->setTextElideMode(Qt::ElideMiddle);
-    m_details = new QPlainTextEdit;
-    m_details->setReadOnly(true);
-    m_details->setWordWrapMode(QTextOption::WrapAtWordBoundaryOrAnywhere);
-    m_details->setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
-    m_details->setTabChangesFocus(true);
-    m_details->setAccessibleName(m_texts.detailsName);
-
-    const int line = fontMetrics().lineSpacing();
-    m_tree->setFixedHeight(line * kVisibleCertificates + 2 * line);
-    m_details->setMinimumHeight(line * kVisibleDetails);
     // The server's own certificate comes first; each further one vouches for the one before it and stands above it.
     QTreeWidgetItem *parent = m_tree->invisibleRootItem();
     for (qsizetype index = m_chain.size(); index-- > 0;) {
@@ -91,12 +138,41 @@ void CertificatePanel::addChain()
         parent = item;
     }
     m_tree->expandAll();
+    const auto rows = static_cast<int>(std::min(m_chain.size(), kVisibleCertificates));
+    m_tree->setFixedHeight(rows * m_tree->sizeHintForRow(0) + 2 * m_tree->frameWidth());
     connect(m_tree, &QTreeWidget::currentItemChanged, this, [this](const QTreeWidgetItem *item) {
-        if (item)
+        if (item && m_details)
             showDetails(m_chain[item->data(0, Qt::UserRole).toLongLong()]);
     });
     m_tree->setCurrentItem(parent);
     layout()->addWidget(m_tree);
+}
+
+void CertificatePanel::addDetails()
+{
+    m_details = new DetailsView;
+    m_details->setObjectName("details");
+    m_details->setReadOnly(true);
+    m_details->setTextInteractionFlags(Qt::TextSelectableByMouse | Qt::TextSelectableByKeyboard);
+    // All start at the language's side, while each value runs as its own letters do, so that no fingerprint is turned
+    // round.
+    QTextOption option(Qt::AlignAbsolute | (isRightToLeft() ? Qt::AlignRight : Qt::AlignLeft));
+    option.setWrapMode(QTextOption::WrapAtWordBoundaryOrAnywhere);
+    m_details->document()->setDefaultTextOption(option);
+    m_details->setHorizontalScrollBarPolicy(Qt::ScrollBarAlwaysOff);
+    m_details->setTabChangesFocus(true);
+    m_details->setAccessibleName(m_texts.detailsName);
+    // As high as the longest of the details, so that nothing moves from one certificate to the next.
+    const int frame = 2 * m_details->frameWidth();
+    qreal height = 0;
+    for (const QSslCertificate &certificate : m_chain) {
+        showDetails(certificate);
+        m_details->document()->setTextWidth(kPanelWidth - 2 * kMargin - frame);
+        height = std::max(height, m_details->document()->size().height());
+    }
+    showDetails(m_chain.first());
+    const qreal most = m_details->fontMetrics().lineSpacing() * kVisibleDetailLines;
+    m_details->setMinimumHeight(qCeil(std::min(height, most)) + frame);
     layout()->addWidget(m_details);
 }
 
@@ -109,6 +185,7 @@ void CertificatePanel::addButtons()
     go->setObjectName("continue");
     cancel->setObjectName("cancel");
     help->setObjectName("help");
+    help->setAccessibleDescription(m_texts.help);  // the bubble is out of a screen reader's reach
     go->setDefault(true);
     cancel->setAutoDefault(false);
     help->setAutoDefault(false);
@@ -123,10 +200,10 @@ void CertificatePanel::showDetails(const QSslCertificate &certificate)
 {
     const QLocale locale;
     const auto date = [&](const QDateTime &time) {
-        return locale.toString(time, QLocale::LongFormat);
+        return locale.toString(time.toLocalTime(), QLocale::LongFormat);
     };
     const QString digest = QString::fromLatin1(certificate.digest(QCryptographicHash::Sha256).toHex(':')).toUpper();
-    const std::pair<QString, QString> rows[] = {
+    const QList<DetailRow> rows = {
         {m_texts.subject, certificate.subjectDisplayName()},
         {m_texts.issuer, certificate.issuerDisplayName()},
         {m_texts.validFrom, date(certificate.effectiveDate())},
@@ -134,11 +211,9 @@ void CertificatePanel::showDetails(const QSslCertificate &certificate)
         {m_texts.names, certificate.subjectAlternativeNames().values().join(QLatin1String(", "))},
         {m_texts.fingerprint, digest},
     };
-    QStringList lines;
-    for (const auto &[label, value] : rows)
-        if (!value.isEmpty())
-            lines.append(label + QLatin1Char(' ') + value);
-    m_details->setPlainText(lines.join(QLatin1Char('\n')));
+    m_details->clear();
+    fillTable(m_details, rows);
+    m_details->moveCursor(QTextCursor::Start);
 }
 
 }  // namespace kavell

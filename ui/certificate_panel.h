@@ -11,7 +11,7 @@
 #include <QtNetwork/QSslCertificate>
 #include <QtWidgets/QDialog>
 
-class QPlainTextEdit;
+class QTextEdit;
 class QTreeWidget;
 
 namespace kavell {
@@ -38,12 +38,13 @@ private:
     void addMessages();
     void addChain();
     void addButtons();
+    void addDetails();
     void showDetails(const QSslCertificate &certificate);
 
     const CertificatePanelTexts m_texts;
     const QList<QSslCertificate> m_chain;
     QTreeWidget *m_tree = nullptr;
-    QPlainTextEdit *m_details = nullptr;
+    QTextEdit *m_details = nullptr;
 };
 
 }  // namespace kavell

@@ -5,6 +5,10 @@
 
 #include <kavellaccounts/KACertificatePanel.h>
 
+#include <thread>
+#include <vector>
+
+#include <QtCore/QCoreApplication>
 #include <QtCore/QFile>
 #include <QtCore/QProcess>
 #include <QtCore/QTemporaryDir>
@@ -46,42 +50,59 @@ Identity selfSigned(const QString &host)
     return identity;
 }
 
-/// Answers every request with "hello" behind TLS.
+/// Answers every request with "hello" behind TLS, and hangs up unless it is to keep its connections.
 class TlsServer : public QTcpServer {
 public:
-    explicit TlsServer(Identity identity) : m_identity(std::move(identity)) { listen(QHostAddress::LocalHost); }
+    explicit TlsServer(Identity identity, bool keepsConnections = false)
+        : m_identity(std::move(identity)), m_keepsConnections(keepsConnections)
+    {
+        listen(QHostAddress::LocalHost);
+    }
+
+    [[nodiscard]] int connections() const { return m_connections; }
 
 protected:
     void incomingConnection(qintptr descriptor) override
     {
+        ++m_connections;
         auto *socket = new QSslSocket(this);
         socket->setSocketDescriptor(descriptor);
         socket->setPrivateKey(m_identity.key);
         socket->setLocalCertificate(m_identity.certificate);
-        QObject::connect(socket, &QSslSocket::readyRead, socket, [socket] {
+        QObject::connect(socket, &QSslSocket::readyRead, socket, [socket, keeps = m_keepsConnections] {
             socket->readAll();
-            socket->write("HTTP/1.1 200 OK\r\nContent-Length: 5\r\nConnection: close\r\n\r\nhello");
-            socket->disconnectFromHost();
+            socket->write("HTTP/1.1 200 OK\r\nContent-Length: 5\r\n");
+            socket->write(keeps ? "\r\nhello" : "Connection: close\r\n\r\nhello");
+            if (!keeps)
+                socket->disconnectFromHost();
         });
         socket->startServerEncryption();
     }
 
 private:
     Identity m_identity;
+    bool m_keepsConnections;
+    int m_connections = 0;
 };
 
-/// What a watched manager gets from the server; empty when the connection is refused.
-QByteArray fetched(const TlsServer &server, const QString &host)
+/// What the manager gets from the server; empty when the connection is refused.
+QByteArray fetchedBy(QNetworkAccessManager &manager, const TlsServer &server, const QString &host)
 {
-    QNetworkAccessManager manager;
-    manager.setProxy(QNetworkProxy::NoProxy);
-    KAAcceptedCertificates::watch(&manager);
     QNetworkReply *reply =
         manager.get(QNetworkRequest(QUrl(QStringLiteral("https://%1:%2/").arg(host).arg(server.serverPort()))));
     QSignalSpy finished(reply, &QNetworkReply::finished);
     if (!reply->isFinished())
         finished.wait(5000);
     return reply->readAll();
+}
+
+/// The same, by a watched manager of its own.
+QByteArray fetched(const TlsServer &server, const QString &host)
+{
+    QNetworkAccessManager manager;
+    manager.setProxy(QNetworkProxy::NoProxy);
+    KAAcceptedCertificates::watch(&manager);
+    return fetchedBy(manager, server, host);
 }
 
 // Each test has hosts of its own, as an acceptance lasts as long as the process: names of the loopback network.
@@ -109,6 +130,43 @@ TEST(KAAcceptedCertificatesTest, TheSameChainAtAnotherHostIsRefused)
     KAAcceptedCertificates::accept("127.0.0.1", {identity.certificate});
     EXPECT_EQ(fetched(server, "localhost"), "");
     EXPECT_EQ(fetched(server, "127.0.0.1"), "hello");
+}
+
+TEST(KAAcceptedCertificatesTest, AnAcceptanceEndsTheConnectionsThatAManagerKeeps)
+{
+    const Identity identity = selfSigned("kept.example");
+    const TlsServer server(identity, true);
+    KAAcceptedCertificates::accept("127.0.0.1", {identity.certificate});
+    QNetworkAccessManager manager;
+    manager.setProxy(QNetworkProxy::NoProxy);
+    KAAcceptedCertificates::watch(&manager);
+    KAAcceptedCertificates::watch(&manager);
+    EXPECT_EQ(fetchedBy(manager, server, "127.0.0.1"), "hello");
+    EXPECT_EQ(fetchedBy(manager, server, "127.0.0.1"), "hello");
+    EXPECT_EQ(server.connections(), 1);
+
+    KAAcceptedCertificates::accept("127.0.0.1", {selfSigned("other.example").certificate});
+    QCoreApplication::processEvents();
+    EXPECT_EQ(fetchedBy(manager, server, "127.0.0.1"), "");
+    EXPECT_EQ(server.connections(), 2);
+}
+
+TEST(KAAcceptedCertificatesTest, ManagersComeAndGoWhileOtherThreadsAccept)
+{
+    const QList<QSslCertificate> chain{selfSigned("threads.example").certificate};
+    constexpr int rounds = 200;
+    std::vector<std::thread> threads;
+    for (int number = 0; number < 4; ++number)
+        threads.emplace_back([&chain] {
+            for (int round = 0; round < rounds; ++round) {
+                QNetworkAccessManager manager;
+                KAAcceptedCertificates::watch(&manager);
+                KAAcceptedCertificates::accept("threads.example", chain);
+            }
+        });
+    for (std::thread &thread : threads)
+        thread.join();
+    EXPECT_TRUE(KAAcceptedCertificates::isAccepted("threads.example", chain));
 }
 
 TEST(KAAcceptedCertificatesTest, AWatchedSocketHonoursAcceptance)

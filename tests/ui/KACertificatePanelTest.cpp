@@ -3,10 +3,11 @@
 
 #include <kavellaccounts/KACertificatePanel.h>
 
-#include <cstdlib>
+#include <algorithm>
+#include <functional>
 #include <thread>
 
-#include <QtCore/QFile>
+#include <QtCore/QCryptographicHash>
 #include <QtCore/QProcess>
 #include <QtCore/QTemporaryDir>
 #include <QtCore/QTimer>
@@ -15,6 +16,10 @@
 #include <QtWidgets/QApplication>
 #include <QtWidgets/QLabel>
 #include <QtWidgets/QPushButton>
+#include <QtWidgets/QScrollBar>
+#include <QtWidgets/QTextEdit>
+#include <QtWidgets/QTreeWidget>
+#include <QtWidgets/QWhatsThis>
 
 #include <gtest/gtest.h>
 
@@ -43,22 +48,32 @@ KAError errorFor(const QString &url, const QList<QSslCertificate> &chain, qint64
         {{KAError::failingURLKey, QUrl(url)}, {KAError::peerCertificateChainKey, QVariant::fromValue(chain)}});
 }
 
-/// Presses the panel's button of that name, on its window, once the panel is up, and notes its informative text.
-void pressWhenShown(const QString &button, QString *informative = nullptr)
+/// Does this with the panel once it is up. It must end the panel, or have another thing to come end it.
+void whenShown(const std::function<void(QWidget *)> &act)
 {
-    QTimer::singleShot(0, qApp, [=] {
-        QWidget *panel = QApplication::activeModalWidget();
-        if (!panel) {
-            pressWhenShown(button, informative);
-            return;
-        }
-        if (informative)
-            *informative = panel->findChild<QLabel *>("informative")->text();
-        if (const QByteArray path = qgetenv("KAVELL_PANEL_PICTURE"); !path.isEmpty())
-            panel->grab().save(QString::fromLocal8Bit(path));
-        const auto *target = panel->findChild<QPushButton *>(button);
-        QTest::mouseClick(panel->windowHandle(), Qt::LeftButton, {}, target->mapTo(panel, target->rect().center()));
+    QTimer::singleShot(0, qApp, [act] {
+        if (QWidget *panel = QApplication::activeModalWidget())
+            act(panel);
+        else
+            whenShown(act);
     });
+}
+
+/// On the panel's window, as the user does, and not on the button itself.
+void press(QWidget *panel, const QString &button)
+{
+    const auto *target = panel->findChild<QPushButton *>(button);
+    QTest::mouseClick(panel->windowHandle(), Qt::LeftButton, {}, target->mapTo(panel, target->rect().center()));
+}
+
+void pressWhenShown(const QString &button)
+{
+    whenShown([=](QWidget *panel) { press(panel, button); });
+}
+
+QString textOf(const QWidget *panel, const char *label)
+{
+    return panel->findChild<QLabel *>(label)->text();
 }
 
 TEST(KACertificatePanelTest, AnErrorWithoutAChainIsLoggedAndRefused)
@@ -83,6 +98,22 @@ TEST(KACertificatePanelTest, AChainWithoutCertificatesFailsTheTrust)
     EXPECT_TRUE(log.messages().value(0).startsWith("*** Trust creation failed"));
 }
 
+TEST(KACertificatePanelTest, AChainThatHoldsMoreThanCertificatesFailsTheTrust)
+{
+    const kavell::test::LogCapture log;
+    const QList<QSslCertificate> chain{selfSignedChain().first(), QSslCertificate()};
+    EXPECT_FALSE(KAShowCertificatePanelForError(errorFor("https://mail.example/", chain), "Title"));
+    EXPECT_TRUE(log.messages().value(0).startsWith("*** Trust creation failed"));
+}
+
+TEST(KACertificatePanelTest, AnErrorWithoutAURLIsLoggedAndRefused)
+{
+    const kavell::test::LogCapture log;
+    const KAError error("Other", -1, {{KAError::peerCertificateChainKey, QVariant::fromValue(selfSignedChain())}});
+    EXPECT_FALSE(KAShowCertificatePanelForError(error, "Title"));
+    EXPECT_EQ(log.messages(), QStringList({"*** Error object Error Other -1 in unexpected format."}));
+}
+
 TEST(KACertificatePanelTest, CancellingAcceptsNothing)
 {
     const auto chain = selfSignedChain();
@@ -94,22 +125,135 @@ TEST(KACertificatePanelTest, CancellingAcceptsNothing)
 TEST(KACertificatePanelTest, ContinuingAcceptsTheChainForTheHost)
 {
     const auto chain = selfSignedChain();
-    QString informative;
-    pressWhenShown("continue", &informative);
+    pressWhenShown("continue");
     EXPECT_TRUE(KAShowCertificatePanelForError(errorFor("https://continued.example/", chain), "Title"));
     EXPECT_TRUE(KAAcceptedCertificates::isAccepted("continued.example", chain));
-    EXPECT_TRUE(informative.contains("continued.example"));
+}
+
+TEST(KACertificatePanelTest, ReturnContinuesSinceThatIsTheDefault)
+{
+    whenShown([](QWidget *panel) { QTest::keyClick(panel->windowHandle(), Qt::Key_Return); });
+    EXPECT_TRUE(KAShowCertificatePanelForError(errorFor("https://return.example/", selfSignedChain()), "Title"));
+}
+
+TEST(KACertificatePanelTest, EscapeCancels)
+{
+    const auto chain = selfSignedChain();
+    whenShown([](QWidget *panel) { QTest::keyClick(panel->windowHandle(), Qt::Key_Escape); });
+    EXPECT_FALSE(KAShowCertificatePanelForError(errorFor("https://escape.example/", chain), "Title"));
+    EXPECT_FALSE(KAAcceptedCertificates::isAccepted("escape.example", chain));
+}
+
+TEST(KACertificatePanelTest, HelpIsShownBesideThePanelWhichStays)
+{
+    const auto helpBubbles = [] {
+        const QWidgetList all = QApplication::topLevelWidgets();
+        return std::count_if(all.begin(), all.end(),
+                             [](const QWidget *one) { return one->isVisible() && one->inherits("QWhatsThat"); });
+    };
+    std::ptrdiff_t shown = 0;
+    bool stayed = false;
+    QString description;
+    whenShown([&](QWidget *panel) {
+        press(panel, "help");
+        shown = helpBubbles();
+        stayed = panel->isVisible();
+        description = panel->findChild<QPushButton *>("help")->accessibleDescription();
+        QWhatsThis::hideText();
+        panel->close();
+    });
+    EXPECT_FALSE(KAShowCertificatePanelForError(errorFor("https://help.example/", selfSignedChain()), "Title"));
+    EXPECT_EQ(shown, 1);
+    EXPECT_TRUE(stayed);
+    EXPECT_TRUE(description.startsWith("A certificate tells you whose server this is."));
+}
+
+TEST(KACertificatePanelTest, TheMessageNamesTheCallersTitleAndTheHostOnly)
+{
+    QString message;
+    whenShown([&](QWidget *panel) {
+        message = textOf(panel, "message");
+        panel->close();
+    });
+    EXPECT_FALSE(
+        KAShowCertificatePanelForError(errorFor("https://mail.example:8443/a%20b", selfSignedChain()), "%2 <b>Title"));
+    EXPECT_EQ(message, QString::fromUtf8("%2 <b>Title can’t verify the identity of the server “mail.example”."));
+}
+
+TEST(KACertificatePanelTest, EachCodeHasItsInformativeText)
+{
+    const std::pair<qint64, const char *> beginnings[] = {
+        {-1204, "The certificate of “mail.example” is not valid yet."},
+        {-1203, "The certificate of “mail.example” was signed by an unknown authority."},
+        {-1202, "The certificate of “mail.example” is not trusted."},
+        {-1201, "The certificate of “mail.example” has expired or has a wrong date."},
+    };
+    for (const auto &[code, beginning] : beginnings) {
+        QString informative;
+        bool visible = false;
+        whenShown([&](QWidget *panel) {
+            informative = textOf(panel, "informative");
+            visible = panel->findChild<QLabel *>("informative")->isVisible();
+            panel->close();
+        });
+        static_cast<void>(
+            KAShowCertificatePanelForError(errorFor("https://mail.example/", selfSignedChain(), code), "Title"));
+        EXPECT_TRUE(informative.startsWith(QString::fromUtf8(beginning))) << code << informative.toStdString();
+        EXPECT_TRUE(visible);
+    }
 }
 
 TEST(KACertificatePanelTest, AnUnknownCodeHasNoInformativeText)
 {
     for (const qint64 code : {-1205, -1200, 0}) {
         QString informative = "unset";
-        pressWhenShown("cancel", &informative);
+        whenShown([&](QWidget *panel) {
+            informative = textOf(panel, "informative");
+            panel->close();
+        });
         EXPECT_FALSE(
             KAShowCertificatePanelForError(errorFor("https://mail.example/", selfSignedChain(), code), "Title"));
         EXPECT_EQ(informative, "") << code;
     }
+}
+
+TEST(KACertificatePanelTest, TheDetailsOfTheServersCertificateAreShownWithoutScrolling)
+{
+    const auto chain = selfSignedChain();
+    QString details;
+    bool scrolls = true;
+    whenShown([&](QWidget *panel) {
+        const auto *edit = panel->findChild<QTextEdit *>("details");
+        details = edit->toPlainText();
+        scrolls = edit->verticalScrollBar()->isVisible() ||
+                  panel->findChild<QTreeWidget *>("chain")->verticalScrollBar()->isVisible();
+        panel->close();
+    });
+    EXPECT_FALSE(KAShowCertificatePanelForError(errorFor("https://mail.example/", chain), "Title"));
+    EXPECT_TRUE(details.contains("mail.example"));
+    const QByteArray digest = chain.first().digest(QCryptographicHash::Sha256).toHex(':').toUpper();
+    EXPECT_TRUE(details.contains(QString::fromLatin1(digest)));
+    EXPECT_FALSE(scrolls);
+}
+
+TEST(KACertificatePanelTest, ChoosingAnotherCertificateOfTheChainShowsItsDetails)
+{
+    const auto server = selfSignedChain();
+    const auto issuer = selfSignedChain();
+    QStringList titles;
+    QString details;
+    whenShown([&](QWidget *panel) {
+        auto *tree = panel->findChild<QTreeWidget *>("chain");
+        titles = {tree->topLevelItem(0)->text(0), tree->topLevelItem(0)->child(0)->text(0)};
+        tree->setCurrentItem(tree->topLevelItem(0));
+        details = panel->findChild<QTextEdit *>("details")->toPlainText();
+        panel->close();
+    });
+    EXPECT_FALSE(
+        KAShowCertificatePanelForError(errorFor("https://mail.example/", {server.first(), issuer.first()}), "Title"));
+    EXPECT_EQ(titles, QStringList({"mail.example", "mail.example"}));
+    const QByteArray digest = issuer.first().digest(QCryptographicHash::Sha256).toHex(':').toUpper();
+    EXPECT_TRUE(details.contains(QString::fromLatin1(digest)));
 }
 
 TEST(KACertificatePanelTest, AnotherThreadIsAnsweredFromTheMainThread)
