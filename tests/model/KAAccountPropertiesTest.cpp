@@ -3,14 +3,12 @@
 //
 // Settings dictionaries copied into an account, and the account as one.
 
-#include <cstdint>
-#include <cstdlib>
-#include <new>
-
 #include "tests/model/account_fixture.h"
 #include "tests/support/log_capture.h"
+#include "tests/support/short_memory.h"
 
 using kavell::test::LogCapture;
+using kavell::test::ShortMemory;
 
 namespace {
 
@@ -27,17 +25,6 @@ protected:
     std::shared_ptr<KAAccount> account;
 };
 
-thread_local size_t longestAllocation = SIZE_MAX;
-
-/// While it lives, this thread gets no memory of more bytes at once.
-class ShortMemory {
-public:
-    explicit ShortMemory(size_t bytes) { longestAllocation = bytes; }
-    ~ShortMemory() { longestAllocation = SIZE_MAX; }
-    ShortMemory(const ShortMemory &) = delete;
-    ShortMemory &operator=(const ShortMemory &) = delete;
-};
-
 /// A value that cannot be read in so little memory.
 QVariantMap largeDictionary()
 {
@@ -50,24 +37,6 @@ QVariantMap largeDictionary()
 constexpr size_t kLittle = 4096;
 
 }  // namespace
-
-void *operator new(size_t size)
-{
-    void *const memory = size <= longestAllocation ? std::malloc(size) : nullptr;
-    if (!memory)
-        throw std::bad_alloc();
-    return memory;
-}
-
-void operator delete(void *memory) noexcept
-{
-    std::free(memory);
-}
-
-void operator delete(void *memory, size_t) noexcept
-{
-    std::free(memory);
-}
 
 // Merging and replacing
 
