@@ -27,9 +27,14 @@ ShortMemory::~ShortMemory()
 
 }  // namespace kavell::test
 
+void *operator new(size_t size, const std::nothrow_t &) noexcept
+{
+    return size <= mostAtOnce ? std::malloc(size) : nullptr;
+}
+
 void *operator new(size_t size)
 {
-    void *const memory = size <= mostAtOnce ? std::malloc(size) : nullptr;
+    void *const memory = operator new(size, std::nothrow);
     if (!memory)
         throw std::bad_alloc();
     return memory;
