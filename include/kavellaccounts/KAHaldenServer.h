@@ -28,6 +28,7 @@ KAVELL_ACCOUNTS_EXPORT void KAAddHaldenServer(const QString &server, const QVari
 /// Removes a server. Without servers there is no entry.
 KAVELL_ACCOUNTS_EXPORT void KARemoveHaldenServer(const QString &server);
 
+/// Whether the server was added.
 [[nodiscard]] KAVELL_ACCOUNTS_EXPORT bool KAIsKnownHaldenServer(const QString &server);
 
 /// What was stored for the server; null for an unknown one.

@@ -29,9 +29,12 @@ KAVELL_ACCOUNTS_EXPORT CSKavellTypeRef NBSShimAccountCopyProperty(CSKavellString
                                                                   CSKavellStringRef property) CSKAVELL_NODISCARD;
 /// @}
 
+/// @name Whether a service of the account is switched on
+/// @{
 KAVELL_ACCOUNTS_EXPORT void NBSShimServiceSetEnabled(CSKavellStringRef account, CSKavellStringRef service,
                                                      bool enabled);
 KAVELL_ACCOUNTS_EXPORT bool NBSShimServiceIsEnabled(CSKavellStringRef account, CSKavellStringRef service);
+/// @}
 
 /// The name of the account that a mail alias belongs to (caller owns).
 KAVELL_ACCOUNTS_EXPORT CSKavellStringRef NBSShimCopyAccountIDFromMailAlias(CSKavellStringRef mailAlias)
@@ -40,9 +43,12 @@ KAVELL_ACCOUNTS_EXPORT CSKavellStringRef NBSShimCopyAccountIDFromMailAlias(CSKav
 /// The kind of an account, one of the library's constants "kNBAccountType…" (caller owns).
 KAVELL_ACCOUNTS_EXPORT CSKavellTypeRef NBSShimCopyAccountType(CSKavellStringRef account) CSKAVELL_NODISCARD;
 
+/// @name The session: ask the service anew whether the account is logged in, what is known of it, and log in
+/// @{
 KAVELL_ACCOUNTS_EXPORT void NBSShimAccountRefreshLoggedIn(CSKavellStringRef account);
 KAVELL_ACCOUNTS_EXPORT bool NBSShimAccountIsLoggedIn(CSKavellStringRef account);
 KAVELL_ACCOUNTS_EXPORT bool NBSShimAccountLogin(CSKavellStringRef account, CSKavellStringRef password);
+/// @}
 
 /// The text constant that the library exports under a name, borrowed from it; none when it exports none.
 KAVELL_ACCOUNTS_EXPORT CSKavellStringRef NBSShimGetStringConst(const char *name);

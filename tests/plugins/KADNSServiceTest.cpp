@@ -16,6 +16,8 @@
 
 #include <gtest/gtest.h>
 
+#include <kavellaccounts/KAFieldList.h>
+
 #include "platform/qt/query_queue.h"
 #include "tests/support/dns_server.h"
 #include "tests/support/log_capture.h"
@@ -96,6 +98,47 @@ TEST(KADNSServiceTest, ASecondObjectTakesTheFirstOnesResultWithoutAQuery)
     EXPECT_EQ(second, QStringList({"mx.example.org."}));
     EXPECT_EQ(first.constData(), second.constData());
     EXPECT_EQ(server.queryCount("cached.example"), 1);
+}
+
+TEST(KADNSServiceTest, AnAnswerFromTheCacheLeavesTheSemaphore)
+{
+    DnsServer server;
+    static_cast<void>(asked("untouched.example"));
+    EXPECT_TRUE(asked("untouched.example")->semaphore());
+}
+
+TEST(KADNSServiceTest, ADomainOfTwoPartsIsAskedAboutEvenWhenOneIsEmpty)
+{
+    DnsServer server;
+    server.addMailExchanger("single", 10, "mx.example.org");
+    EXPECT_EQ(asked("single.")->mailServers(), QStringList({"mx.example.org."}));
+}
+
+TEST(KADNSServiceTest, TheListGivenToAnObjectIsReplacedByTheCachesAndAddedToByAnswers)
+{
+    DnsServer server;
+    server.addMailExchanger("given.example", 10, "mx.example.org");
+    const auto service = KADNSService::initWithServerAddress("given.example");
+    service->setMailServers({"kept.example.org."});
+    service->setUseCache(false);
+    service->beginQuerySync();
+    EXPECT_EQ(service->mailServers(), QStringList({"kept.example.org.", "mx.example.org."}));
+    static_cast<void>(asked("given.example"));
+    const auto cached = KADNSService::initWithServerAddress("given.example");
+    cached->setMailServers({"kept.example.org."});
+    cached->beginQuerySync();
+    EXPECT_EQ(cached->mailServers(), QStringList({"mx.example.org."}));
+}
+
+TEST(KADNSServiceTest, TheFieldsAreDescribedInTheirOrder)
+{
+    const auto service = KADNSService::initWithServerAddress("fields.example");
+    KAFieldList fields;
+    service->describeFields(fields);
+    QStringList names;
+    for (const KAField &field : fields.fields())
+        names += field.name;
+    EXPECT_EQ(names, QStringList({"_serverAddress", "_mailServers", "_semaphore", "_useCache"}));
 }
 
 TEST(KADNSServiceTest, TheCacheTellsSpellingsOfADomainApart)
@@ -246,6 +289,7 @@ TEST(KADNSServiceTest, ADomainAsHostMatchesTheExchangersInsideIt)
     EXPECT_TRUE(service->hasMailHost("examplemail.com"));
     EXPECT_TRUE(service->hasMailHost("alt1"));
     EXPECT_FALSE(service->hasMailHost("mail.com"));
+    EXPECT_TRUE(service->hasMailHost(""));
     EXPECT_FALSE(service->hasMailHost("ExampleMail.com"));
     EXPECT_FALSE(service->hasMailHost(QString()));
 }

@@ -171,6 +171,8 @@ TEST(SetupResult, MailDescribesItsAccounts)
     const QString base = QStringLiteral("<KAMailAccountSetupResult: 0x%1>")
                              .arg(QString::number(reinterpret_cast<quintptr>(static_cast<KAObject *>(&result)), 16));
     EXPECT_EQ(result.description(), base + " receiving account: (null), sending account: (null)");
+    result.setReceivingAccount("%2 %4");
+    EXPECT_EQ(result.description(), base + " receiving account: %2 %4, sending account: (null)");
     result.setReceivingAccount("in");
     result.setSendingAccount("out");
     result.setReceivingAlreadyExistsInMail(true);
