@@ -1,9 +1,9 @@
 // SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
-// What a data plug-in is handed when it is to set an account up: what the user typed, and how forgiving the set-up may be.
-// One class for each kind of account. Plain values with getters and setters: what was never set is null, false or 0.
-// Shared by pointer; used by one thread at a time.
+// What a data plug-in is handed when it is to set an account up: what the user typed, and how forgiving the set-up may
+// be. One class for each kind of account. Plain values with getters and setters: what was never set is null, false
+// or 0. Shared by pointer; used by one thread at a time.
 
 #ifndef KAVELLACCOUNTS_KAACCOUNTSETUPINPUT_H
 #define KAVELLACCOUNTS_KAACCOUNTSETUPINPUT_H

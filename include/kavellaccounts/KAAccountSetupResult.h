@@ -1,8 +1,8 @@
 // SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
-// What a data plug-in found out about an account that it is to set up. One class for each kind of account. Plain values with
-// getters and setters: what was never set is null, false or 0. Shared by pointer; used by one thread at a time.
+// What a data plug-in found out about an account that it is to set up. One class for each kind of account. Plain values
+// with getters and setters: what was never set is null, false or 0. Shared by pointer; used by one thread at a time.
 
 #ifndef KAVELLACCOUNTS_KAACCOUNTSETUPRESULT_H
 #define KAVELLACCOUNTS_KAACCOUNTSETUPRESULT_H

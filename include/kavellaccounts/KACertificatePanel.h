@@ -17,10 +17,11 @@
 class QNetworkAccessManager;
 class QSslSocket;
 
-/// Shows the prompt for an error that carries KAError::failingURLKey and KAError::peerCertificateChainKey, and waits for
-/// the user, without a bound; from another thread than the main one, for the main event loop, too. True when the user
-/// chose to continue: the chain is then accepted for the host. False, with a line in the log, for an error without URL
-/// or chain, a URL without host, a chain without certificates, or in a program without a QApplication.
+/// Shows the prompt for an error that carries KAError::failingURLKey and KAError::peerCertificateChainKey, and waits
+/// for the user, without a bound; from another thread than the main one, for the main event loop, too. True when the
+/// user chose to continue: the chain is then accepted for the host. False, with a line in the log, for an error without
+/// URL or chain, a URL without host, a chain with an entry that is no certificate, or in a program without a
+/// QApplication.
 [[nodiscard]] KAVELL_ACCOUNTS_EXPORT bool KAShowCertificatePanelForError(const KAError &error, const QString &title);
 
 /// The chains that were accepted, and the connections that are to honour them.

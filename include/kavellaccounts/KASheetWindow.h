@@ -19,8 +19,8 @@ public:
     explicit KASheetWindow(QWidget *parent = nullptr);
     ~KASheetWindow() override;
 
-    /// The view that fills the sheet; null when there is none. A view that is taken out again is hidden and goes back to
-    /// its owner, not deleted.
+    /// The view that fills the sheet; null when there is none. A view that is taken out again is hidden and goes back
+    /// to its owner, not deleted.
     [[nodiscard]] QWidget *contentView() const;
     void setContentView(QWidget *view);
 

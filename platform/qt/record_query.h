@@ -7,9 +7,10 @@
 //     if (query && query->attach(QueryQueue::shared()) == 0) … wait for the callback …
 //     query.reset();  // from here on the callback does not run
 //
-// Names at or below ".local" are asked of the machine's DNS-SD service, all others of its resolver, or of the servers of
-// the environment variable KAVELL_DNS_SERVERS ("127.0.0.1:5353[,…]"). Needs no application object. A query belongs to
-// one thread; its callback runs on the queue's.
+// Names at or below ".local" are asked of the machine's DNS-SD service, all others of its resolver, or of the servers
+// of the environment variable KAVELL_DNS_SERVERS ("127.0.0.1:5353[,…]"). A service or server that hangs holds up neither
+// the one who asks nor other queries. Needs no application object. A query belongs to one thread; its callback runs on
+// the queue's.
 
 #ifndef KAVELL_PLATFORM_QT_RECORD_QUERY_H
 #define KAVELL_PLATFORM_QT_RECORD_QUERY_H
