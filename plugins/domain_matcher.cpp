@@ -58,12 +58,6 @@ std::u16string_view codeUnits(QStringView text)
     return {text.utf16(), static_cast<size_t>(text.size())};
 }
 
-/// The text of a view for a look-up, not copied.
-QString borrowed(QStringView text)
-{
-    return QString::fromRawData(text.data(), text.size());
-}
-
 /// Calls `ask` with what follows each dot until it answers true.
 template <typename Ask> bool anyAfterADot(const QString &domain, Ask &&ask)
 {
@@ -74,6 +68,26 @@ template <typename Ask> bool anyAfterADot(const QString &domain, Ask &&ask)
     return false;
 }
 
+/// The first entry of a sorted table that sorts after the text.
+auto placeAfter(const std::vector<QString> &table, QStringView text)
+{
+    return std::upper_bound(table.begin(), table.end(), codeUnits(text),
+                            [](std::u16string_view wanted, const QString &entry) { return wanted < codeUnits(entry); });
+}
+
+bool contains(const std::vector<QString> &table, QStringView text)
+{
+    const auto after = placeAfter(table, text);
+    return after != table.begin() && *std::prev(after) == text;
+}
+
+/// Whether the text begins with an entry of a table in which none is the beginning of another.
+bool beginsWithAnEntry(const std::vector<QString> &table, QStringView text)
+{
+    const auto after = placeAfter(table, text);
+    return after != table.begin() && text.startsWith(*std::prev(after));
+}
+
 }  // namespace
 
 DomainMatcher::DomainMatcher(const QVariantMap &domains)
@@ -81,20 +95,18 @@ DomainMatcher::DomainMatcher(const QVariantMap &domains)
 {
     const QStringList exceptions = textsIn(domains, kExceptionsKey);
     for (const QString &exception : exceptions) {
-        if (exception.startsWith(kSubTreePrefix)) {
-            const QString bare = exception.sliced(kSubTreePrefix.size());
-            m_excluded.insert(bare);
-            m_excludedSubTrees.insert(bare);
-        } else {
-            m_excluded.insert(exception);
-        }
+        const bool isSubTree = exception.startsWith(kSubTreePrefix);
+        m_excluded.push_back(isSubTree ? exception.sliced(kSubTreePrefix.size()) : exception);
+        if (isSubTree)
+            m_excludedSubTrees.push_back(m_excluded.back());
     }
-    QStringList entries = textsIn(domains, kDomainsKey);
-    if (m_exact)
-        m_claimed = QSet<QString>(entries.begin(), entries.end());
-    else
-        std::for_each(entries.begin(), entries.end(), [](QString &entry) { entry += u'.'; });
-    m_entries = withoutContinuations(std::move(entries));
+    std::sort(m_excluded.begin(), m_excluded.end());
+    std::sort(m_excludedSubTrees.begin(), m_excludedSubTrees.end());
+    const QStringList entries = textsIn(domains, kDomainsKey);
+    QStringList closed = entries;
+    std::for_each(closed.begin(), closed.end(), [](QString &entry) { entry += u'.'; });
+    m_leading = withoutContinuations(std::move(closed));
+    m_inner = m_exact ? withoutContinuations(entries) : m_leading;
 }
 
 bool DomainMatcher::isFor(const QVariantMap &domains) const
@@ -106,37 +118,18 @@ bool DomainMatcher::matches(const QString &domain) const
 {
     if (isExcluded(domain))
         return false;
-    if (m_exact ? beginsWithAnExactEntry(domain) : beginsWithAnEntry(domain))
+    // An exact entry may be the whole domain, too: with a dot of its own the domain begins with the entry and a dot.
+    if (beginsWithAnEntry(m_leading, m_exact ? domain + u'.' : domain))
         return true;
-    return anyAfterADot(domain, [this](QStringView rest) { return beginsWithAnEntry(rest); });
+    return anyAfterADot(domain, [this](QStringView rest) { return beginsWithAnEntry(m_inner, rest); });
 }
 
 bool DomainMatcher::isExcluded(const QString &domain) const
 {
-    if (m_excluded.contains(domain))
+    if (contains(m_excluded, domain))
         return true;
-    return !m_excludedSubTrees.isEmpty() &&
-           anyAfterADot(domain, [this](QStringView rest) { return m_excludedSubTrees.contains(borrowed(rest)); });
-}
-
-/// Whether the domain is an entry, or begins with one and a dot.
-bool DomainMatcher::beginsWithAnExactEntry(const QString &domain) const
-{
-    if (m_claimed.isEmpty())
-        return false;
-    for (qsizetype dot = domain.indexOf(u'.'); dot >= 0; dot = domain.indexOf(u'.', dot + 1)) {
-        if (m_claimed.contains(borrowed(QStringView(domain).first(dot))))
-            return true;
-    }
-    return m_claimed.contains(domain);
-}
-
-bool DomainMatcher::beginsWithAnEntry(QStringView text) const
-{
-    const auto after =
-        std::upper_bound(m_entries.begin(), m_entries.end(), codeUnits(text),
-                         [](std::u16string_view wanted, const QString &entry) { return wanted < codeUnits(entry); });
-    return after != m_entries.begin() && text.startsWith(*std::prev(after));
+    return !m_excludedSubTrees.empty() &&
+           anyAfterADot(domain, [this](QStringView rest) { return contains(m_excludedSubTrees, rest); });
 }
 
 }  // namespace kavell
