@@ -33,10 +33,29 @@ constexpr int kCellPadding = 2;
 constexpr float kDimmedOpacity = 0.65F;
 constexpr qsizetype kVisibleCertificates = 5;
 constexpr int kVisibleDetailLines = 14;
+constexpr int kLongestWord = 40;
+
+/// With invisible places to break long words at, since a host name of 250 letters would make the panel as wide.
+QString withBreaks(const QString &text)
+{
+    constexpr QChar zeroWidthSpace(0x200B);
+    QString broken;
+    int word = 0;
+    for (const QChar letter : text) {
+        word = letter.isSpace() ? 0 : word + 1;
+        broken += letter;
+        if (word == kLongestWord) {
+            broken += zeroWidthSpace;
+            word = 0;
+        }
+    }
+    return broken;
+}
 
 QLabel *wrappedLabel(const QString &text)
 {
-    auto *label = new QLabel(text);
+    auto *label = new QLabel(withBreaks(text));
+    label->setAccessibleName(text);
     label->setTextFormat(Qt::PlainText);  // host names and titles come from outside
     label->setWordWrap(true);
     return label;

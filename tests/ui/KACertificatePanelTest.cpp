@@ -180,6 +180,28 @@ TEST(KACertificatePanelTest, TheMessageNamesTheCallersTitleAndTheHostOnly)
     EXPECT_EQ(message, QString::fromUtf8("%2 <b>Title can’t verify the identity of the server “mail.example”."));
 }
 
+TEST(KACertificatePanelTest, TheLongestHostNameNeitherWidensThePanelNorIsCutOff)
+{
+    const QString label(63, QLatin1Char('a'));
+    const QString host = QStringList({label, label, label, "example"}).join(QLatin1Char('.'));
+    int width = 0;
+    int missing = 0;
+    QString read;
+    whenShown([&](QWidget *panel) {
+        width = panel->width();
+        for (const char *name : {"message", "informative"}) {
+            const auto *text = panel->findChild<QLabel *>(name);
+            missing += std::max(0, text->heightForWidth(text->width()) - text->height());
+        }
+        read = panel->findChild<QLabel *>("message")->accessibleName();
+        panel->close();
+    });
+    EXPECT_FALSE(KAShowCertificatePanelForError(errorFor("https://" + host + "/", selfSignedChain()), "Title"));
+    EXPECT_EQ(width, 560);
+    EXPECT_EQ(missing, 0);
+    EXPECT_TRUE(read.contains(host));
+}
+
 TEST(KACertificatePanelTest, EachCodeHasItsInformativeText)
 {
     const std::pair<qint64, const char *> beginnings[] = {
