@@ -117,6 +117,68 @@ TEST_F(KASheetMorpherTest, HalfWayFrameAndPicturesAreHalfWay)
     EXPECT_EQ(steps, 1);
 }
 
+TEST_F(KASheetMorpherTest, APictureOfAWiderViewIsAsWideAsTheView)
+{
+    morpher->setContentView(&red, false);
+    sheet->show();
+    int steps = 0;
+    kavell::sheetAnimationRunner() = [&](QVariantAnimation &animation) {
+        animation.setDuration(100);
+        animation.setCurrentTime(100);
+        EXPECT_EQ(sheet->contentView()->size(), QSize(300, 120));
+        EXPECT_EQ(sheet->contentView()->grab().toImage().pixel(299, 119), qRgb(0, 0, 255));
+        ++steps;
+    };
+    morpher->setContentView(&blue, true);
+    EXPECT_EQ(steps, 1);
+}
+
+TEST_F(KASheetMorpherTest, BesideANarrowerViewTheOldContentFadesIntoTheBackground)
+{
+    ColouredView narrow(Qt::green, {80, 200});
+    const QColor background(10, 20, 200);
+    QPalette palette = narrow.palette();
+    palette.setColor(QPalette::Window, background);
+    narrow.setPalette(palette);
+    morpher->setContentView(&red, false);
+    sheet->show();
+    int steps = 0;
+    kavell::sheetAnimationRunner() = [&](QVariantAnimation &animation) {
+        animation.setEasingCurve(QEasingCurve::Linear);
+        animation.setDuration(100);
+        animation.setCurrentTime(50);
+        // Half way the sheet is 140 wide, of which the new view takes 80.
+        const QImage picture = sheet->contentView()->grab().toImage();
+        EXPECT_EQ(picture.width(), 140);
+        EXPECT_NEAR(picture.pixelColor(40, 100).green(), 128, 1);
+        EXPECT_NEAR(picture.pixelColor(120, 100).red(), (255 + 10) / 2, 1);
+        EXPECT_NEAR(picture.pixelColor(120, 100).blue(), 200 / 2, 1);
+        ++steps;
+    };
+    morpher->setContentView(&narrow, true);
+    EXPECT_EQ(steps, 1);
+    EXPECT_EQ(sheet->geometry(), QRect(160, 80, 80, 200));
+}
+
+TEST_F(KASheetMorpherTest, TheSheetMovesByTheToolkitsTimeAndKeepsItsTopEdgeOnTheWay)
+{
+    morpher->setContentView(&red, false);
+    sheet->show();
+    QList<int> tops;
+    int duration = 0;
+    kavell::sheetAnimationRunner() = [&](QVariantAnimation &animation) {
+        duration = animation.duration();
+        for (int time = 0; time <= duration; time += 10) {
+            animation.setCurrentTime(time);
+            tops.append(sheet->geometry().top());
+        }
+    };
+    morpher->setContentView(&blue, true);
+    EXPECT_EQ(duration, sheet->style()->styleHint(QStyle::SH_Widget_Animation_Duration));
+    EXPECT_GT(tops.size(), 1);
+    EXPECT_EQ(tops.count(80), tops.size());
+}
+
 TEST_F(KASheetMorpherTest, TheCrossFadeViewIsMadeOnceAndReused)
 {
     QList<QWidget *> seen;
