@@ -60,6 +60,12 @@ struct FakeService {
     std::vector<std::string> asked;
     int open = 0;
 
+    [[nodiscard]] std::vector<std::string> names()
+    {
+        const std::lock_guard lock(mutex);
+        return asked;
+    }
+
     void hangIf(bool condition, std::unique_lock<std::mutex> &lock)
     {
         if (condition)
@@ -85,10 +91,10 @@ protected:
         {
             const std::lock_guard lock(m_service.mutex);
             m_service.released = true;
+            m_service.startError = kDNSServiceErr_Unknown;
         }
         m_service.changed.notify_all();
         // The services' queue serves one after the other: when it answers this question, it is through with the others.
-        m_service.startError = kDNSServiceErr_Unknown;
         std::atomic<bool> answered{false};
         const auto last = start("last.local", [&](const RecordAnswer &) {
             answered = true;
@@ -198,7 +204,7 @@ TEST_F(RecordQueryServiceTest, LocalNamesAreAskedOfTheService)
     m_service.startError = kDNSServiceErr_Unknown;
     for (const char *name : {"local", "host.local", "HOST.Local.", "a.b.LOCAL"})
         static_cast<void>(mailServersOf(QString::fromLatin1(name)));
-    EXPECT_THAT(m_service.asked, testing::ElementsAre("host.local", "HOST.Local.", "a.b.LOCAL"));
+    EXPECT_THAT(m_service.names(), testing::ElementsAre("host.local", "HOST.Local.", "a.b.LOCAL"));
     EXPECT_TRUE(server.queries().empty());
 }
 
@@ -207,7 +213,7 @@ TEST_F(RecordQueryServiceTest, NamesThatOnlyEndLikeLocalOnesAreAskedOfTheResolve
     kavell::test::DnsServer server;
     for (const char *name : {"host.xlocal", "local.example"})
         static_cast<void>(mailServersOf(QString::fromLatin1(name)));
-    EXPECT_TRUE(m_service.asked.empty());
+    EXPECT_TRUE(m_service.names().empty());
     EXPECT_EQ(server.queries(), (std::vector<std::string>{"host.xlocal", "local.example"}));
 }
 
@@ -259,7 +265,7 @@ TEST_F(RecordQueryServiceTest, AServiceThatCannotBeAskedGivesAnEmptyResultAtOnce
     EXPECT_TRUE(mailServersOf("unasked.local").isEmpty());
     EXPECT_LT(since(begin), 400ms);
     EXPECT_TRUE(log.messages().isEmpty());
-    EXPECT_EQ(m_service.asked.size(), 1U);
+    EXPECT_EQ(m_service.names().size(), 1U);
 }
 
 TEST_F(RecordQueryServiceTest, AServiceThatGoesAwayEndsTheWait)
@@ -294,7 +300,7 @@ TEST_F(RecordQueryServiceTest, AServiceThatHangsWhenAskedHoldsUpNobodyBeyondTheL
         EXPECT_TRUE(mailServersOf(QString::fromLatin1(name)).isEmpty());
         EXPECT_LE(since(begin), 550ms);
     }
-    EXPECT_THAT(m_service.asked, testing::ElementsAre("hung.local"));
+    EXPECT_THAT(m_service.names(), testing::ElementsAre("hung.local"));
 }
 
 TEST_F(RecordQueryServiceTest, AServiceThatHangsWhenTheQuestionIsTakenBackHoldsUpNobody)
@@ -342,7 +348,7 @@ TEST_F(RecordQueryServiceTest, AQuestionGivenUpBeforeItsTurnIsNotAsked)
     m_service.changed.notify_all();
     const auto third = start("third.local", [](const RecordAnswer &) {});
     ASSERT_TRUE(m_service.waitUntil([&] { return m_service.asked.size() >= 2; }));
-    EXPECT_THAT(m_service.asked, testing::ElementsAre("first.local", "third.local"));
+    EXPECT_THAT(m_service.names(), testing::ElementsAre("first.local", "third.local"));
 }
 
 }  // namespace
