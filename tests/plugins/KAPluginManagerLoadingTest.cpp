@@ -13,6 +13,7 @@
 #include <kavellaccounts/KABundle.h>
 #include <kavellaccounts/KADataPlugin.h>
 
+#include "plugins/KAPluginManager_p.h"
 #include "tests/plugins/loading_fixture.h"
 
 namespace {
@@ -175,6 +176,28 @@ TEST_F(Loading, ThreadsThatAskTogetherGetTheSameObject)
     ASSERT_TRUE(found[0]);
     EXPECT_THAT(found, testing::Each(found[0]));
     EXPECT_EQ(found[0]->property("didLoadCount").toInt(), 1);
+}
+
+TEST_F(Loading, OneBundleIsLoadedByItsPathUnlessOthersAreAskedFor)
+{
+    const QString path = kBundles + "/good/ExampleList.kaplugin";
+    search("");
+    manager._loadPluginAtPath(path, QStringList{"another"});
+    EXPECT_THAT(identifiers(), IsEmpty());
+    manager._loadPluginAtPath(path, QStringList{"another", kExampleID});
+    EXPECT_THAT(identifiers(), ElementsAre(kExampleID));
+    manager._loadPluginAtPath(path, std::nullopt);
+    EXPECT_EQ(manager.pluginWithIdentifier(kExampleID)->property("didLoadCount").toInt(), 1);
+    manager._loadPluginAtPath("/nowhere", std::nullopt);
+    EXPECT_THAT(log.messages(), IsEmpty());
+}
+
+TEST_F(Loading, TheSharedManagerIsOne)
+{
+    KAPluginManager *const shared = KAPluginManager::shared();
+    ASSERT_TRUE(shared);
+    EXPECT_EQ(KAPluginManager::shared(), shared);
+    EXPECT_EQ(gSharedKAPluginManager, shared);
 }
 
 }  // namespace
