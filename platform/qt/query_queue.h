@@ -27,7 +27,8 @@ public:
     /// Appends what to wait for and answers after how many milliseconds to come back without it; -1 for never.
     virtual int appendDescriptors(std::vector<pollfd> &descriptors) = 0;
 
-    /// Does what can be done without blocking; `descriptors` are those that it appended, with what happened to them.
+    /// Does what can be done now; `descriptors` are those that it appended, with what happened to them. On the queue of
+    /// all answers without blocking.
     virtual void process(const pollfd *descriptors, size_t count) = 0;
 
     /// Whether the source has nothing more to do; the queue then lets go of it.

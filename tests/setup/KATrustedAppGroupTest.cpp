@@ -17,6 +17,7 @@
 #include <kavellaccounts/KAHaldenServer.h>
 #include <kavellaccounts/Ref.h>
 
+#include "tests/platform/credential_fixture.h"
 #include "tests/support/log_capture.h"
 #include "tests/support/process.h"
 
@@ -100,6 +101,7 @@ TEST(VaultAccessGroups, AnAccessObjectThatTrustsNobodyStaysSo)
 
 TEST(SecretServiceAccessGroups, AreNotSupported)
 {
+    const kavell::test::Keyring keyring;
     const LogCapture log;
     const auto item = storedItem("anna");
     ASSERT_TRUE(item);
@@ -130,10 +132,6 @@ int main(int argc, char *argv[])
     kavell::test::writeFile(passphraseFile, "correct horse");
     chmod(passphraseFile.c_str(), S_IRUSR | S_IWUSR);  // the vault reads no file that others may read
     setenv("KAVELL_VAULT_PASSPHRASE_FILE", passphraseFile.c_str(), 1);
-    if (store == "secret-service" &&
-        kavell::test::runProgram({"gnome-keyring-daemon", "--unlock", "--components=secrets", "--daemonize"}, "pw")
-                .status != 0)
-        return 1;
     const QApplication application(argc, argv);
     return RUN_ALL_TESTS();
 }
