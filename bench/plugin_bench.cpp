@@ -1,8 +1,8 @@
 // SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
-// What fifty plug-ins cost: finding the one that a settings dictionary belongs to, asking all of them about a domain that
-// none of them serves, and loading them. Each stands beside the bare system calls that it cannot do without.
+// What fifty plug-ins cost: finding the one that a settings dictionary belongs to, asking all of them about a domain
+// that none of them serves, and loading them. Each stands beside the bare system calls that it cannot do without.
 //
 // The bundles are copies of one, each with an identifier and 200 domains of its own, half of them labels. They are
 // copied and not linked, since the dynamic loader takes two names of one file for one library.

@@ -3,7 +3,7 @@
 
 #include <kavellaccounts/KAFieldList.h>
 
-#include "model/class_name.h"
+#include "platform/qt/class_name.h"
 
 namespace {
 

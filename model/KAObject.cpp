@@ -3,20 +3,9 @@
 
 #include <kavellaccounts/KAObject.h>
 
-#include <cstdlib>
-#include <cxxabi.h>
-#include <memory>
 #include <typeinfo>
 
-#include "model/class_name.h"
-
-QString kavell::className(const std::type_info &type)
-{
-    int status = 0;
-    const std::unique_ptr<char, void (*)(void *)> name(abi::__cxa_demangle(type.name(), nullptr, nullptr, &status),
-                                                       std::free);
-    return QString::fromUtf8(status == 0 ? name.get() : type.name());
-}
+#include "platform/qt/class_name.h"
 
 KAObject::~KAObject() = default;
 

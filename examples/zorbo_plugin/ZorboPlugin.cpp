@@ -1,8 +1,8 @@
 // SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
-// An account-list plug-in to start from: accounts at an imaginary mail and calendar service, Zorbo, whose addresses end in
-// zorbo.example. It adds an account in a small sheet and turns the services of an account on and off.
+// An account-list plug-in to start from: accounts at an imaginary mail and calendar service, Zorbo, whose addresses end
+// in zorbo.example. It adds an account in a small sheet and turns the services of an account on and off.
 
 #include <QtGui/QPainter>
 #include <QtWidgets/QFormLayout>

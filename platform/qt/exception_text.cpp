@@ -7,6 +7,8 @@
 #include <exception>
 #include <typeinfo>
 
+#include "platform/qt/class_name.h"
+
 namespace kavell {
 
 QString currentExceptionText()
@@ -17,7 +19,7 @@ QString currentExceptionText()
         return QString::fromUtf8(exception.what());
     } catch (...) {
         const std::type_info *const type = abi::__cxa_current_exception_type();
-        return QStringLiteral("exception of type ") + QString::fromUtf8(type ? type->name() : "unknown");
+        return QStringLiteral("exception of type ") + (type ? className(*type) : QStringLiteral("unknown"));
     }
 }
 
