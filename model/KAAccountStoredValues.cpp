@@ -27,11 +27,20 @@ QVariantMap storedValues(const QString &loginName)
     return loginName.isNull() ? QVariantMap() : storedAccounts().value(loginName).toMap();
 }
 
-void storeAccounts(const QVariantMap &accounts)
+/// Reads what other processes stored since this one looked: all accounts are one value, so that what is written next
+/// would go over theirs. Whether the file could be read.
+bool readOthers()
+{
+    return KADefaults::shared()->synchronize();
+}
+
+/// Writes at once, unless the file could not even be read: that is in the log once, and the next change tries again.
+void storeAccounts(const QVariantMap &accounts, bool canBeRead)
 {
     const auto defaults = KADefaults::shared();
     defaults->setObject(accounts, kAccountsKey);
-    defaults->synchronize();
+    if (canBeRead)
+        defaults->synchronize();
 }
 
 }  // namespace
@@ -41,6 +50,7 @@ void KAAccount::storeValue(const QVariant &value, const QString &key)
     const QString login = loginName();
     if (login.isNull() || key.isNull())
         return;
+    const bool canBeRead = readOthers();
     QVariantMap accounts = storedAccounts();
     QVariantMap entry = accounts.value(login).toMap();
     if (isNothing(value))
@@ -50,7 +60,7 @@ void KAAccount::storeValue(const QVariant &value, const QString &key)
     accounts.insert(login, entry);
     // What the preferences would refuse is refused here, in its place among the others, where the log can name the key.
     if (toStoreEntry(accounts, key))
-        storeAccounts(accounts);
+        storeAccounts(accounts, canBeRead);
 }
 
 QVariant KAAccount::storedValueForKey(const QString &key) const
@@ -61,11 +71,14 @@ QVariant KAAccount::storedValueForKey(const QString &key) const
 void KAAccount::removeStoredData()
 {
     const QString login = loginName();
-    if (login.isNull() || !KADefaults::shared()->objectForKey(kAccountsKey).isValid())
+    if (login.isNull())
+        return;
+    const bool canBeRead = readOthers();
+    if (!KADefaults::shared()->objectForKey(kAccountsKey).isValid())
         return;
     QVariantMap accounts = storedAccounts();
     accounts.remove(login);
-    storeAccounts(accounts);
+    storeAccounts(accounts, canBeRead);
 }
 
 void KAAccount::mergeStoredData()

@@ -138,8 +138,9 @@ public:
     /// @}
 
     /// @name Stored values: a side store in the user's preferences, shared by all accounts of one login name whatever
-    /// their provider. Each change is on the disk at once; of two processes that change it at the same moment one
-    /// change can be lost
+    /// their provider. Each change is on the disk at once, over what other processes stored before it; of two that
+    /// change it at the same moment one change can be lost. What others stored is seen from the next change here on, or
+    /// after KADefaults::synchronize
     /// @{
     void storeValue(const QVariant &value, const QString &key);
     [[nodiscard]] QVariant storedValueForKey(const QString &key) const;

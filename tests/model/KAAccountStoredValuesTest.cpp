@@ -8,6 +8,7 @@
 
 #include "tests/model/account_fixture.h"
 #include "tests/support/log_capture.h"
+#include "tests/support/process.h"
 
 using namespace kavell::test;
 
@@ -16,7 +17,18 @@ namespace {
 const QString kKey = QStringLiteral("key");
 const QString kAccounts = QStringLiteral("Accounts");
 
-using KAAccountStoredValuesTest = AccountTest;
+class KAAccountStoredValuesTest : public AccountTest {
+protected:
+    /// Stores a value for an account in a process of its own.
+    static void storeInAnotherProcess(const QString &loginName, const QVariant &value)
+    {
+        ChildProcess other([&] {
+            newAccount(loginName)->storeValue(value, kKey);
+            return 0;
+        });
+        ASSERT_EQ(other.wait(), 0);
+    }
+};
 
 QVariant accountsInPreferences()
 {
@@ -48,6 +60,52 @@ TEST_F(KAAccountStoredValuesTest, StoringKeepsTheOtherKeysAndTheOtherAccounts)
     account->storeValue(3, QStringLiteral("other"));
     EXPECT_EQ(account->storedValueForKey(kKey), QVariant(2));
     EXPECT_EQ(newAccount(QStringLiteral("grace"))->storedValueForKey(kKey), QVariant(1));
+}
+
+TEST_F(KAAccountStoredValuesTest, StoringKeepsWhatAnotherProcessStoredMeanwhile)
+{
+    const auto account = newAccount();
+    account->storeValue(1, kKey);
+    storeInAnotherProcess(QStringLiteral("grace"), 2);
+    account->storeValue(3, QStringLiteral("other"));
+    EXPECT_EQ(accountsInPreferences(),
+              QVariant(QVariantMap{{QStringLiteral("ada"), QVariantMap{{kKey, 1}, {QStringLiteral("other"), 3}}},
+                                   {QStringLiteral("grace"), QVariantMap{{kKey, 2}}}}));
+}
+
+TEST_F(KAAccountStoredValuesTest, RemovingStoredDataKeepsWhatAnotherProcessStoredMeanwhile)
+{
+    const auto account = newAccount();
+    account->storeValue(1, kKey);
+    storeInAnotherProcess(QStringLiteral("grace"), 2);
+    account->removeStoredData();
+    EXPECT_EQ(accountsInPreferences(), QVariant(QVariantMap{{QStringLiteral("grace"), QVariantMap{{kKey, 2}}}}));
+}
+
+TEST_F(KAAccountStoredValuesTest, RemovingStoredDataFindsWhatOnlyAnotherProcessStored)
+{
+    const auto account = newAccount();
+    storeInAnotherProcess(QStringLiteral("ada"), 1);
+    account->removeStoredData();
+    EXPECT_EQ(accountsInPreferences(), QVariant(QVariantMap()));
+}
+
+TEST_F(KAAccountStoredValuesTest, PreferencesThatCannotBeReadAreSaidOnceAndTheValueIsKeptForTheNextTime)
+{
+    const std::string path = homePath("config/com.corvane.kavellaccounts.plist");
+    std::filesystem::create_directories(path);
+    const auto account = newAccount();
+    {
+        const LogCapture capture;
+        account->storeValue(1, kKey);
+        EXPECT_EQ(capture.messages(), QStringList(QStringLiteral("Cannot read the preferences file ") +
+                                                  QString::fromStdString(path) + QStringLiteral(": Invalid argument")));
+    }
+    EXPECT_EQ(account->storedValueForKey(kKey), QVariant(1));
+    std::filesystem::remove(path);
+    EXPECT_TRUE(KADefaults::shared()->synchronize());
+    EXPECT_TRUE(std::filesystem::is_regular_file(path));
+    EXPECT_EQ(account->storedValueForKey(kKey), QVariant(1));
 }
 
 TEST_F(KAAccountStoredValuesTest, AccountsOfOneLoginNameShareTheirStoredValues)
