@@ -5,6 +5,8 @@
 
 #include <algorithm>
 
+#include "model/settings_reading.h"
+
 namespace KAExtras {
 
 namespace {
@@ -59,8 +61,8 @@ bool sameValue(const QVariant &first, const QVariant &second)
 auto findDictionary(const QVariantList &list, const QString &key)
 {
     return std::find_if(list.begin(), list.end(), [&](const QVariant &element) {
-        return element.metaType().id() == QMetaType::QVariantMap &&
-               static_cast<const QVariantMap *>(element.constData())->contains(key);
+        return !key.isNull() && element.metaType().id() == QMetaType::QVariantMap &&
+               kavell::hasValueForKey(*static_cast<const QVariantMap *>(element.constData()), key);
     });
 }
 
@@ -79,10 +81,12 @@ std::optional<QVariantMap> dictionaryWithKey(const QVariantList &list, const QSt
 
 void removeDictionaryWithKey(QVariantList &list, const QString &key)
 {
-    const std::optional<QVariantMap> found = dictionaryWithKey(list, key);
-    if (!found)
+    const QVariantList &all = list;
+    const auto found = findDictionary(all, key);
+    if (found == all.end())
         return;
-    const QVariant removed = *found;
+    // By its place first: not everything that a value can hold is equal to itself.
+    const QVariant removed = list.takeAt(found - all.begin());
     list.removeIf([&](const QVariant &element) { return sameValue(element, removed); });
 }
 

@@ -3,6 +3,7 @@
 
 #include <kavellaccounts/KAExtras.h>
 
+#include <limits>
 #include <stdexcept>
 
 #include <QtCore/QTimer>
@@ -191,6 +192,32 @@ TEST(KAExtras, TheFirstDictionaryWithAKeyIsFound)
     EXPECT_FALSE(containsDictionaryWithKey(list, "c"));
     EXPECT_EQ(dictionaryWithKey(list, "a"), (QVariantMap{{"a", 2}}));
     EXPECT_FALSE(dictionaryWithKey(list, "c").has_value());
+}
+
+TEST(KAExtras, ANullKeyNamesNothingNotEvenTheEmptyKey)
+{
+    QVariantList list{QVariantMap{{"", 1}}};
+    EXPECT_TRUE(containsDictionaryWithKey(list, ""));
+    EXPECT_FALSE(containsDictionaryWithKey(list, {}));
+    EXPECT_FALSE(dictionaryWithKey(list, {}).has_value());
+    removeDictionaryWithKey(list, {});
+    EXPECT_EQ(list.size(), 1);
+}
+
+TEST(KAExtras, AKeyWithoutAValueIsNoKey)
+{
+    QVariantList list{QVariantMap{{"a", QVariant()}}, QVariantMap{{"a", QString()}}, QVariantMap{{"a", ""}}};
+    EXPECT_EQ(dictionaryWithKey(list, "a"), (QVariantMap{{"a", ""}}));
+    EXPECT_FALSE(dictionaryWithKey(list, "a")->value("a").toString().isNull());
+    list.removeLast();
+    EXPECT_FALSE(containsDictionaryWithKey(list, "a"));
+}
+
+TEST(KAExtras, ADictionaryThatIsNotEvenEqualToItselfIsRemovedToo)
+{
+    QVariantList list{QVariantMap{{"a", std::numeric_limits<double>::quiet_NaN()}}, QVariantMap{{"a", 1}}};
+    removeDictionaryWithKey(list, "a");
+    EXPECT_EQ(list, (QVariantList{QVariantMap{{"a", 1}}}));
 }
 
 TEST(KAExtras, RemovingADictionaryRemovesItsEqualsToo)
