@@ -89,11 +89,12 @@ QString derivedAddress(const QVariantMap &input, const QString &userName, const 
 
 void assembleServerURL(const QVariantMap &input, const ServerKeys &keys, QVariantMap &settings)
 {
-    if (!hasValueForKey(input, keys.host) || hasValueForKey(input, keys.url))
+    const QString host = textForKey(input, keys.host);
+    if (host.isNull() || hasValueForKey(input, keys.url))
         return;
     QString text = isTrueForKey(input, keys.useSSL) ? QStringLiteral("https://") : QStringLiteral("http://");
-    text += textForKey(input, keys.host);
-    if (hasValueForKey(input, keys.port))
+    text += host;
+    if (hasNumberForKey(input, keys.port))
         text += u':' + QString::number(integerForKey(input, keys.port));
     text += textForKey(input, keys.path);
     const QUrl url(text, QUrl::StrictMode);

@@ -8,6 +8,7 @@
 #define KAVELL_MODEL_SETTINGS_READING_H
 
 #include <algorithm>
+#include <cmath>
 #include <cstdlib>
 
 #include <QtCore/QString>
@@ -47,6 +48,12 @@ namespace kavell {
     return first == u'y' || first == u't' || (first >= u'1' && first <= u'9');
 }
 
+/// Whether the key holds something that can be read as a number, as any text can.
+[[nodiscard]] inline bool hasNumberForKey(const QVariantMap &settings, const QString &key)
+{
+    return hasValueForKey(settings, key) && settings.value(key).canConvert<qlonglong>();
+}
+
 /// The whole number that the key holds: the one that a text begins with, a real without its fraction; 0 for none.
 [[nodiscard]] inline qlonglong integerForKey(const QVariantMap &settings, const QString &key)
 {
@@ -54,8 +61,11 @@ namespace kavell {
     if (const QString text = textOf(value); !text.isNull())
         return std::strtoll(text.toUtf8().constData(), nullptr, 10);
     const bool isReal = value.metaType().id() == QMetaType::Double || value.metaType().id() == QMetaType::Float;
-    constexpr double kLargest = 1e18;  // much larger ones cannot be converted
-    return isReal ? static_cast<qlonglong>(std::clamp(value.toDouble(), -kLargest, kLargest)) : value.toLongLong();
+    if (!isReal)
+        return value.toLongLong();
+    constexpr double kLargest = 1e18;  // much larger ones cannot be converted, nor can what is no number
+    const double real = value.toDouble();
+    return std::isnan(real) ? 0 : static_cast<qlonglong>(std::clamp(real, -kLargest, kLargest));
 }
 
 /// Whether the key holds a text that is not empty.

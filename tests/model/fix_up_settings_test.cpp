@@ -1,6 +1,8 @@
 // SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
 
+#include <limits>
+
 #include <QtCore/QUrl>
 
 #include <gtest/gtest.h>
@@ -172,6 +174,7 @@ TEST(FixUpSettings, APortIsItsWholeNumber)
         {443.9, "http://ex.example.net:443"},
         {qulonglong{80}, "http://ex.example.net:80"},
         {"none", "http://ex.example.net:0"},
+        {std::numeric_limits<double>::quiet_NaN(), "http://ex.example.net:0"},
     };
     for (const auto &[port, url] : rows) {
         const QVariantMap fixed = fixUpSettings({{"serverName", "ex.example.net"}, {"serverPort", port}});
@@ -245,4 +248,18 @@ TEST(FixUpSettings, ValuesOfOtherTypesDoNotHarm)
     const QVariantMap fixed = fixUpSettings({{"userName", 7}, {"KAChatAccountType", QVariantList{1}}});
     EXPECT_EQ(fixed.value("userName"), 7);
     EXPECT_FALSE(fixed.contains("emailAddress"));
+}
+
+TEST(FixUpSettings, AHostThatIsNoTextCountsAsMissing)
+{
+    EXPECT_FALSE(fixUpSettings({{"serverName", 7}, {"serverRootPath", "/EWS"}}).contains("serverURL"));
+    EXPECT_FALSE(fixUpSettings({{"externalServerName", QVariantList{"ex"}}}).contains("externalServerURL"));
+}
+
+TEST(FixUpSettings, APortThatIsNeitherNumberNorTextCountsAsMissing)
+{
+    for (const QVariant &port :
+         {QVariant(QVariantList{443}), QVariant(QVariantMap{{"port", 443}}), QVariant(QString())})
+        EXPECT_EQ(fixUpSettings({{"serverName", "ex.example.net"}, {"serverPort", port}}).value("serverURL").toUrl(),
+                  QUrl("http://ex.example.net"));
 }
