@@ -239,6 +239,6 @@ void KAAccount::setVolatileAttribute(const QVariant &value, const QString &key)
 void KAAccount::describeFields(KAFieldList &fields) const
 {
     fields.add("_accountRef", _accountRef);
-    fields.add("_private", _private ? QVariant(*_private) : QVariant());
+    fields.add("_private", _private);
     KAObject::describeFields(fields);
 }

@@ -171,6 +171,6 @@ std::shared_ptr<KAAccount> KAProvider::aListAccountContainingChildUID(const QStr
 void KAProvider::describeFields(KAFieldList &fields) const
 {
     fields.add("_providerRef", _providerRef);
-    fields.add("_servicesProvided", _servicesProvided ? QVariant(*_servicesProvided) : QVariant());
+    fields.add("_servicesProvided", _servicesProvided);
     KAObject::describeFields(fields);
 }

@@ -48,6 +48,7 @@ public:
     /// @{
     void add(const char *name, bool value);
     void add(const char *name, const char *value);
+    void add(const char *name, char *value) { add(name, static_cast<const char *>(value)); }
     template <typename T>
         requires std::is_arithmetic_v<T>
     void add(const char *name, T value)

@@ -375,10 +375,12 @@ TEST_F(KAAccountTest, TheFieldsAreTheRecordAndTheVolatileAttributes)
     EXPECT_EQ(before.fields()[0].encoding, QStringLiteral("^v"));
     EXPECT_EQ(before.fields()[0].pointer, account->accountRef());
     EXPECT_EQ(before.fields()[1].name, QStringLiteral("_private"));
+    EXPECT_EQ(before.fields()[1].encoding, QStringLiteral("@\"QVariantMap\""));
     EXPECT_EQ(before.fields()[1].value, QStringLiteral("(null)"));
     account->setVolatileAttribute(1, kKey);
     KAFieldList after;
     account->describeFields(after);
+    EXPECT_EQ(after.fields()[1].encoding, QStringLiteral("@\"QVariantMap\""));
     EXPECT_EQ(after.fields()[1].value, QStringLiteral("{key = 1;}"));
 }
 

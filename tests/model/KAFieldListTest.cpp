@@ -79,6 +79,8 @@ TEST(KAFieldListTest, CharacterPointersAreText)
 {
     const char *text = "text";
     EXPECT_EQ(fieldOf(text), "* text");
+    char letters[] = "letters";
+    EXPECT_EQ(fieldOf(static_cast<char *>(letters)), "* letters");
     const char *none = nullptr;
     EXPECT_EQ(fieldOf(none), "* (null)");
 }

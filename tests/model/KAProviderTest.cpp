@@ -270,9 +270,11 @@ TEST_F(KAProviderTest, TheFieldsAreTheRecordAndTheServiceTypes)
     ASSERT_EQ(before.fields().size(), 2u);
     EXPECT_EQ(before.fields()[0].name, QStringLiteral("_providerRef"));
     EXPECT_EQ(before.fields()[1].name, QStringLiteral("_servicesProvided"));
+    EXPECT_EQ(before.fields()[1].encoding, QStringLiteral("@\"QStringList\""));
     EXPECT_EQ(before.fields()[1].value, QStringLiteral("(null)"));
     provider->setServiceTypesProvided({kKAServiceIMAP});
     KAFieldList after;
     provider->describeFields(after);
+    EXPECT_EQ(after.fields()[1].encoding, QStringLiteral("@\"QStringList\""));
     EXPECT_EQ(after.fields()[1].value, QStringLiteral("(kKAServiceIMAP)"));
 }
