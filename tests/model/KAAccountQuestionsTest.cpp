@@ -154,6 +154,14 @@ TEST_F(KAAccountQuestionsTest, OneUserAtBothOfTheMakersMailDomainsIsEqual)
     EXPECT_TRUE(one->isEqual(*newAccount(QStringLiteral("ada@nimbrel.example"), kKAProviderNimbrel)));
 }
 
+TEST_F(KAAccountQuestionsTest, TheOtherMailDomainsAddressIsInLowerCaseAndComparedAsItStands)
+{
+    const auto one = newAccount(QStringLiteral("Ada@Nimbrel.example"), kKAProviderNimbrel);
+    EXPECT_TRUE(one->isEqual(*newAccount(QStringLiteral("ada@dorvex.example"), kKAProviderNimbrel)));
+    EXPECT_FALSE(one->isEqual(*newAccount(QStringLiteral("Ada@dorvex.example"), kKAProviderNimbrel)));
+    EXPECT_FALSE(one->isEqual(*newAccount(QStringLiteral("ada@nimbrel.example"), kKAProviderNimbrel)));
+}
+
 TEST_F(KAAccountQuestionsTest, OneUserAtBothMailDomainsWithDifferentProvidersIsNotEqual)
 {
     const auto one = newAccount(QStringLiteral("ada@nimbrel.example"), kKAProviderNimbrel);

@@ -141,6 +141,18 @@ TEST_F(KAAccountTest, AFreshAccountHasAUUIDWhichCanBeReplaced)
     EXPECT_EQ(account->uid(), QStringLiteral("my-uid"));
 }
 
+TEST_F(KAAccountTest, ANullUUIDTakesAReplacementBackAndAnEmptyOneReplaces)
+{
+    const auto account = newAccount();
+    const QString own = account->uid();
+    account->setUID(QStringLiteral("my-uid"));
+    account->setUID(QString());
+    EXPECT_EQ(account->uid(), own);
+    account->setUID(QStringLiteral(""));
+    EXPECT_TRUE(account->uid().isEmpty());
+    EXPECT_FALSE(account->uid().isNull());
+}
+
 TEST_F(KAAccountTest, TheFullNameIsAProviderAttribute)
 {
     const auto account = newAccount();

@@ -153,7 +153,13 @@ TEST(KAExtras, TheHashIsWhatFollowsTheNumberSign)
 {
     EXPECT_EQ(_hash(QUrl("http://example.net/p?q=1#a=b")), "a=b");
     EXPECT_TRUE(_hash(QUrl("http://example.net/p?q=1")).isNull());
-    EXPECT_EQ(_hash(QUrl("http://example.net/#")), "");
+}
+
+TEST(KAExtras, NothingBehindTheNumberSignIsAnEmptyHashAndNotANullOne)
+{
+    const QString hash = _hash(QUrl("http://example.net/#"));
+    EXPECT_TRUE(hash.isEmpty());
+    EXPECT_FALSE(hash.isNull());
 }
 
 TEST(KAExtras, AQuestionMarkBehindTheNumberSignIsARangeError)
