@@ -57,6 +57,16 @@ TEST_F(MatchingMail, TheUserNameOfTheAddressStandsInForAMissingOne)
     EXPECT_EQ(mail({{"emailAddress", "anna@zorbo.example"}}), "anna at com.corvane.account.yahoo");
 }
 
+TEST_F(MatchingMail, AUserNameThatIsThereAndEmptyIsNotMissing)
+{
+    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
+    addAccount(kKAProviderYahoo, "anna");
+    const QVariantMap settings{{"userName", ""}, {"emailAddress", "anna@zorbo.example"}};
+    EXPECT_EQ(mail(settings), "none");
+    addAccount(kKAProviderYahoo, "anna@zorbo.example");
+    EXPECT_EQ(mail(settings), "anna@zorbo.example at com.corvane.account.yahoo");
+}
+
 TEST_F(MatchingMail, ThePluginIsChosenByTheAddressAndNotByTheServer)
 {
     addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
@@ -233,6 +243,18 @@ TEST_F(MatchingCalendars, ARegisteredServerInAClaimedDomainBelongsToTheClaimant)
               "anna at com.corvane.account.yahoo");
 }
 
+TEST_F(MatchingCalendars, AServerInAClaimedDomainIsNotDecidedByTypeOrPath)
+{
+    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
+    addPlugin(kKAExchangePluginID, kKAProviderExchange);
+    addAccount(kKAProviderExchange, "anna");
+    EXPECT_EQ(calendar({{"serverAddress", "dav.zorbo.example"},
+                        {"userName", "anna"},
+                        {"serverRootPath", "/EWS"},
+                        {"KAAccountTypeKey", "kKAServiceExchangeCalendar"}}),
+              "none");
+}
+
 TEST_F(MatchingCalendars, TypeAndPathMarkAnExchangeAccount)
 {
     addPlugin(kKAExchangePluginID, kKAProviderExchange);
@@ -272,6 +294,7 @@ TEST_F(MatchingCalendars, AnAccountOfGoogleWithoutAddressIsAtItsMailDomain)
     addAccount(kKAProviderGoogle, "anna@gmail.com");
     EXPECT_EQ(calendar({{"serverAddress", "www.google.com"}, {"userName", "anna"}}),
               "anna@gmail.com at com.corvane.account.google");
+    EXPECT_EQ(calendar({{"serverAddress", "www.google.com"}, {"userName", "anna"}, {"emailAddress", ""}}), "none");
     EXPECT_EQ(calendar({{"serverAddress", "www.google.com"}}), "none");
 }
 
@@ -319,6 +342,19 @@ TEST_F(MatchingContacts, TheTypeOfTheServerProductComesBeforeAPathOnExchange)
                         {"serverRootPath", "/EWS"},
                         {"KAAccountTypeKey", "com.corvane.account.haldenserver"}}),
               "anna at com.corvane.account.haldenserver");
+}
+
+TEST_F(MatchingContacts, AServerInAClaimedDomainIsNotDecidedByTypeOrPath)
+{
+    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
+    addPlugin(kKAHaldenServerPluginID, kKAProviderHaldenServer);
+    addPlugin(kKAExchangePluginID, kKAProviderExchange);
+    addAccount(kKAProviderHaldenServer, "anna");
+    addAccount(kKAProviderExchange, "anna");
+    QVariantMap settings{{"serverAddress", "dav.zorbo.example"}, {"userName", "anna"}, {"serverRootPath", "/EWS"}};
+    EXPECT_EQ(contacts(settings), "none");
+    settings.insert("KAAccountTypeKey", "com.corvane.account.haldenserver");
+    EXPECT_EQ(contacts(settings), "none");
 }
 
 TEST_F(MatchingContacts, TypeAndPathMarkAnExchangeAccount)
