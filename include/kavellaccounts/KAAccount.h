@@ -110,7 +110,8 @@ public:
     /// Null when there is none or it cannot be read.
     [[nodiscard]] QString password() const;
 
-    /// Whether it was stored. A null or empty password removes the stored one and answers false.
+    /// Whether it was stored. A null or empty password removes the stored one and answers false; one with half of a
+    /// character, which would not be read back as it is, leaves the stored one and answers false.
     bool setPassword(const QString &password);
     void removePassword();
 

@@ -417,6 +417,16 @@ TEST_F(KAAccountPasswordTest, ANullOrEmptyPasswordRemovesTheStoredOneAndFails)
     EXPECT_TRUE(account->password().isNull());
 }
 
+TEST_F(KAAccountPasswordTest, APasswordWithHalfOfACharacterIsNotStoredAsAnother)
+{
+    const auto account = newAccount();
+    ASSERT_TRUE(account->setPassword(QStringLiteral("secret")));
+    EXPECT_FALSE(account->setPassword(QStringLiteral("half ") + QChar(0xD83D)));
+    EXPECT_EQ(account->password(), QStringLiteral("secret"));
+    EXPECT_TRUE(account->setPassword(QStringLiteral("whole \U0001F511")));
+    EXPECT_EQ(account->password(), QStringLiteral("whole \U0001F511"));
+}
+
 TEST_F(KAAccountPasswordTest, TheItemIsOwnedByTheCallerAndCanBeGivenToAnotherAccount)
 {
     const auto account = newAccount();
