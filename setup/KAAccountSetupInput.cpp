@@ -16,7 +16,7 @@ void KAAccountSetupInput::describeFields(KAFieldList &fields) const
     fields.add("_password", _password);
     fields.add("_description", _description);
     fields.add("_userName", _userName);
-    fields.add("_autoconfigDefaults", _autoconfigDefaults ? QVariant(*_autoconfigDefaults) : QVariant());
+    fields.add("_autoconfigDefaults", _autoconfigDefaults);
     fields.add("_context", *_context);
     fields.add("_continueThroughError", _continueThroughError);
     fields.add("_continueWithoutSSL", _continueWithoutSSL);

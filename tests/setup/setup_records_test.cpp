@@ -46,6 +46,20 @@ TEST(SetupInput, UnsetDefaultsReadAsEmptyAlsoWhenSetToNothingAgain)
     EXPECT_TRUE(input.autoconfigDefaults().isEmpty());
 }
 
+TEST(SetupInput, DefaultsAreShownAsADictionaryWhetherSetOrNot)
+{
+    KAAccountSetupInput input;
+    KAFieldList unset;
+    input.describeFields(unset);
+    EXPECT_EQ(unset.fields()[3].encoding, "@\"QVariantMap\"");
+    EXPECT_EQ(unset.fields()[3].value, "(null)");
+    input.setAutoconfigDefaults(QVariantMap{{"a", 1}});
+    KAFieldList set;
+    input.describeFields(set);
+    EXPECT_EQ(set.fields()[3].encoding, "@\"QVariantMap\"");
+    EXPECT_EQ(set.fields()[3].value, "{a = 1;}");
+}
+
 TEST(SetupInput, EachHasAContextOfItsOwnThatIsShared)
 {
     const KAAccountSetupInput first;
