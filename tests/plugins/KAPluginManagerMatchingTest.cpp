@@ -182,6 +182,12 @@ TEST_F(MatchingCalendars, ThePluginIsChosenByTheServer)
     EXPECT_EQ(calendar({{"emailAddress", "anna@zorbo.example"}, {"userName", "anna"}}), "none");
 }
 
+TEST_F(MatchingCalendars, TheDomainOfTheServerIsAskedForWithoutThePath)
+{
+    EXPECT_EQ(calendar({{"serverAddress", "DAV.Paths1.example/calendars"}, {"userName", "anna"}}), "none");
+    EXPECT_EQ(nameServer().queries(), std::vector<std::string>{"dav.paths1.example"});
+}
+
 TEST_F(MatchingCalendars, AUserNameThatIsAnAddressIsTriedInPartThenWhole)
 {
     addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
@@ -299,6 +305,12 @@ TEST_F(MatchingCalendars, AnAccountOfGoogleWithoutAddressIsAtItsMailDomain)
 }
 
 // Contacts
+
+TEST_F(MatchingContacts, TheDomainOfTheServerIsAskedForWithoutThePath)
+{
+    EXPECT_EQ(contacts({{"serverAddress", "DAV.Paths2.example/contacts"}, {"userName", "anna"}}), "none");
+    EXPECT_EQ(nameServer().queries(), std::vector<std::string>{"dav.paths2.example"});
+}
 
 TEST_F(MatchingContacts, TheUserNameIsTakenWhole)
 {
