@@ -106,6 +106,7 @@ TEST(KAExtras, TheDomainOfAServerAddressIsItsHost)
     EXPECT_EQ(urlDomain("dav.example.net/home/anna"), "dav.example.net");
     EXPECT_EQ(urlDomain("  dav.example.net/x"), "dav.example.net");
     EXPECT_EQ(urlDomain("://dav.example.net/x"), "dav.example.net");
+    EXPECT_EQ(urlDomain(" :// dav.example.net/x"), "dav.example.net");
     EXPECT_EQ(urlDomain("dav.example.net/?back=http://other.example"), "dav.example.net");
 }
 

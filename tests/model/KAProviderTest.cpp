@@ -225,6 +225,14 @@ TEST_F(KAProviderTest, OfTwoAccountsWithOneUUIDTheFirstIsFound)
     EXPECT_EQ(provider->accountWithUID(QStringLiteral("same"))->loginName(), QStringLiteral("ada"));
 }
 
+TEST_F(KAProviderTest, ANullUUIDIsNotTheEmptyOne)
+{
+    const auto provider = providerWith({});
+    provider->createAccountWithLoginName(QStringLiteral("ada"))->setUID(QStringLiteral(""));
+    EXPECT_TRUE(provider->accountWithUID(QStringLiteral("")));
+    EXPECT_FALSE(provider->accountWithUID(QString()));
+}
+
 TEST_F(KAProviderTest, FindsTheAccountThatHoldsAChild)
 {
     const auto provider = providerWith({});

@@ -367,8 +367,10 @@ TEST(ValueConversionTest, ARefusedDictionaryNamesTheKeyThatIsToBlame)
 {
     const test::LogCapture capture;
     EXPECT_FALSE(toStoreDictionary({{QStringLiteral("a"), 1}, {QStringLiteral("b"), QVariantList{QRect()}}}));
+    EXPECT_FALSE(toStoreDictionary({{QStringLiteral("c"), QVariantMap{{QStringLiteral("inner"), QRect()}}}}));
     EXPECT_EQ(capture.messages(),
-              QStringList(QStringLiteral("Refused to store a value for \"b\": QRect is no type of a property list")));
+              QStringList({QStringLiteral("Refused to store a value for \"b\": QRect is no type of a property list"),
+                           QStringLiteral("Refused to store a value for \"c\": QRect is no type of a property list")}));
 }
 
 TEST(ValueConversionTest, ADictionaryKeepsKeysThatHaveAValueOnly)
