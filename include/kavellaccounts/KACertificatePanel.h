@@ -20,8 +20,8 @@ class QSslSocket;
 /// Shows the prompt for an error that carries KAError::failingURLKey and KAError::peerCertificateChainKey, and waits
 /// for the user, without a bound; from another thread than the main one, for the main event loop, too. True when the
 /// user chose to continue: the chain is then accepted for the host. False, with a line in the log, for an error without
-/// URL or chain, a URL without host, a chain with an entry that is no certificate, or in a program without a
-/// QApplication.
+/// URL or chain, a URL without host, a chain that is empty or has an entry that is no certificate, or in a program
+/// without a QApplication.
 [[nodiscard]] KAVELL_ACCOUNTS_EXPORT bool KAShowCertificatePanelForError(const KAError &error, const QString &title);
 
 /// The chains that were accepted, and the connections that are to honour them.
@@ -33,11 +33,13 @@ public:
     /// connections.
     static void accept(const QString &host, const QList<QSslCertificate> &chain);
 
-    /// Whether exactly this chain is accepted for the host (in any case of letters).
+    /// Whether exactly this chain is accepted for the host (in any case of letters, and with international
+    /// letters or their encoded form).
     [[nodiscard]] static bool isAccepted(const QString &host, const QList<QSslCertificate> &chain);
 
-    /// @name From here on, the connection goes on through verification errors when its host and chain are accepted.
-    /// Called on the object's thread.
+    /// @name From here on, the connection goes on through verification errors when its host and chain are accepted. At
+    /// any other it takes back what earlier handlers of the same error ignored; handlers connected later have the last
+    /// word. Called on the object's thread.
     /// @{
     static void watch(QNetworkAccessManager *manager);
     static void watch(QSslSocket *socket);

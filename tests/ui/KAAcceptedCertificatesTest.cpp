@@ -27,6 +27,9 @@ namespace {
 struct Identity {
     QSslKey key;
     QSslCertificate certificate;
+    QList<QSslCertificate> authorities{};
+
+    [[nodiscard]] QList<QSslCertificate> chain() const { return QList{certificate} + authorities; }
 };
 
 QByteArray contents(const QString &path)
@@ -50,6 +53,43 @@ Identity selfSigned(const QString &host)
     return identity;
 }
 
+void runOpenSsl(const QString &directory, const QStringList &arguments)
+{
+    QProcess maker;
+    maker.setWorkingDirectory(directory);
+    maker.start("openssl", arguments);
+    EXPECT_TRUE(maker.waitForFinished());
+    EXPECT_EQ(maker.exitCode(), 0) << maker.readAllStandardError().toStdString();
+}
+
+/// Servers of one private authority, each with the authority's certificate behind its own. All are called 127.0.0.1 and
+/// localhost, so that nothing but the authority is wrong with them.
+QList<Identity> ofOneAuthority(int count)
+{
+    const QTemporaryDir directory;
+    const QStringList newKey{"-newkey", "ec", "-pkeyopt", "ec_paramgen_curve:prime256v1", "-nodes"};
+    runOpenSsl(directory.path(), QStringList{"req", "-x509"} + newKey +
+                                     QStringList{"-days", "2", "-subj", "/CN=Authority", "-keyout", "authority.key",
+                                                 "-out", "authority.pem"});
+    QFile names(directory.filePath("names"));
+    EXPECT_TRUE(names.open(QIODevice::WriteOnly));
+    names.write("subjectAltName=IP:127.0.0.1,DNS:localhost\n");
+    names.close();
+    QList<Identity> servers;
+    for (int number = 0; number < count; ++number) {
+        runOpenSsl(directory.path(),
+                   QStringList{"req", "-new"} + newKey +
+                       QStringList{"-subj", "/CN=localhost", "-keyout", "key.pem", "-out", "request"});
+        runOpenSsl(directory.path(),
+                   {"x509", "-req", "-in", "request", "-CA", "authority.pem", "-CAkey", "authority.key",
+                    "-CAcreateserial", "-days", "2", "-extfile", "names", "-out", "certificate.pem"});
+        servers.append({QSslKey(contents(directory.filePath("key.pem")), QSsl::Ec),
+                        QSslCertificate(contents(directory.filePath("certificate.pem"))),
+                        {QSslCertificate(contents(directory.filePath("authority.pem")))}});
+    }
+    return servers;
+}
+
 /// Answers every request with "hello" behind TLS, and hangs up unless it is to keep its connections.
 class TlsServer : public QTcpServer {
 public:
@@ -59,7 +99,14 @@ public:
         listen(QHostAddress::LocalHost);
     }
 
+    /// From here on, it shows another certificate.
+    void become(const Identity &identity) { m_identity = identity; }
+
+    /// From here on, every request is answered with the way to another place.
+    void redirectTo(const QString &location) { m_location = location.toUtf8(); }
+
     [[nodiscard]] int connections() const { return m_connections; }
+    [[nodiscard]] int requests() const { return m_requests; }
 
 protected:
     void incomingConnection(qintptr descriptor) override
@@ -68,10 +115,13 @@ protected:
         auto *socket = new QSslSocket(this);
         socket->setSocketDescriptor(descriptor);
         socket->setPrivateKey(m_identity.key);
-        socket->setLocalCertificate(m_identity.certificate);
-        QObject::connect(socket, &QSslSocket::readyRead, socket, [socket, keeps = m_keepsConnections] {
+        socket->setLocalCertificateChain(m_identity.chain());
+        QObject::connect(socket, &QSslSocket::readyRead, socket, [this, socket, keeps = m_keepsConnections] {
             socket->readAll();
-            socket->write("HTTP/1.1 200 OK\r\nContent-Length: 5\r\n");
+            ++m_requests;
+            socket->write(m_location.isEmpty()
+                              ? QByteArray("HTTP/1.1 200 OK\r\nContent-Length: 5\r\n")
+                              : "HTTP/1.1 302 Found\r\nContent-Length: 5\r\nLocation: " + m_location + "\r\n");
             socket->write(keeps ? "\r\nhello" : "Connection: close\r\n\r\nhello");
             if (!keeps)
                 socket->disconnectFromHost();
@@ -82,7 +132,9 @@ protected:
 private:
     Identity m_identity;
     bool m_keepsConnections;
+    QByteArray m_location;
     int m_connections = 0;
+    int m_requests = 0;
 };
 
 /// What the manager gets from the server; empty when the connection is refused.
@@ -186,6 +238,90 @@ TEST(KAAcceptedCertificatesTest, AWatchedSocketHonoursAcceptance)
         (accepted ? encrypted : ended).wait(5000);
         EXPECT_EQ(socket.isEncrypted(), accepted);
     }
+}
+
+TEST(KAAcceptedCertificatesTest, AnAcceptanceDoesNotFollowARedirectionToAnotherHost)
+{
+    const Identity identity = selfSigned("redirected.example");
+    const TlsServer target(identity);
+    TlsServer origin(identity);
+    origin.redirectTo(QStringLiteral("https://localhost:%1/").arg(target.serverPort()));
+    KAAcceptedCertificates::accept("127.0.0.1", {identity.certificate});
+    EXPECT_EQ(fetched(origin, "127.0.0.1"), "");
+    EXPECT_EQ(target.connections(), 1);
+    EXPECT_EQ(target.requests(), 0);
+
+    KAAcceptedCertificates::accept("localhost", {identity.certificate});
+    EXPECT_EQ(fetched(origin, "127.0.0.1"), "hello");
+}
+
+TEST(KAAcceptedCertificatesTest, AnotherServerOfTheSameAuthorityIsRefusedAfterARedirection)
+{
+    const QList<Identity> identities = ofOneAuthority(2);
+    const TlsServer target(identities[1]);
+    TlsServer origin(identities[0]);
+    origin.redirectTo(QStringLiteral("https://localhost:%1/").arg(target.serverPort()));
+    KAAcceptedCertificates::accept("127.0.0.1", identities[0].chain());
+    EXPECT_EQ(fetched(origin, "127.0.0.1"), "");
+    EXPECT_EQ(target.connections(), 1);
+    EXPECT_EQ(target.requests(), 0);
+}
+
+TEST(KAAcceptedCertificatesTest, AnotherServerOfTheSameAuthorityIsRefusedWhenAManagerConnectsAgain)
+{
+    const QList<Identity> identities = ofOneAuthority(2);
+    TlsServer server(identities[0]);
+    KAAcceptedCertificates::accept("127.0.0.1", identities[0].chain());
+    QNetworkAccessManager manager;
+    manager.setProxy(QNetworkProxy::NoProxy);
+    KAAcceptedCertificates::watch(&manager);
+    EXPECT_EQ(fetchedBy(manager, server, "127.0.0.1"), "hello");
+    const int requests = server.requests();
+    server.become(identities[1]);
+    EXPECT_EQ(fetchedBy(manager, server, "127.0.0.1"), "");
+    EXPECT_EQ(server.requests(), requests);
+    server.become(identities[0]);
+    EXPECT_EQ(fetchedBy(manager, server, "127.0.0.1"), "hello");
+}
+
+TEST(KAAcceptedCertificatesTest, AnotherServerOfTheSameAuthorityIsRefusedWhenASocketConnectsAgain)
+{
+    const QList<Identity> identities = ofOneAuthority(2);
+    TlsServer server(identities[0]);
+    KAAcceptedCertificates::accept("localhost", identities[0].chain());
+    QSslSocket socket;
+    socket.setProxy(QNetworkProxy::NoProxy);
+    KAAcceptedCertificates::watch(&socket);
+    for (const int number : {0, 1, 0}) {
+        server.become(identities[number]);
+        QSignalSpy encrypted(&socket, &QSslSocket::encrypted);
+        QSignalSpy ended(&socket, &QAbstractSocket::disconnected);
+        socket.connectToHostEncrypted("localhost", server.serverPort(), QIODevice::ReadWrite,
+                                      QAbstractSocket::IPv4Protocol);
+        (number == 0 ? encrypted : ended).wait(5000);
+        EXPECT_EQ(encrypted.count(), number == 0 ? 1 : 0) << qPrintable(socket.errorString());
+        socket.abort();
+    }
+}
+
+TEST(KAAcceptedCertificatesTest, AnInternationalHostIsOneInBothOfItsForms)
+{
+    const QList<QSslCertificate> chain{selfSigned("six.example").certificate};
+    KAAcceptedCertificates::accept(QUrl("https://xn--bcher-kva.example/").host(), chain);
+    EXPECT_TRUE(KAAcceptedCertificates::isAccepted("xn--bcher-kva.example", chain));
+    EXPECT_TRUE(KAAcceptedCertificates::isAccepted(QStringLiteral(u"B\u00DCcher.example"), chain));
+    EXPECT_FALSE(KAAcceptedCertificates::isAccepted("bucher.example", chain));
+}
+
+TEST(KAAcceptedCertificatesTest, AddressesAndUnusualNamesAreHostsToo)
+{
+    const QList<QSslCertificate> chain{selfSigned("seven.example").certificate};
+    for (const char *host : {"::1", "fe80::1%eth0", "mail_host.example"}) {
+        EXPECT_FALSE(KAAcceptedCertificates::isAccepted(host, chain)) << host;
+        KAAcceptedCertificates::accept(host, chain);
+        EXPECT_TRUE(KAAcceptedCertificates::isAccepted(host, chain)) << host;
+    }
+    EXPECT_FALSE(KAAcceptedCertificates::isAccepted("::2", chain));
 }
 
 TEST(KAAcceptedCertificatesTest, HostsAreComparedInAnyCase)
