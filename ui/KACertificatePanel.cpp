@@ -83,12 +83,15 @@ bool refused(const QString &reason)
 bool KAShowCertificatePanelForError(const KAError &error, const QString &title)
 {
     const QUrl url = error.userInformation().value(KAError::failingURLKey).toUrl();
-    const auto chain = error.userInformation().value(KAError::peerCertificateChainKey).value<QList<QSslCertificate>>();
-    if (url.isEmpty() || chain.isEmpty())
+    const QVariant peerChain = error.userInformation().value(KAError::peerCertificateChainKey);
+    if (url.isEmpty() || !peerChain.canConvert<QList<QSslCertificate>>())
         return refused(QStringLiteral("*** Error object %1 in unexpected format.").arg(error.description()));
     const QString host = url.host();
     if (host.isEmpty())
         return refused(QStringLiteral("*** SSL policy creation failed: the URL names no host."));
+    const auto chain = peerChain.value<QList<QSslCertificate>>();
+    if (chain.isEmpty())
+        return refused(QStringLiteral("*** Trust creation failed: the chain holds no certificate."));
     if (std::any_of(chain.begin(), chain.end(), [](const auto &certificate) { return certificate.isNull(); }))
         return refused(QStringLiteral("*** Trust creation failed: the chain holds what is no certificate."));
     if (!qobject_cast<QApplication *>(QCoreApplication::instance()))

@@ -44,7 +44,7 @@ QString withBreaks(const QString &text)
     for (const QChar letter : text) {
         word = letter.isSpace() ? 0 : word + 1;
         broken += letter;
-        if (word == kLongestWord) {
+        if (word >= kLongestWord && !letter.isHighSurrogate()) {
             broken += zeroWidthSpace;
             word = 0;
         }

@@ -98,6 +98,23 @@ TEST(KACertificatePanelTest, AChainWithoutCertificatesFailsTheTrust)
     EXPECT_TRUE(log.messages().value(0).startsWith("*** Trust creation failed"));
 }
 
+TEST(KACertificatePanelTest, AnEmptyChainIsAChainAndFailsTheTrust)
+{
+    const kavell::test::LogCapture log;
+    EXPECT_FALSE(KAShowCertificatePanelForError(errorFor("https://mail.example/", {}), "Title"));
+    EXPECT_EQ(log.messages(), QStringList({"*** Trust creation failed: the chain holds no certificate."}));
+}
+
+TEST(KACertificatePanelTest, WhatIsNoListOfCertificatesIsNoChain)
+{
+    const kavell::test::LogCapture log;
+    const KAError error(
+        "Example", -1202,
+        {{KAError::failingURLKey, QUrl("https://mail.example/")}, {KAError::peerCertificateChainKey, "chain"}});
+    EXPECT_FALSE(KAShowCertificatePanelForError(error, "Title"));
+    EXPECT_EQ(log.messages(), QStringList({"*** Error object Error Example -1202 in unexpected format."}));
+}
+
 TEST(KACertificatePanelTest, AChainThatHoldsMoreThanCertificatesFailsTheTrust)
 {
     const kavell::test::LogCapture log;
@@ -200,6 +217,22 @@ TEST(KACertificatePanelTest, TheLongestHostNameNeitherWidensThePanelNorIsCutOff)
     EXPECT_EQ(width, 560);
     EXPECT_EQ(missing, 0);
     EXPECT_TRUE(read.contains(host));
+}
+
+TEST(KACertificatePanelTest, ALongWordIsBrokenBetweenLettersOnly)
+{
+    // Each of the letters takes two units, which lie across the place of the break for one of the titles.
+    const QString letters = QString::fromUtf8("\U00010400").repeated(60);
+    for (const QString &title : {letters, "a" + letters}) {
+        QString message;
+        whenShown([&](QWidget *panel) {
+            message = textOf(panel, "message");
+            panel->close();
+        });
+        EXPECT_FALSE(KAShowCertificatePanelForError(errorFor("https://mail.example/", selfSignedChain()), title));
+        EXPECT_TRUE(message.contains(QChar(0x200B)));
+        EXPECT_TRUE(message.isValidUtf16());
+    }
 }
 
 TEST(KACertificatePanelTest, EachCodeHasItsInformativeText)
