@@ -216,6 +216,24 @@ TEST(KADNSServiceTest, WithoutTheCacheItIsNeitherReadNorWritten)
     EXPECT_EQ(server.queryCount("uncached.example"), 3);
 }
 
+TEST(KADNSServiceTest, AQueryThatCannotBeAskedIsSilentAndItsEmptyResultCached)
+{
+    const auto time = [] {
+        const kavell::test::LogCapture log;
+        setenv("KAVELL_DNS_SERVERS", "no.address.of.a.server", 1);
+        const auto taken = blockingTime("unaskable.example");
+        unsetenv("KAVELL_DNS_SERVERS");
+        EXPECT_TRUE(log.messages().isEmpty());
+        return taken;
+    }();
+    EXPECT_LT(time, 400ms);
+    DnsServer server;
+    server.addMailExchanger("unaskable.example", 10, "mx.example.org");
+    EXPECT_TRUE(asked("unaskable.example")->mailServers().isEmpty());
+    EXPECT_TRUE(server.queries().empty());
+    EXPECT_EQ(asked("unaskable.example", false)->mailServers(), QStringList({"mx.example.org."}));
+}
+
 TEST(KADNSServiceTest, AFailureToAttachIsLoggedAndItsEmptyResultCached)
 {
     DnsServer server;

@@ -1,6 +1,8 @@
 // SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
 
+#include <vector>
+
 #include <gtest/gtest.h>
 
 #include <kavellaccounts/KAAccountSetupInput.h>
@@ -24,7 +26,92 @@ QStringList fieldNames(const KAObject &object)
 const QStringList kInputFields{"_password", "_description",          "_userName",          "_autoconfigDefaults",
                                "_context",  "_continueThroughError", "_continueWithoutSSL"};
 
+/// A field by its getter and setter; the records have many that are alike.
+template <typename Record, typename Value> struct Field {
+    Value (Record::*get)() const;
+    void (Record::*set)(Value);
+};
+
+/// Each field has the resting value in a fresh record, and setting one changes it and no other.
+template <typename Record, typename Value>
+void expectSeparateFields(const std::vector<Field<Record, Value>> &fields, Value resting, Value value)
+{
+    for (size_t changed = 0; changed < fields.size(); ++changed) {
+        Record record;
+        for (const auto &field : fields)
+            EXPECT_EQ((record.*field.get)(), resting);
+        (record.*fields[changed].set)(value);
+        for (size_t index = 0; index < fields.size(); ++index)
+            EXPECT_EQ((record.*fields[index].get)(), index == changed ? value : resting) << changed << ", " << index;
+    }
+}
+
 }  // namespace
+
+TEST(SetupInput, EachFlagIsFalseAtFirstAndItsOwn)
+{
+    using Base = KAAccountSetupInput;
+    expectSeparateFields<Base, bool>({{&Base::continueThroughError, &Base::setContinueThroughError},
+                                      {&Base::continueWithoutSSL, &Base::setContinueWithoutSSL}},
+                                     false, true);
+    using Mail = KAMailAccountSetupInput;
+    expectSeparateFields<Mail, bool>({{&Mail::autoSSLEnabled, &Mail::setAutoSSLEnabled},
+                                      {&Mail::autoSSLOptional, &Mail::setAutoSSLOptional},
+                                      {&Mail::autoDeliverySSL, &Mail::setAutoDeliverySSL}},
+                                     false, true);
+    using Chat = KAChatAccountSetupInput;
+    expectSeparateFields<Chat, bool>(
+        {{&Chat::useSSL, &Chat::setUseSSL}, {&Chat::useKerberosV5, &Chat::setUseKerberosV5}}, false, true);
+    using Server = KAServerAccountSetupInput;
+    expectSeparateFields<Server, bool>({{&Server::enableMail, &Server::setEnableMail},
+                                        {&Server::enableJabber, &Server::setEnableJabber},
+                                        {&Server::enableCalDAV, &Server::setEnableCalDAV},
+                                        {&Server::enableCardDAV, &Server::setEnableCardDAV},
+                                        {&Server::enableVPN, &Server::setEnableVPN}},
+                                       false, true);
+    EXPECT_FALSE(KALDAPAccountSetupInput().authenticate());
+}
+
+TEST(SetupInput, PortsAreZeroAtFirst)
+{
+    EXPECT_EQ(KALDAPAccountSetupInput().port(), 0);
+    EXPECT_EQ(KAChatAccountSetupInput().serverPort(), 0);
+}
+
+TEST(SetupResult, EachFlagAndPortIsUnsetAtFirstAndItsOwn)
+{
+    using Mail = KAMailAccountSetupResult;
+    expectSeparateFields<Mail, bool>({{&Mail::receivingAlreadyExistsInMail, &Mail::setReceivingAlreadyExistsInMail},
+                                      {&Mail::sendingAlreadyExistsInMail, &Mail::setSendingAlreadyExistsInMail}},
+                                     false, true);
+    using Groupware = KAEWSAccountSetupResult;
+    expectSeparateFields<Groupware, bool>({{&Groupware::internalUseSSL, &Groupware::setInternalUseSSL},
+                                           {&Groupware::externalUseSSL, &Groupware::setExternalUseSSL}},
+                                          false, true);
+    expectSeparateFields<Groupware, qint64>({{&Groupware::internalPort, &Groupware::setInternalPort},
+                                             {&Groupware::externalPort, &Groupware::setExternalPort}},
+                                            0, 8443);
+    EXPECT_FALSE(KAChatAccountSetupResult().isExistingAccount());
+    EXPECT_FALSE(KAServerAccountSetupResult().isExistingAccount());
+}
+
+TEST(ChatService, EachFlagIsItsOwn)
+{
+    using Service = KAChatService;
+    const std::vector<Field<Service, bool>> flags{{&Service::showUsernameField, &Service::setShowUsernameField},
+                                                  {&Service::showPasswordField, &Service::setShowPasswordField},
+                                                  {&Service::showServerHostField, &Service::setShowServerHostField},
+                                                  {&Service::showServerPortField, &Service::setShowServerPortField},
+                                                  {&Service::showUseSSLCheckbox, &Service::setShowUseSSLCheckbox},
+                                                  {&Service::showKerberosCheckbox, &Service::setShowKerberosCheckbox}};
+    for (const auto &changed : flags) {
+        const auto service = KAChatService::initWithIdentifier("jabber");
+        const auto fresh = KAChatService::initWithIdentifier("jabber");
+        ((*service).*changed.set)(!((*fresh).*changed.get)());
+        for (const auto &flag : flags)
+            EXPECT_EQ(((*service).*flag.get)() != ((*fresh).*flag.get)(), flag.get == changed.get);
+    }
+}
 
 TEST(SetupInput, AFreshOneIsEmpty)
 {

@@ -76,6 +76,23 @@ TEST(KAVerticallyCenteredCellTest, ALineTallerThanTheFrameEnlargesIt)
     EXPECT_EQ(adjusted.width(), 50);
 }
 
+TEST(KAVerticallyCenteredCellTest, ANegativeInsetIsRoundedDownToo)
+{
+    KAVerticallyCenteredCell cell;
+    cell.setVerticallyCentered(true);
+    const QFontMetricsF metrics(cell.font());
+    const qreal line = metrics.ascent() + metrics.descent();
+    // Of two heights in succession at least one leaves a half, which goes to the line.
+    for (const int height : {1, 2}) {
+        const QRectF adjusted = cell.adjustFrameToVerticallyCenterText(QRectF(0, 10, 50, height));
+        const qreal inset = adjusted.top() - 10;
+        EXPECT_EQ(inset, std::floor(inset));
+        EXPECT_GE(adjusted.height(), line) << height;
+        EXPECT_LT(adjusted.height(), line + 2) << height;
+        EXPECT_EQ(adjusted.center().y(), 10 + height * 0.5);
+    }
+}
+
 TEST(KAVerticallyCenteredCellTest, WithoutCentringItDrawsExactlyAsItsBase)
 {
     for (const bool selected : {false, true})
