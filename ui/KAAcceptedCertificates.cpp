@@ -53,10 +53,10 @@ QByteArray fingerprint(const QList<QSslCertificate> &chain)
     return hash.result();
 }
 
-/// Which errors a connection goes on through: these when the chain is accepted for the host, else none. The toolkit keeps
-/// what was once ignored for as long as a reply is redirected and a connection is made anew, and another chain can have
-/// the same errors: those of an unknown authority. So a refusal says so, too, by an error that no connection has; an
-/// empty list would leave a reply's connection with what it has.
+/// Which errors a connection goes on through: these when the chain is accepted for the host, else none. The toolkit
+/// keeps what was once ignored for as long as a reply is redirected and a connection is made anew, and another chain can
+/// have the same errors: those of an unknown authority. So a refusal says so, too, by an error that no connection has;
+/// an empty list would leave a reply's connection with what it has.
 QList<QSslError> ignorable(const QString &host, const QList<QSslCertificate> &chain, const QList<QSslError> &errors)
 {
     return KAAcceptedCertificates::isAccepted(host, chain) ? errors : QList{QSslError(QSslError::NoError)};
