@@ -154,7 +154,8 @@ KAPluginManager::BundleReport KAPluginManager::loadBundle(const QString &path,
     if (identifiers && !identifiers->contains(identifier))
         return {path, identifier, Outcome::NotLoaded, QStringLiteral("It was not asked for.")};
     if (const KAPlugin *registered = _plugins.value(identifier)) {
-        const QString registeredPath = registered->bundle()->bundlePath();
+        const std::shared_ptr<KABundle> itsBundle = registered->bundle();  // which the plug-in may have let go of
+        const QString registeredPath = itsBundle ? itsBundle->bundlePath() : QString();
         if (registeredPath == bundle->bundlePath())
             return {path, identifier, Outcome::Registered, {}};
         return {path, identifier, Outcome::Shadowed, QStringLiteral("%1 came first.").arg(registeredPath)};

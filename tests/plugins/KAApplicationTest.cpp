@@ -184,8 +184,9 @@ TEST_F(InstalledApplication, UnknownIdentifiersHaveNone)
 
 TEST_F(InstalledApplication, MissingIconPathIsNotCached)
 {
+    manager.setCachedImagePath("/cached.png", kKAMailAppID);
     manager.setCachedImagePath({}, kKAMailAppID);
-    EXPECT_TRUE(manager.cachedImagePathForApp(kKAMailAppID).isNull());
+    EXPECT_EQ(manager.cachedImagePathForApp(kKAMailAppID), "/cached.png");
 }
 
 }  // namespace

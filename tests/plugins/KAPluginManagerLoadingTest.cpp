@@ -55,6 +55,19 @@ TEST_F(Loading, FirstDirectoryWinsSilently)
     EXPECT_THAT(log.messages(), IsEmpty());
 }
 
+TEST_F(Loading, PluginThatLetGoOfItsBundleStaysRegistered)
+{
+    const QString b = directory("b");
+    search(kBundles + "/good");
+    KAPlugin *const plugin = manager.pluginWithIdentifier(kExampleID);
+    ASSERT_TRUE(plugin);
+    plugin->setBundle(nullptr);
+    link("good/ExampleList.kaplugin", b + "/ExampleList.kaplugin");
+    search(b);
+    EXPECT_THAT(manager.allPlugins(), ElementsAre(plugin));
+    EXPECT_THAT(log.messages(), IsEmpty());
+}
+
 TEST_F(Loading, EmptyListSearchesNothing)
 {
     search(kBundles + "/Version0");
