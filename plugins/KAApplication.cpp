@@ -97,8 +97,9 @@ std::shared_ptr<QVariantMap> KAApplication::userInfo() const
 
 void KAApplication::setUserInfo(std::shared_ptr<QVariantMap> userInfo)
 {
+    // The former dictionary goes after the lock is given back: what it held may ask this application.
     const std::lock_guard lock(m_mutex);
-    _userInfo = std::move(userInfo);
+    _userInfo.swap(userInfo);
 }
 
 bool KAApplication::enabled() const
@@ -128,6 +129,7 @@ QString KAApplication::displayNameForData() const
 QImage KAApplication::image()
 {
     const QString path = imagePath();
+    const std::lock_guard lock(m_mutex);
     if (_image.isNull() && !path.isNull())
         _image = QImage(path);
     return _image.isNull() ? kavell::genericApplicationIcon() : _image;

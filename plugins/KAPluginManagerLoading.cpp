@@ -64,7 +64,7 @@ void logLoaderReason(const QString &executable)
         return;
     dlopen(QFile::encodeName(executable).constData(), RTLD_NOW);
     if (const char *reason = dlerror())
-        kavell::log(QStringLiteral("*** dlerror: ") + QString::fromUtf8(reason));
+        kavell::log(QStringLiteral("*** dlerror: ") + QString::fromLocal8Bit(reason));
 }
 
 /// Registered plug-ins belong to the main thread, whichever thread asked for them first.

@@ -53,6 +53,21 @@ TEST(KAApplication, NewOneHasItsIdentifierAndNothingElse)
     EXPECT_TRUE(fresh->userInfo()->isEmpty());
 }
 
+TEST(KAApplication, UserInformationThatGoesMayAskTheApplication)
+{
+    const auto mail = application(kKAMailAppID);
+    QString asked;
+    std::shared_ptr<int> guest(new int(0), [&](int *number) {
+        delete number;
+        asked = mail->bundleID();
+        static_cast<void>(mail->enabled());
+    });
+    mail->setUserInfo(std::make_shared<QVariantMap>(QVariantMap{{"guest", QVariant::fromValue(guest)}}));
+    guest.reset();
+    mail->setUserInfo(nullptr);
+    EXPECT_EQ(asked, kKAMailAppID);
+}
+
 TEST(KAApplication, UserInformationIsSharedByItsHolders)
 {
     const auto shared = application(kOther);
