@@ -190,8 +190,10 @@ QString KAPluginManager::cachedDisplayNameForApp(const QString &appBundleID) con
 void KAPluginManager::describeFields(KAFieldList &fields) const
 {
     const std::lock_guard lock(m_registryLock);
+    // A copy: a plug-in that is asked for its description may ask for others, which may be loaded then.
+    const auto registered = _plugins;
     QVariantMap plugins;
-    for (auto plugin = _plugins.begin(); plugin != _plugins.end(); ++plugin)
+    for (auto plugin = registered.begin(); plugin != registered.end(); ++plugin)
         plugins.insert(plugin.key(), plugin.value()->description());
     const auto texts = [](const QHash<QString, QString> &cache) {
         QVariantMap map;

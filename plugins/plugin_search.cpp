@@ -116,6 +116,7 @@ void PluginDirectory::forEachUnsettledBundle(const std::function<bool(const std:
     const OpenDirectory directory(opendir(m_listed->c_str()));
     if (!directory)
         return;
+    const std::string prefix = m_listed->ends_with('/') ? *m_listed : *m_listed + '/';
     std::string information;
     while (const dirent *entry = readdir(directory.get())) {
         const std::string_view name = entry->d_name;
@@ -131,7 +132,7 @@ void PluginDirectory::forEachUnsettledBundle(const std::function<bool(const std:
             continue;
         // The name is copied first: the call may search again and list this directory within itself.
         const std::string bundleName(name);
-        if (examine(*m_listed + '/' + bundleName))
+        if (examine(prefix + bundleName))
             m_settled.insert_or_assign(bundleName, identity);
     }
 }

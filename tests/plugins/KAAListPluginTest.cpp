@@ -63,6 +63,16 @@ TEST(KAAListPlugin, HasTheseDefaults)
     EXPECT_FALSE(plugin.shouldShowMigrationSyncAlertForService(kKAServiceIMAP));
 }
 
+TEST(KAAListPlugin, WhatAPluginMayReactToDoesNothing)
+{
+    OpenPlugin plugin(nullptr);
+    EXPECT_NO_THROW(plugin.continueButton(nullptr));
+    EXPECT_NO_THROW(plugin.signInAccount(nullptr, nullptr));
+    EXPECT_NO_THROW(plugin.createAccountInWindowWithWayfenArgs(nullptr, {}));
+    EXPECT_NO_THROW(plugin.configViewDidLoad());
+    EXPECT_NO_THROW(plugin.configViewWillLoad());
+}
+
 TEST(KAAListPlugin, OwnStringsAreNullWithoutTranslation)
 {
     const OpenPlugin plugin(bundleNamed("Working/Working.kaplugin"));

@@ -113,7 +113,7 @@ TEST(KAApplication, DataIsNamedInTheUsersLanguage)
     EXPECT_EQ(application("com.corvane.mail")->displayNameForData(), "Mail");
     EXPECT_EQ(application("com.corvane.Cardell")->displayNameForData(), "Contacts");
     EXPECT_EQ(application("com.corvane.Tidewell")->displayNameForData(), "Calendars");
-    EXPECT_FALSE(application("com.corvane.Parlex")->displayNameForData().isEmpty());
+    EXPECT_EQ(application("com.corvane.Parlex")->displayNameForData(), "Messages");
     EXPECT_TRUE(application(kOther)->displayNameForData().isNull());
 }
 

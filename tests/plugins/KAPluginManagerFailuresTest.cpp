@@ -70,9 +70,12 @@ TEST_F(Failing, BundleWithoutItsLibraryIsLoggedAndSkipped)
     EXPECT_THAT(identifiers(), ElementsAre("working"));
     const QStringList messages = log.messages();
     ASSERT_EQ(messages.size(), 3);
-    EXPECT_TRUE(messages[0].startsWith("*** Loading bundle at path " + place("Lost") + " failed with error: "));
-    EXPECT_TRUE(messages[1].startsWith("*** dlerror: "));
-    EXPECT_TRUE(messages[1].contains("libNoSuchFile.so"));
+    const QString prefix = "*** dlerror: ";
+    ASSERT_TRUE(messages[1].startsWith(prefix));
+    const QString reason = messages[1].mid(prefix.size());
+    EXPECT_TRUE(reason.contains("libNoSuchFile.so"));
+    EXPECT_EQ(messages[0], "*** Loading bundle at path " + place("Lost") + " failed with error: " + reason +
+                               "\n{KALocalizedDescription = " + reason + ";}");
     EXPECT_EQ(messages[2], "*** Loading bundle at path " + place("Lost") + " failed");
 }
 
@@ -161,6 +164,31 @@ TEST_F(Failing, PluginMadeOutsideTheRegistryMustHaveIdentifierVersionAndCode)
     makeBundle(place("Unknown"), entries("unknown", "NobodysClass"));
     EXPECT_FALSE(manager.createKAPluginAtPath(place("Unknown")));
     EXPECT_EQ(log.messages().size(), 1);
+}
+
+TEST_F(Failing, PluginMadeOutsideTheRegistryWhoseCodeIsMissingIsLoggedWithItsReasonsOnly)
+{
+    makeBundle(place("Lost"), entries("lost"), "libNoSuchFile.so");
+    EXPECT_FALSE(manager.createKAPluginAtPath(place("Lost")));
+    const QStringList messages = log.messages();
+    ASSERT_EQ(messages.size(), 2);
+    EXPECT_TRUE(messages[0].startsWith("*** Loading bundle at path " + place("Lost") + " failed with error: "));
+    EXPECT_TRUE(messages[1].startsWith("*** dlerror: "));
+}
+
+TEST_F(Failing, ADirectoryWrittenWithASlashAtItsEndNamesItsBundlesWithOne)
+{
+    makeBundle(place("Old"), entries("old", "Working", "<integer>0</integer>"));
+    makeBundle(place("Working"), entries("working"));
+    search(scratch.filePath("a") + '/');
+    EXPECT_THAT(identifiers(), ElementsAre("working"));
+    EXPECT_THAT(log.messages(),
+                ElementsAre("*** Unsupported plugin version: " + place("Old") + ". Min version: 1. Found version: 0"));
+    for (const auto &report : manager.surveyBundles()) {
+        if (report.identifier == "working") {
+            EXPECT_EQ(report.outcome, KAPluginManager::BundleReport::Outcome::Registered);
+        }
+    }
 }
 
 TEST_F(Failing, NullPathIsLoggedAsNone)

@@ -246,11 +246,14 @@ TEST(KAPluginManager, FindsAccountsByUidOverAllPlugins)
     KAPluginManager *const manager = KAPluginManager::shared();
     ASSERT_TRUE(manager->accountWithUID(other->uid()));
     EXPECT_EQ(manager->accountWithUID(other->uid())->loginName(), "bert");
+    ASSERT_TRUE(manager->accountWithUID(listed->uid()));
+    EXPECT_EQ(manager->accountWithUID(listed->uid())->loginName(), "anna");
     EXPECT_FALSE(manager->accountWithUID("none"));
     ASSERT_TRUE(manager->aListAccountContainingChildUID("child-1"));
     EXPECT_EQ(manager->aListAccountContainingChildUID("child-1")->loginName(), "anna");
     EXPECT_FALSE(manager->aListAccountContainingChildUID("child-2"));  // not of the account list
     ASSERT_TRUE(manager->childAccountWithUID("child-1"));
     EXPECT_EQ(manager->childAccountWithUID("child-1")->value("pluginID"), kKAMailPluginID);
+    EXPECT_FALSE(manager->childAccountWithUID("child-2"));
     EXPECT_FALSE(manager->childAccountWithUID("none"));
 }
