@@ -18,11 +18,16 @@ namespace {
 const QString kUIDKey = QStringLiteral("uid");
 const QString kPluginIDKey = QStringLiteral("pluginID");
 
+bool isDictionary(const QVariant &value)
+{
+    return value.metaType().id() == QMetaType::QVariantMap;
+}
+
 /// The children by UID; nothing for an account that never had one.
 std::optional<QVariantMap> childrenOf(const KAAccount &account)
 {
     const QVariant children = account.providerAttributeForKey(kKAAccountSettingChildAccounts);
-    return children.metaType().id() == QMetaType::QVariantMap ? std::optional(children.toMap()) : std::nullopt;
+    return isDictionary(children) ? std::optional(children.toMap()) : std::nullopt;
 }
 
 /// Whether a child belongs to the plug-in. One without a plug-in identifier belongs to nobody, which differs from an
@@ -31,11 +36,6 @@ bool belongsTo(const QVariant &child, const QString &pluginID)
 {
     const QString own = textForKey(child.toMap(), kPluginIDKey);
     return !own.isNull() && !pluginID.isNull() && own == pluginID;
-}
-
-bool isDictionary(const QVariant &value)
-{
-    return value.metaType().id() == QMetaType::QVariantMap;
 }
 
 /// Whether the client application keeps the child's account inactive. Only its plug-in knows; one that is not loaded is

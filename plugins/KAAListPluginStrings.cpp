@@ -11,19 +11,14 @@
 #include <kavellaccounts/KABundle.h>
 #include <kavellaccounts/KAConstants.h>
 
+#include "plugins/data_names.h"
+
 namespace {
 
 struct KeyRow {
-    const QString &subject;
+    const QString &service;
     const char *key;
 };
-
-const std::array<KeyRow, 4> kApplicationKeys{{
-    {kKAMailAppID, "MAIL_DATA_NAME"},
-    {kKATidewellAppID, "CALENDAR_DATA_NAME"},
-    {kKAParlexAppID, "PARLEX_DATA_NAME"},
-    {kKACardellAppID, "CD_DATA_NAME"},
-}};
 
 const std::array<KeyRow, 9> kServiceKeys{{
     {kKAServiceIMAP, "SERVICE_DISPLAY_NAME_MAIL"},
@@ -37,11 +32,11 @@ const std::array<KeyRow, 9> kServiceKeys{{
     {kKAServiceExchangeContacts, "SERVICE_DISPLAY_NAME_CONTACTS"},
 }};
 
-/// The key of a subject; null when the table has none.
-template <size_t Count> QString keyFor(const std::array<KeyRow, Count> &rows, const QString &subject)
+/// The key of a service's name; null for a service without one.
+QString serviceKey(const QString &service)
 {
-    for (const KeyRow &row : rows) {
-        if (row.subject == subject)
+    for (const KeyRow &row : kServiceKeys) {
+        if (row.service == service)
             return QString::fromLatin1(row.key);
     }
     return {};
@@ -88,14 +83,14 @@ QString KAAListPlugin::displayNameForApplication(const std::shared_ptr<KAApplica
 {
     if (!application)
         return {};
-    const QString key = keyFor(kApplicationKeys, application->bundleID());
+    const QString key = kavell::dataNameKey(application->bundleID());
     const QString own = key.isNull() ? QString() : textInBundle(bundle(), key);
     return own.isNull() ? application->displayNameForData() : own;
 }
 
 QString KAAListPlugin::serviceDisplayNameForService(const QString &service) const
 {
-    const QString key = keyFor(kServiceKeys, service);
+    const QString key = serviceKey(service);
     if (key.isNull())
         return {};
     if (QString own = textInBundle(bundle(), key); !own.isNull())

@@ -11,6 +11,7 @@
 #include <kavellaccounts/KAFieldList.h>
 
 #include "platform/qt/workspace.h"
+#include "plugins/data_names.h"
 
 namespace {
 
@@ -41,6 +42,12 @@ const ApplicationRow *rowOf(const QString &bundleID)
 }
 
 }  // namespace
+
+QString kavell::dataNameKey(const QString &appBundleID)
+{
+    const ApplicationRow *const row = rowOf(appBundleID);
+    return row ? QString::fromLatin1(row->dataNameKey) : QString();
+}
 
 std::shared_ptr<KAApplication> KAApplication::initWithBundleID(const QString &bundleID)
 {
@@ -122,8 +129,7 @@ int KAApplication::sortValue() const
 
 QString KAApplication::displayNameForData() const
 {
-    const ApplicationRow *const row = rowOf(bundleID());
-    return row ? KABundle::libraryBundle()->localizedString(QString::fromUtf8(row->dataNameKey)) : QString();
+    return KABundle::libraryBundle()->localizedString(kavell::dataNameKey(bundleID()));
 }
 
 QImage KAApplication::image()

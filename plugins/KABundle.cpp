@@ -16,6 +16,7 @@
 #include <kavellaccounts/KAFieldList.h>
 #include <kavellaccounts/KAPlugin.h>
 
+#include "model/settings_reading.h"
 #include "platform/qt/string_table.h"
 #include "plugins/information_dictionary.h"
 #include "plugins/plugin_search.h"
@@ -30,6 +31,7 @@ const QString kLibraryResources = QStringLiteral(":/kavellaccounts");
 
 enum LoadErrorCode { kNamesNoExecutable = 1, kLoaderRefused = 2 };
 
+using kavell::textForKey;
 using Factory = KAPlugin *(*)(const std::shared_ptr<KABundle> &);
 
 /// Of a regular file; nothing for all else.
@@ -38,14 +40,7 @@ std::optional<kavell::FileIdentity> identityOfFile(const QString &path)
     struct stat status;
     if (stat(QFile::encodeName(path).constData(), &status) != 0 || !S_ISREG(status.st_mode))
         return std::nullopt;
-    return kavell::FileIdentity{status.st_dev, status.st_ino, status.st_size, status.st_mtim};
-}
-
-/// A text of the dictionary; null when it is missing or no text.
-QString textIn(const QVariantMap &information, const QString &key)
-{
-    const QVariant value = information.value(key);
-    return value.metaType() == QMetaType::fromType<QString>() ? value.toString() : QString();
+    return kavell::FileIdentity::of(status);
 }
 
 }  // namespace
@@ -129,7 +124,7 @@ QString KABundle::bundlePath() const
 
 QString KABundle::bundleIdentifier() const
 {
-    return textIn(m_contents->information, kIdentifierKey);
+    return textForKey(m_contents->information, kIdentifierKey);
 }
 
 QVariantMap KABundle::infoDictionary() const
@@ -164,7 +159,7 @@ QString KABundle::pathForResource(const QString &name, const QString &type) cons
 
 QString KABundle::executablePath() const
 {
-    const QString name = textIn(m_contents->information, kExecutableKey);
+    const QString name = textForKey(m_contents->information, kExecutableKey);
     if (name.isEmpty())
         return {};
     return m_contents->path + QLatin1String("/Contents/Linux-" KAVELL_ARCHITECTURE "/") + name;
@@ -193,7 +188,7 @@ bool KABundle::load(KAError *error)
 
 std::unique_ptr<KAPlugin> KABundle::makePrincipalObject(const std::shared_ptr<KABundle> &self)
 {
-    const QString className = textIn(m_contents->information, kPrincipalClassKey);
+    const QString className = textForKey(m_contents->information, kPrincipalClassKey);
     Factory factory = nullptr;
     {
         const std::lock_guard lock(m_contents->loading);

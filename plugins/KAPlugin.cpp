@@ -9,6 +9,7 @@
 #include <kavellaccounts/KAFieldList.h>
 #include <kavellaccounts/KAProvider.h>
 
+#include "model/settings_reading.h"
 #include "platform/qt/workspace.h"
 
 namespace {
@@ -85,8 +86,8 @@ QString KAPlugin::userVisibleProviderName() const
         return {};
     if (QString localized = own->localizedInfoForKey(kBundleNameKey); !localized.isNull())
         return localized;
-    const QVariant plain = own->infoDictionary().value(kBundleNameKey);
-    return plain.metaType() == QMetaType::fromType<QString>() ? plain.toString() : identifier();
+    const QString plain = kavell::textForKey(own->infoDictionary(), kBundleNameKey);
+    return plain.isNull() ? identifier() : plain;
 }
 
 void KAPlugin::willSelectAccount(const std::shared_ptr<KAAccount> &)

@@ -1,6 +1,5 @@
 // SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
-
 //
 // From services to applications and plug-ins, and from UIDs to accounts.
 

@@ -7,7 +7,6 @@
 #include <QtCore/QScopeGuard>
 #include <QtCore/QThread>
 #include <algorithm>
-#include <cstdlib>
 #include <dlfcn.h>
 #include <memory>
 #include <sys/stat.h>
@@ -17,6 +16,7 @@
 #include <kavellaccounts/KAPlugin.h>
 #include <kavellaccounts/KAPluginManager.h>
 
+#include "model/settings_reading.h"
 #include "platform/qt/exception_text.h"
 #include "platform/qt/log.h"
 #include "plugins/plugin_search.h"
@@ -26,24 +26,12 @@ using Outcome = KAPluginManager::BundleReport::Outcome;
 namespace {
 
 constexpr int kMinimumVersion = 1;
-constexpr double kLargest = 1e18;  // a conversion to whole numbers is not defined for numbers much larger
 const QString kVersionKey = QStringLiteral("KAPluginVersion");
-
-/// The whole number that a text begins with; 0 when it begins with none.
-qlonglong leadingInteger(const QString &text)
-{
-    return std::strtoll(text.toUtf8().constData(), nullptr, 10);
-}
 
 /// Parts of a number count for nothing, so that no version below 1 passes by being rounded up.
 qlonglong versionOf(const KABundle &bundle)
 {
-    const QVariant version = bundle.infoDictionary().value(kVersionKey);
-    if (version.metaType() == QMetaType::fromType<QString>())
-        return leadingInteger(version.toString());
-    if (version.metaType() == QMetaType::fromType<double>())
-        return static_cast<qlonglong>(qBound(-kLargest, version.toDouble(), kLargest));
-    return version.toLongLong();
+    return kavell::integerForKey(bundle.infoDictionary(), kVersionKey);
 }
 
 bool hasSupportedVersion(const KABundle &bundle, const QString &path)
@@ -65,6 +53,18 @@ void logLoaderReason(const QString &executable)
     dlopen(QFile::encodeName(executable).constData(), RTLD_NOW);
     if (const char *reason = dlerror())
         kavell::log(QStringLiteral("*** dlerror: ") + QString::fromLocal8Bit(reason));
+}
+
+/// The bundle's object; null with the error, and its lines in the log, when the code does not load, and without one when
+/// the code makes no object.
+std::unique_ptr<KAPlugin> makeObject(const std::shared_ptr<KABundle> &bundle, KAError &error)
+{
+    if (bundle->load(&error))
+        return bundle->makePrincipalObject(bundle);
+    kavell::log(QStringLiteral("*** Loading bundle at path %1 failed with error: %2\n%3")
+                    .arg(bundle->bundlePath(), error.description(), KADescription(QVariant(error.userInformation()))));
+    logLoaderReason(bundle->executablePath());
+    return nullptr;
 }
 
 /// Registered plug-ins belong to the main thread, whichever thread asked for them first.
@@ -170,11 +170,11 @@ KAPluginManager::BundleReport KAPluginManager::loadBundle(const QString &path,
     }
     m_search->identifiersBeingLoaded += identifier;
     const auto loaded = qScopeGuard([&] { m_search->identifiersBeingLoaded.removeOne(identifier); });
-    std::unique_ptr<KAPlugin> plugin = _createPluginFromBundle(bundle);
+    KAError error;
+    std::unique_ptr<KAPlugin> plugin = makeObject(bundle, error);
     if (!plugin) {
         kavell::log(QStringLiteral("*** Loading bundle at path %1 failed").arg(path));
-        KAError error;
-        if (!bundle->load(&error))
+        if (!error.isNull())
             return {path, identifier, Outcome::NotLoaded, error.description()};
         return {path, identifier, Outcome::NoObject,
                 QStringLiteral("Its code makes no object of the class that KABundlePrincipalClass names.")};
@@ -187,15 +187,8 @@ KAPluginManager::BundleReport KAPluginManager::loadBundle(const QString &path,
 
 std::unique_ptr<KAPlugin> KAPluginManager::_createPluginFromBundle(const std::shared_ptr<KABundle> &bundle)
 {
-    if (!bundle)
-        return nullptr;
     KAError error;
-    if (bundle->load(&error))
-        return bundle->makePrincipalObject(bundle);
-    kavell::log(QStringLiteral("*** Loading bundle at path %1 failed with error: %2\n%3")
-                    .arg(bundle->bundlePath(), error.description(), KADescription(QVariant(error.userInformation()))));
-    logLoaderReason(bundle->executablePath());
-    return nullptr;
+    return bundle ? makeObject(bundle, error) : nullptr;
 }
 
 std::unique_ptr<KAPlugin> KAPluginManager::createKAPluginAtPath(const QString &path)

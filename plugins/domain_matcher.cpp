@@ -12,6 +12,8 @@
 
 #include <QtCore/QStringList>
 
+#include "model/settings_reading.h"
+
 namespace kavell {
 
 namespace {
@@ -31,13 +33,6 @@ QStringList textsIn(const QVariantMap &map, const QString &key)
             texts += value.toString();
     }
     return texts;
-}
-
-/// A text of the dictionary; null when it is missing or no text.
-QString textIn(const QVariantMap &map, const QString &key)
-{
-    const QVariant value = map.value(key);
-    return value.metaType() == QMetaType::fromType<QString>() ? value.toString() : QString();
 }
 
 /// An entry that begins with another adds nothing to what that one claims.
@@ -91,7 +86,7 @@ bool beginsWithAnEntry(const std::vector<QString> &table, QStringView text)
 }  // namespace
 
 DomainMatcher::DomainMatcher(const QVariantMap &domains)
-    : m_domains(domains), m_exact(textIn(domains, kMatchKey) == kExactMatch)
+    : m_domains(domains), m_exact(textForKey(domains, kMatchKey) == kExactMatch)
 {
     const QStringList exceptions = textsIn(domains, kExceptionsKey);
     for (const QString &exception : exceptions) {

@@ -125,8 +125,7 @@ void PluginDirectory::forEachUnsettledBundle(const std::function<bool(const std:
         information.assign(name).append(kInformation);
         struct stat status;
         const bool known = fstatat(dirfd(directory.get()), information.c_str(), &status, 0) == 0;
-        const FileIdentity identity =
-            known ? FileIdentity{status.st_dev, status.st_ino, status.st_size, status.st_mtim} : FileIdentity{};
+        const FileIdentity identity = known ? FileIdentity::of(status) : FileIdentity{};
         const auto settled = m_settled.find(name);
         if (settled != m_settled.end() && settled->second == identity)
             continue;

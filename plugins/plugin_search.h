@@ -37,6 +37,11 @@ struct FileIdentity {
     off_t size = 0;
     timespec modified{};
 
+    [[nodiscard]] static FileIdentity of(const struct stat &status)
+    {
+        return {status.st_dev, status.st_ino, status.st_size, status.st_mtim};
+    }
+
     friend bool operator==(const FileIdentity &first, const FileIdentity &second)
     {
         return first.inode == second.inode && first.device == second.device && first.size == second.size &&
