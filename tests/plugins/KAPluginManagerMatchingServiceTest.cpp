@@ -15,9 +15,9 @@ protected:
     void SetUp() override
     {
         kavell::test::MatchingTest::SetUp();
-        addPlugin(kKANimbrelPluginID, kKAProviderNimbrel, {"nimbrel.example"});
-        addPlugin(kKAQuillanePluginID, kKAProviderQuillane);
-        addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
+        addListPlugin(kKANimbrelPluginID, kKAProviderNimbrel, {"nimbrel.example"});
+        addListPlugin(kKAQuillanePluginID, kKAProviderQuillane);
+        addListPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
         for (const QString &provider : {kKAProviderNimbrel, kKAProviderQuillane, kKAProviderYahoo}) {
             for (const char *login : {"anna", "brondel-bert"})
                 addAccount(provider, login);

@@ -17,8 +17,6 @@ namespace {
 
 class Matching : public kavell::test::MatchingTest {};
 class MatchingMail : public kavell::test::MatchingTest {};
-class MatchingCalendars : public kavell::test::MatchingTest {};
-class MatchingContacts : public kavell::test::MatchingTest {};
 class MatchingChat : public kavell::test::MatchingTest {};
 
 /// Each of the plug-ins that a set-up input can lead to, with an account of the same login name.
@@ -26,8 +24,8 @@ class MatchingSetupInput : public kavell::test::MatchingTest {
 protected:
     MatchingSetupInput()
     {
-        addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
-        addPlugin(kKAGooglePluginID, kKAProviderGoogle);
+        addListPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
+        addListPlugin(kKAGooglePluginID, kKAProviderGoogle);
     }
 
     static QString matching(const std::shared_ptr<KAAccountSetupInput> &input)
@@ -42,7 +40,7 @@ protected:
 
 TEST_F(MatchingMail, WithoutUserNameAndAddressNoPluginIsAsked)
 {
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo);
+    addListPlugin(kKAYahooPluginID, kKAProviderYahoo);
     KADecisionTrace trace;
     EXPECT_FALSE(manager()._matchingAlistAccountForMailAccountSettings(
         {{"incomingMailServer", "mail.zorbo.example"}, {"KAAccountTypeKey", "kKAServiceExchangeMail"}}, &trace));
@@ -52,14 +50,14 @@ TEST_F(MatchingMail, WithoutUserNameAndAddressNoPluginIsAsked)
 
 TEST_F(MatchingMail, TheUserNameOfTheAddressStandsInForAMissingOne)
 {
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
+    addListPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
     addAccount(kKAProviderYahoo, "anna");
     EXPECT_EQ(mail({{"emailAddress", "anna@zorbo.example"}}), "anna at com.corvane.account.yahoo");
 }
 
 TEST_F(MatchingMail, AUserNameThatIsThereAndEmptyIsNotMissing)
 {
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
+    addListPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
     addAccount(kKAProviderYahoo, "anna");
     const QVariantMap settings{{"userName", ""}, {"emailAddress", "anna@zorbo.example"}};
     EXPECT_EQ(mail(settings), "none");
@@ -69,8 +67,8 @@ TEST_F(MatchingMail, AUserNameThatIsThereAndEmptyIsNotMissing)
 
 TEST_F(MatchingMail, ThePluginIsChosenByTheAddressAndNotByTheServer)
 {
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
-    addPlugin(kKAGooglePluginID, kKAProviderGoogle, {"other.example"});
+    addListPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
+    addListPlugin(kKAGooglePluginID, kKAProviderGoogle, {"other.example"});
     addAccount(kKAProviderYahoo, "anna");
     addAccount(kKAProviderGoogle, "anna");
     EXPECT_EQ(mail({{"emailAddress", "anna@zorbo.example"}, {"incomingMailServer", "imap.other.example"}}),
@@ -79,8 +77,8 @@ TEST_F(MatchingMail, ThePluginIsChosenByTheAddressAndNotByTheServer)
 
 TEST_F(MatchingMail, ARegisteredServerComesBeforeTheDomainOfTheAddress)
 {
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
-    addPlugin(kKAHaldenServerPluginID, kKAProviderHaldenServer);
+    addListPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
+    addListPlugin(kKAHaldenServerPluginID, kKAProviderHaldenServer);
     addAccount(kKAProviderYahoo, "anna");
     addAccount(kKAProviderHaldenServer, "anna");
     KAAddHaldenServer("mail.work.example", QStringList{kKAServiceIMAP});
@@ -90,7 +88,7 @@ TEST_F(MatchingMail, ARegisteredServerComesBeforeTheDomainOfTheAddress)
 
 TEST_F(MatchingMail, TriesTheUserNameThenTheAddressThenTheUserNameAtTheServer)
 {
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
+    addListPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
     const QVariantMap settings{
         {"userName", "u"}, {"emailAddress", "u2@zorbo.example"}, {"incomingMailServer", "imap.zorbo.example"}};
     addAccount(kKAProviderYahoo, "u@imap.zorbo.example");
@@ -103,7 +101,7 @@ TEST_F(MatchingMail, TriesTheUserNameThenTheAddressThenTheUserNameAtTheServer)
 
 TEST_F(MatchingMail, WithoutAServerThereIsNoThirdLookUp)
 {
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
+    addListPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
     addAccount(kKAProviderYahoo, "u@");
     EXPECT_EQ(mail({{"userName", "u"}, {"emailAddress", "u2@zorbo.example"}}), "none");
     EXPECT_EQ(mail({{"userName", "u"}, {"emailAddress", "u2@zorbo.example"}, {"incomingMailServer", ""}}),
@@ -112,8 +110,8 @@ TEST_F(MatchingMail, WithoutAServerThereIsNoThirdLookUp)
 
 TEST_F(MatchingMail, AnAddressThatNobodyClaimsIsDecidedByTheAccountType)
 {
-    addPlugin(kKAHaldenServerPluginID, kKAProviderHaldenServer);
-    addPlugin(kKAExchangePluginID, kKAProviderExchange);
+    addListPlugin(kKAHaldenServerPluginID, kKAProviderHaldenServer);
+    addListPlugin(kKAExchangePluginID, kKAProviderExchange);
     addAccount(kKAProviderHaldenServer, "anna");
     addAccount(kKAProviderExchange, "anna");
     const auto withType = [](const QVariant &type) {
@@ -127,7 +125,7 @@ TEST_F(MatchingMail, AnAddressThatNobodyClaimsIsDecidedByTheAccountType)
 
 TEST_F(MatchingMail, AServerPathMarksAnExchangeAccountUnlessItIsEmpty)
 {
-    addPlugin(kKAExchangePluginID, kKAProviderExchange);
+    addListPlugin(kKAExchangePluginID, kKAProviderExchange);
     addAccount(kKAProviderExchange, "anna");
     EXPECT_EQ(mail({{"userName", "anna"}, {"serverRootPath", "/EWS"}}), "anna at com.corvane.account.exchange");
     EXPECT_EQ(mail({{"userName", "anna"}, {"serverRootPath", ""}}), "none");
@@ -135,8 +133,8 @@ TEST_F(MatchingMail, AServerPathMarksAnExchangeAccountUnlessItIsEmpty)
 
 TEST_F(MatchingMail, AClaimedAddressIsNotDecidedByTheAccountType)
 {
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
-    addPlugin(kKAExchangePluginID, kKAProviderExchange);
+    addListPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
+    addListPlugin(kKAExchangePluginID, kKAProviderExchange);
     addAccount(kKAProviderExchange, "anna");
     EXPECT_EQ(mail({{"emailAddress", "anna@zorbo.example"}, {"KAAccountTypeKey", "kKAServiceExchangeMail"}}), "none");
 }
@@ -144,275 +142,40 @@ TEST_F(MatchingMail, AClaimedAddressIsNotDecidedByTheAccountType)
 TEST_F(MatchingMail, ADomainWhoseMailGoogleTakesInIsGoogles)
 {
     nameServer().addMailExchanger("hosted.example", 1, "alt1.aspmx.googlemail.com");
-    addPlugin(kKAGooglePluginID, kKAProviderGoogle);
+    addListPlugin(kKAGooglePluginID, kKAProviderGoogle);
     addAccount(kKAProviderGoogle, "anna@hosted.example");
     EXPECT_EQ(mail({{"emailAddress", "anna@hosted.example"}}), "anna@hosted.example at com.corvane.account.google");
 }
 
 TEST_F(MatchingMail, APluginThatIsNotInstalledOrHasNoProviderMatchesNothing)
 {
-    addPlugin(kKAYahooPluginID, {}, {"zorbo.example"});
+    addListPlugin(kKAYahooPluginID, {}, {"zorbo.example"});
     EXPECT_EQ(mail({{"emailAddress", "anna@zorbo.example"}}), "none");
     EXPECT_EQ(mail({{"userName", "anna"}, {"serverRootPath", "/EWS"}}), "none");
 }
 
 TEST_F(MatchingMail, NoAccountIsMade)
 {
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
+    addListPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
     EXPECT_EQ(mail({{"emailAddress", "anna@zorbo.example"}, {"incomingMailServer", "imap.zorbo.example"}}), "none");
     EXPECT_THAT(manager().providerOfType(kKAProviderYahoo)->accounts(), IsEmpty());
 }
 
 TEST_F(MatchingMail, ValuesThatAreNoTextCountAsMissing)
 {
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
+    addListPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
     addAccount(kKAProviderYahoo, "anna");
     EXPECT_EQ(mail({{"emailAddress", "anna@zorbo.example"}, {"userName", 7}}), "anna at com.corvane.account.yahoo");
-}
-
-// Calendars
-
-TEST_F(MatchingCalendars, ThePluginIsChosenByTheServer)
-{
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
-    addAccount(kKAProviderYahoo, "anna");
-    EXPECT_EQ(calendar({{"serverAddress", "DAV.zorbo.example/calendars"}, {"userName", "anna"}}),
-              "anna at com.corvane.account.yahoo");
-    EXPECT_EQ(calendar({{"serverAddress", "dav.other.example"}, {"userName", "anna"}}), "none");
-    EXPECT_EQ(calendar({{"emailAddress", "anna@zorbo.example"}, {"userName", "anna"}}), "none");
-}
-
-TEST_F(MatchingCalendars, TheDomainOfTheServerIsAskedForWithoutThePath)
-{
-    EXPECT_EQ(calendar({{"serverAddress", "DAV.Paths1.example/calendars"}, {"userName", "anna"}}), "none");
-    EXPECT_EQ(nameServer().queries(), std::vector<std::string>{"dav.paths1.example"});
-}
-
-TEST_F(MatchingCalendars, AUserNameThatIsAnAddressIsTriedInPartThenWhole)
-{
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
-    const QVariantMap settings{{"serverAddress", "dav.zorbo.example"},
-                               {"userName", "anna@zorbo.example"},
-                               {"emailAddress", "bert@zorbo.example"}};
-    addAccount(kKAProviderYahoo, "bert@zorbo.example");
-    EXPECT_EQ(calendar(settings), "none");
-    addAccount(kKAProviderYahoo, "anna@zorbo.example");
-    EXPECT_EQ(calendar(settings), "anna@zorbo.example at com.corvane.account.yahoo");
-    addAccount(kKAProviderYahoo, "anna");
-    EXPECT_EQ(calendar(settings), "anna at com.corvane.account.yahoo");
-}
-
-TEST_F(MatchingCalendars, TheAddressIsTriedAfterTheUserName)
-{
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
-    const QVariantMap settings{
-        {"serverAddress", "dav.zorbo.example"}, {"userName", "anna"}, {"emailAddress", "bert@zorbo.example"}};
-    addAccount(kKAProviderYahoo, "bert@zorbo.example");
-    EXPECT_EQ(calendar(settings), "bert@zorbo.example at com.corvane.account.yahoo");
-    addAccount(kKAProviderYahoo, "anna");
-    EXPECT_EQ(calendar(settings), "anna at com.corvane.account.yahoo");
-}
-
-TEST_F(MatchingCalendars, AServerThatNobodyClaimsMayBeRegistered)
-{
-    addPlugin(kKAHaldenServerPluginID, kKAProviderHaldenServer);
-    addPlugin(kKAExchangePluginID, kKAProviderExchange);
-    addAccount(kKAProviderHaldenServer, "anna");
-    addAccount(kKAProviderExchange, "anna");
-    KAAddHaldenServer("dav.work.example", QStringList{kKAServiceCalDAV});
-    const QVariantMap settings{{"serverAddress", "dav.work.example"},
-                               {"userName", "anna"},
-                               {"KAAccountTypeKey", "kKAServiceExchangeCalendar"}};
-    EXPECT_EQ(calendar(settings), "anna at com.corvane.account.haldenserver");
-    KARemoveHaldenServer("dav.work.example");
-    EXPECT_EQ(calendar(settings), "anna at com.corvane.account.exchange");
-}
-
-TEST_F(MatchingCalendars, TheTypeOfTheServerProductIsNotLookedAt)
-{
-    addPlugin(kKAHaldenServerPluginID, kKAProviderHaldenServer);
-    addAccount(kKAProviderHaldenServer, "anna");
-    EXPECT_EQ(calendar({{"serverAddress", "dav.work.example"},
-                        {"userName", "anna"},
-                        {"KAAccountTypeKey", "com.corvane.account.haldenserver"}}),
-              "none");
-}
-
-TEST_F(MatchingCalendars, ARegisteredServerInAClaimedDomainBelongsToTheClaimant)
-{
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
-    addPlugin(kKAHaldenServerPluginID, kKAProviderHaldenServer);
-    addAccount(kKAProviderYahoo, "anna");
-    addAccount(kKAProviderHaldenServer, "anna");
-    KAAddHaldenServer("dav.zorbo.example", QStringList{kKAServiceCalDAV});
-    EXPECT_EQ(calendar({{"serverAddress", "dav.zorbo.example"}, {"userName", "anna"}}),
-              "anna at com.corvane.account.yahoo");
-}
-
-TEST_F(MatchingCalendars, AServerInAClaimedDomainIsNotDecidedByTypeOrPath)
-{
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
-    addPlugin(kKAExchangePluginID, kKAProviderExchange);
-    addAccount(kKAProviderExchange, "anna");
-    EXPECT_EQ(calendar({{"serverAddress", "dav.zorbo.example"},
-                        {"userName", "anna"},
-                        {"serverRootPath", "/EWS"},
-                        {"KAAccountTypeKey", "kKAServiceExchangeCalendar"}}),
-              "none");
-}
-
-TEST_F(MatchingCalendars, TypeAndPathMarkAnExchangeAccount)
-{
-    addPlugin(kKAExchangePluginID, kKAProviderExchange);
-    addAccount(kKAProviderExchange, "anna");
-    EXPECT_EQ(calendar({{"userName", "anna"}, {"KAAccountTypeKey", "kKAServiceExchangeCalendar"}}),
-              "anna at com.corvane.account.exchange");
-    EXPECT_EQ(calendar({{"userName", "anna"}, {"serverRootPath", "/EWS"}}), "anna at com.corvane.account.exchange");
-    EXPECT_EQ(calendar({{"userName", "anna"}, {"KAAccountTypeKey", "kKAServiceExchangeMail"}}), "none");
-    EXPECT_EQ(calendar({{"userName", "anna"}, {"serverRootPath", ""}}), "none");
-}
-
-TEST_F(MatchingCalendars, AServerOfGoogleIsGooglesWhoeverListsIt)
-{
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"google.com"});
-    addPlugin(kKAGooglePluginID, kKAProviderGoogle);
-    addAccount(kKAProviderYahoo, "anna@zorbo.example");
-    addAccount(kKAProviderGoogle, "anna@zorbo.example");
-    EXPECT_EQ(calendar({{"serverAddress", "www.google.com/calendar"},
-                        {"userName", "anna"},
-                        {"emailAddress", "anna@zorbo.example"}}),
-              "anna@zorbo.example at com.corvane.account.google");
-}
-
-TEST_F(MatchingCalendars, AtGoogleTheUserNameIsNoLoginName)
-{
-    addPlugin(kKAGooglePluginID, kKAProviderGoogle);
-    addAccount(kKAProviderGoogle, "anna");
-    EXPECT_EQ(calendar({{"serverAddress", "www.google.com"}, {"userName", "anna"}}), "none");
-    EXPECT_EQ(
-        calendar({{"serverAddress", "www.google.com"}, {"userName", "anna"}, {"emailAddress", "anna@zorbo.example"}}),
-        "none");
-}
-
-TEST_F(MatchingCalendars, AnAccountOfGoogleWithoutAddressIsAtItsMailDomain)
-{
-    addPlugin(kKAGooglePluginID, kKAProviderGoogle);
-    addAccount(kKAProviderGoogle, "anna@gmail.com");
-    EXPECT_EQ(calendar({{"serverAddress", "www.google.com"}, {"userName", "anna"}}),
-              "anna@gmail.com at com.corvane.account.google");
-    EXPECT_EQ(calendar({{"serverAddress", "www.google.com"}, {"userName", "anna"}, {"emailAddress", ""}}), "none");
-    EXPECT_EQ(calendar({{"serverAddress", "www.google.com"}}), "none");
-}
-
-// Contacts
-
-TEST_F(MatchingContacts, TheDomainOfTheServerIsAskedForWithoutThePath)
-{
-    EXPECT_EQ(contacts({{"serverAddress", "DAV.Paths2.example/contacts"}, {"userName", "anna"}}), "none");
-    EXPECT_EQ(nameServer().queries(), std::vector<std::string>{"dav.paths2.example"});
-}
-
-TEST_F(MatchingContacts, TheUserNameIsTakenWhole)
-{
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
-    const QVariantMap settings{{"serverAddress", "dav.zorbo.example"}, {"userName", "anna@zorbo.example"}};
-    addAccount(kKAProviderYahoo, "anna");
-    EXPECT_EQ(contacts(settings), "none");
-    addAccount(kKAProviderYahoo, "anna@zorbo.example");
-    EXPECT_EQ(contacts(settings), "anna@zorbo.example at com.corvane.account.yahoo");
-}
-
-TEST_F(MatchingContacts, TheAddressIsTriedAfterTheUserName)
-{
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
-    const QVariantMap settings{
-        {"serverAddress", "dav.zorbo.example"}, {"userName", "anna"}, {"emailAddress", "bert@zorbo.example"}};
-    addAccount(kKAProviderYahoo, "bert@zorbo.example");
-    EXPECT_EQ(contacts(settings), "bert@zorbo.example at com.corvane.account.yahoo");
-    addAccount(kKAProviderYahoo, "anna");
-    EXPECT_EQ(contacts(settings), "anna at com.corvane.account.yahoo");
-}
-
-TEST_F(MatchingContacts, TheServerProductIsToldByTheTypeAndNotByTheRegistry)
-{
-    addPlugin(kKAHaldenServerPluginID, kKAProviderHaldenServer);
-    addAccount(kKAProviderHaldenServer, "anna");
-    KAAddHaldenServer("dav.work.example", QStringList{kKAServiceCardDAV});
-    QVariantMap settings{{"serverAddress", "dav.work.example"}, {"userName", "anna"}};
-    EXPECT_EQ(contacts(settings), "none");
-    settings.insert("KAAccountTypeKey", "com.corvane.account.haldenserver");
-    EXPECT_EQ(contacts(settings), "anna at com.corvane.account.haldenserver");
-}
-
-TEST_F(MatchingContacts, TheTypeOfTheServerProductComesBeforeAPathOnExchange)
-{
-    addPlugin(kKAHaldenServerPluginID, kKAProviderHaldenServer);
-    addPlugin(kKAExchangePluginID, kKAProviderExchange);
-    addAccount(kKAProviderHaldenServer, "anna");
-    addAccount(kKAProviderExchange, "anna");
-    EXPECT_EQ(contacts({{"userName", "anna"},
-                        {"serverRootPath", "/EWS"},
-                        {"KAAccountTypeKey", "com.corvane.account.haldenserver"}}),
-              "anna at com.corvane.account.haldenserver");
-}
-
-TEST_F(MatchingContacts, AServerInAClaimedDomainIsNotDecidedByTypeOrPath)
-{
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
-    addPlugin(kKAHaldenServerPluginID, kKAProviderHaldenServer);
-    addPlugin(kKAExchangePluginID, kKAProviderExchange);
-    addAccount(kKAProviderHaldenServer, "anna");
-    addAccount(kKAProviderExchange, "anna");
-    QVariantMap settings{{"serverAddress", "dav.zorbo.example"}, {"userName", "anna"}, {"serverRootPath", "/EWS"}};
-    EXPECT_EQ(contacts(settings), "none");
-    settings.insert("KAAccountTypeKey", "com.corvane.account.haldenserver");
-    EXPECT_EQ(contacts(settings), "none");
-}
-
-TEST_F(MatchingContacts, TypeAndPathMarkAnExchangeAccount)
-{
-    addPlugin(kKAExchangePluginID, kKAProviderExchange);
-    addAccount(kKAProviderExchange, "anna");
-    EXPECT_EQ(contacts({{"userName", "anna"}, {"KAAccountTypeKey", "kKAServiceExchangeContacts"}}),
-              "anna at com.corvane.account.exchange");
-    EXPECT_EQ(contacts({{"userName", "anna"}, {"serverRootPath", "/EWS"}}), "anna at com.corvane.account.exchange");
-    EXPECT_EQ(contacts({{"userName", "anna"}, {"KAAccountTypeKey", "kKAServiceExchangeCalendar"}}), "none");
-    EXPECT_EQ(contacts({{"userName", "anna"}, {"serverRootPath", ""}}), "none");
-}
-
-TEST_F(MatchingContacts, AServerOfGoogleIsGooglesAndGoesByTheAddress)
-{
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"google.com"});
-    addPlugin(kKAGooglePluginID, kKAProviderGoogle);
-    addAccount(kKAProviderGoogle, "anna@gmail.com");
-    addAccount(kKAProviderGoogle, "bert@zorbo.example");
-    EXPECT_EQ(contacts({{"serverAddress", "google.com"}, {"userName", "anna"}}),
-              "anna@gmail.com at com.corvane.account.google");
-    EXPECT_EQ(contacts({{"serverAddress", "google.com"}, {"userName", "anna"}, {"emailAddress", "bert@zorbo.example"}}),
-              "bert@zorbo.example at com.corvane.account.google");
-}
-
-TEST_F(MatchingContacts, OnlyTheTypeCardDavMakesTheOnlineServiceTheNewerOne)
-{
-    addPlugin(kKANimbrelPluginID, kKAProviderNimbrel, {"nimbrel.example"});
-    addPlugin(kKAQuillanePluginID, kKAProviderQuillane);
-    addAccount(kKAProviderNimbrel, "anna");
-    addAccount(kKAProviderQuillane, "anna");
-    QVariantMap settings{{"serverAddress", "contacts.nimbrel.example"}, {"userName", "anna"}};
-    EXPECT_EQ(contacts(settings), "anna at com.corvane.account.nimbrel");
-    settings.insert("KAAccountTypeKey", "kKAServiceCardDAV");
-    EXPECT_EQ(contacts(settings), "anna at com.corvane.account.placeholder");
-    EXPECT_EQ(calendar(settings), "anna at com.corvane.account.nimbrel");
 }
 
 // Chat
 
 TEST_F(MatchingChat, TheTypeOfTheChatAccountChoosesThePlugin)
 {
-    addPlugin(kKAAOLPluginID, kKAProviderAOL);
-    addPlugin(kKAGooglePluginID, kKAProviderGoogle);
-    addPlugin(kKANimbrelPluginID, kKAProviderNimbrel);
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo);
+    addListPlugin(kKAAOLPluginID, kKAProviderAOL);
+    addListPlugin(kKAGooglePluginID, kKAProviderGoogle);
+    addListPlugin(kKANimbrelPluginID, kKAProviderNimbrel);
+    addListPlugin(kKAYahooPluginID, kKAProviderYahoo);
     for (const QString &provider : {kKAProviderAOL, kKAProviderGoogle, kKAProviderNimbrel, kKAProviderYahoo})
         addAccount(provider, "anna");
     const std::pair<const char *, const char *> rows[] = {
@@ -432,7 +195,7 @@ TEST_F(MatchingChat, TheTypeOfTheChatAccountChoosesThePlugin)
 
 TEST_F(MatchingChat, OtherTypesBelongToTheServerProductByTypeOrRegistry)
 {
-    addPlugin(kKAHaldenServerPluginID, kKAProviderHaldenServer);
+    addListPlugin(kKAHaldenServerPluginID, kKAProviderHaldenServer);
     addAccount(kKAProviderHaldenServer, "anna");
     KAAddHaldenServer("chat.work.example", QStringList{kKAServiceIM});
     QVariantMap settings{{"KAChatAccountType", "jabber"}, {"KAChatLoginName", "anna"}};
@@ -447,8 +210,8 @@ TEST_F(MatchingChat, OtherTypesBelongToTheServerProductByTypeOrRegistry)
 
 TEST_F(MatchingChat, AKnownTypeComesBeforeARegisteredServer)
 {
-    addPlugin(kKAHaldenServerPluginID, kKAProviderHaldenServer);
-    addPlugin(kKAGooglePluginID, kKAProviderGoogle);
+    addListPlugin(kKAHaldenServerPluginID, kKAProviderHaldenServer);
+    addListPlugin(kKAGooglePluginID, kKAProviderGoogle);
     addAccount(kKAProviderHaldenServer, "anna");
     addAccount(kKAProviderGoogle, "anna");
     KAAddHaldenServer("chat.work.example", QStringList{kKAServiceIM});
@@ -459,7 +222,7 @@ TEST_F(MatchingChat, AKnownTypeComesBeforeARegisteredServer)
 
 TEST_F(MatchingChat, OneLoginNameIsTriedWithoutAFallBack)
 {
-    addPlugin(kKAGooglePluginID, kKAProviderGoogle);
+    addListPlugin(kKAGooglePluginID, kKAProviderGoogle);
     addAccount(kKAProviderGoogle, "anna");
     EXPECT_EQ(chat({{"KAChatAccountType", "google"}, {"KAChatLoginName", "anna@gmail.com"}}), "none");
     EXPECT_EQ(chat({{"KAChatAccountType", "google"}}), "none");
@@ -469,9 +232,9 @@ TEST_F(MatchingChat, OneLoginNameIsTriedWithoutAFallBack)
 
 TEST_F(Matching, EachDataPluginHasItsMatcher)
 {
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
-    addPlugin(kKAExchangePluginID, kKAProviderExchange);
-    addPlugin(kKAGooglePluginID, kKAProviderGoogle);
+    addListPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
+    addListPlugin(kKAExchangePluginID, kKAProviderExchange);
+    addListPlugin(kKAGooglePluginID, kKAProviderGoogle);
     addAccount(kKAProviderYahoo, "mail");
     addAccount(kKAProviderExchange, "server");
     addAccount(kKAProviderGoogle, "chat");
@@ -497,7 +260,7 @@ TEST_F(Matching, EachDataPluginHasItsMatcher)
 
 TEST_F(Matching, TheTraceTellsEachLoginNameThatWasTried)
 {
-    addPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
+    addListPlugin(kKAYahooPluginID, kKAProviderYahoo, {"zorbo.example"});
     addAccount(kKAProviderYahoo, "anna@zorbo.example");
     KADecisionTrace trace;
     const auto account =

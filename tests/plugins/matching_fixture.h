@@ -7,23 +7,14 @@
 #ifndef KAVELL_TESTS_PLUGINS_MATCHING_FIXTURE_H
 #define KAVELL_TESTS_PLUGINS_MATCHING_FIXTURE_H
 
-#include <kavellaccounts/KAPluginManager.h>
 #include <kavellaccounts/KAProvider.h>
 
-#include "tests/model/account_fixture.h"
-#include "tests/support/dns_server.h"
-#include "tests/support/plugin_directory.h"
+#include "tests/model/plugin_fixture.h"
 
 namespace kavell::test {
 
-class MatchingTest : public AccountTest {
+class MatchingTest : public AccountWithPluginsTest {
 protected:
-    /// An account-list plug-in that claims these domains.
-    void addPlugin(const QString &identifier, const QString &providerType, const QStringList &domains = {})
-    {
-        m_plugins.addListPlugin({.identifier = identifier, .providerType = providerType, .domains = domains});
-    }
-
     /// An account of that provider, which the first call makes the registry load the plug-ins for.
     static void addAccount(const QString &providerType, const QString &loginName)
     {
@@ -56,13 +47,6 @@ protected:
     {
         return named(manager()._matchingAlistAccountForChatAccountSettings(settings));
     }
-
-    [[nodiscard]] const DnsServer &nameServer() const { return m_nameServer; }
-    [[nodiscard]] DnsServer &nameServer() { return m_nameServer; }
-
-private:
-    DnsServer m_nameServer;
-    PluginDirectory m_plugins;
 };
 
 }  // namespace kavell::test

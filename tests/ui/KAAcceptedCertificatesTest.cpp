@@ -10,57 +10,24 @@
 
 #include <QtCore/QCoreApplication>
 #include <QtCore/QFile>
-#include <QtCore/QProcess>
 #include <QtCore/QTemporaryDir>
 #include <QtNetwork/QNetworkAccessManager>
 #include <QtNetwork/QNetworkProxy>
 #include <QtNetwork/QNetworkReply>
-#include <QtNetwork/QSslKey>
 #include <QtNetwork/QSslSocket>
 #include <QtNetwork/QTcpServer>
 #include <QtTest/QSignalSpy>
 
 #include <gtest/gtest.h>
 
+#include "tests/ui/tls_identity.h"
+
 namespace {
 
-struct Identity {
-    QSslKey key;
-    QSslCertificate certificate;
-    QList<QSslCertificate> authorities{};
-
-    [[nodiscard]] QList<QSslCertificate> chain() const { return QList{certificate} + authorities; }
-};
-
-QByteArray contents(const QString &path)
-{
-    QFile file(path);
-    return file.open(QIODevice::ReadOnly) ? file.readAll() : QByteArray();
-}
-
-Identity selfSigned(const QString &host)
-{
-    const QTemporaryDir directory;
-    const QString key = directory.filePath("key.pem");
-    const QString certificate = directory.filePath("certificate.pem");
-    QProcess maker;
-    maker.start("openssl", {"req", "-x509", "-newkey", "ec", "-pkeyopt", "ec_paramgen_curve:prime256v1", "-nodes",
-                            "-days", "2", "-subj", "/CN=" + host, "-keyout", key, "-out", certificate});
-    EXPECT_TRUE(maker.waitForFinished());
-    Identity identity{QSslKey(contents(key), QSsl::Ec), QSslCertificate(contents(certificate))};
-    EXPECT_FALSE(identity.key.isNull());
-    EXPECT_FALSE(identity.certificate.isNull());
-    return identity;
-}
-
-void runOpenSsl(const QString &directory, const QStringList &arguments)
-{
-    QProcess maker;
-    maker.setWorkingDirectory(directory);
-    maker.start("openssl", arguments);
-    EXPECT_TRUE(maker.waitForFinished());
-    EXPECT_EQ(maker.exitCode(), 0) << maker.readAllStandardError().toStdString();
-}
+using kavell::test::contentsOfFile;
+using kavell::test::Identity;
+using kavell::test::runOpenSsl;
+using kavell::test::selfSigned;
 
 /// Servers of one private authority, each with the authority's certificate behind its own. All are called 127.0.0.1 and
 /// localhost, so that nothing but the authority is wrong with them.
@@ -83,9 +50,9 @@ QList<Identity> ofOneAuthority(int count)
         runOpenSsl(directory.path(),
                    {"x509", "-req", "-in", "request", "-CA", "authority.pem", "-CAkey", "authority.key",
                     "-CAcreateserial", "-days", "2", "-extfile", "names", "-out", "certificate.pem"});
-        servers.append({QSslKey(contents(directory.filePath("key.pem")), QSsl::Ec),
-                        QSslCertificate(contents(directory.filePath("certificate.pem"))),
-                        {QSslCertificate(contents(directory.filePath("authority.pem")))}});
+        servers.append({QSslKey(contentsOfFile(directory.filePath("key.pem")), QSsl::Ec),
+                        QSslCertificate(contentsOfFile(directory.filePath("certificate.pem"))),
+                        {QSslCertificate(contentsOfFile(directory.filePath("authority.pem")))}});
     }
     return servers;
 }

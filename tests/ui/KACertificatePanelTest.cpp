@@ -8,8 +8,6 @@
 #include <thread>
 
 #include <QtCore/QCryptographicHash>
-#include <QtCore/QProcess>
-#include <QtCore/QTemporaryDir>
 #include <QtCore/QTimer>
 #include <QtCore/QUrl>
 #include <QtTest/QTest>
@@ -24,21 +22,13 @@
 #include <gtest/gtest.h>
 
 #include "tests/support/log_capture.h"
+#include "tests/ui/tls_identity.h"
 
 namespace {
 
 QList<QSslCertificate> selfSignedChain()
 {
-    const QTemporaryDir directory;
-    const QString path = directory.filePath("certificate.pem");
-    QProcess maker;
-    maker.start("openssl",
-                {"req", "-x509", "-newkey", "ec", "-pkeyopt", "ec_paramgen_curve:prime256v1", "-nodes", "-days", "2",
-                 "-subj", "/CN=mail.example", "-keyout", directory.filePath("key.pem"), "-out", path});
-    EXPECT_TRUE(maker.waitForFinished());
-    const auto chain = QSslCertificate::fromPath(path);
-    EXPECT_EQ(chain.size(), 1);
-    return chain;
+    return kavell::test::selfSigned("mail.example").chain();
 }
 
 KAError errorFor(const QString &url, const QList<QSslCertificate> &chain, qint64 code = -1202)
