@@ -46,9 +46,9 @@ std::optional<kavell::FileIdentity> identityOfFile(const QString &path)
 }  // namespace
 
 // The library's own code names its resources; a static library's linker would drop them otherwise.
-static void makeLibraryStringsAvailable()
+static void makeLibraryResourcesAvailable()
 {
-    Q_INIT_RESOURCE(kavell_strings);
+    Q_INIT_RESOURCE(kavell_resources);
 }
 
 struct KABundle::Contents {
@@ -110,7 +110,7 @@ std::shared_ptr<KABundle> KABundle::bundleWithPath(const QString &path)
 
 std::shared_ptr<KABundle> KABundle::libraryBundle()
 {
-    makeLibraryStringsAvailable();
+    makeLibraryResourcesAvailable();
     static const std::shared_ptr<KABundle> bundle(new KABundle(
         std::make_shared<Contents>(kLibraryResources, kLibraryResources,
                                    QVariantMap{{kIdentifierKey, QStringLiteral("com.corvane.kavellaccounts")}})));

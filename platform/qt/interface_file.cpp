@@ -14,7 +14,7 @@
 
 namespace kavell {
 
-std::unique_ptr<InterfaceFile> InterfaceFile::load(const QString &path)
+std::unique_ptr<InterfaceFile> InterfaceFile::load(const QString &path, QString *problem)
 {
     QFile file(path);
     QUiLoader loader;
@@ -22,7 +22,10 @@ std::unique_ptr<InterfaceFile> InterfaceFile::load(const QString &path)
     QWidget *const root = isOpen ? loader.load(&file) : nullptr;
     if (!root) {
         const QString reason = isOpen ? loader.errorString() : QStringLiteral("It cannot be opened.");
-        log(QStringLiteral("*** Cannot read the interface file %1: %2").arg(KADescription(path), reason));
+        if (problem)
+            *problem = reason;
+        else
+            log(QStringLiteral("*** Cannot read the interface file %1: %2").arg(KADescription(path), reason));
         return nullptr;
     }
     return std::unique_ptr<InterfaceFile>(new InterfaceFile(path, root));

@@ -25,8 +25,9 @@ namespace kavell {
 
 class InterfaceFile {
 public:
-    /// Reads a file; null, with a line in the log, when it is none. A null path is logged as one that is missing.
-    [[nodiscard]] static std::unique_ptr<InterfaceFile> load(const QString &path);
+    /// Reads a file; null when it is none, with a line in the log or, where `problem` is given, with the reason there. A
+    /// null path is one that is missing.
+    [[nodiscard]] static std::unique_ptr<InterfaceFile> load(const QString &path, QString *problem = nullptr);
 
     /// Deletes all its widgets, those too that stand in another window meanwhile.
     ~InterfaceFile();
