@@ -1,0 +1,221 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+//
+// The example data plug-ins while they set an account up: what the delegate is told, on which thread, and what ends it.
+
+#include <gmock/gmock.h>
+
+#include <QtCore/QUrl>
+
+#include <kavellaccounts/KAConstants.h>
+
+#include "tests/integration/data_plugin_fixture.h"
+
+namespace kavell::test {
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+const QString kLooking = QStringLiteral("update Looking for the account’s servers…");
+
+class FileDataPluginSetup : public DataPluginTest {
+protected:
+    /// Starts a set-up and waits for its end.
+    void discover(const std::shared_ptr<KAAccountSetupInput> &input, const QString &identifier = kKAMailPluginID)
+    {
+        plugin(identifier).setDelegate(&recorder);
+        plugin(identifier).startAccountSetupWithInput(input);
+        EXPECT_TRUE(runUntil([&] { return recorder.hasEnded(); }));
+    }
+
+    /// Lets everything that is queued for this thread run.
+    static void runQueuedEvents()
+    {
+        for (int round = 0; round < 4; ++round)
+            QCoreApplication::processEvents();
+    }
+
+    SetupRecorder recorder;
+};
+
+TEST_F(FileDataPluginSetup, TellsFirstThatItLooksAndThenWhatItFound)
+{
+    discover(mailInput("carla@zorbo.example"));
+    EXPECT_THAT(recorder.messages, ElementsAre(kLooking, QStringLiteral("finish")));
+    const auto result = std::dynamic_pointer_cast<KAMailAccountSetupResult>(recorder.result);
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->receivingAccount().toString(), "imaps://carla@zorbo.example@imap.zorbo.example");
+    EXPECT_FALSE(result->receivingAlreadyExistsInMail());
+}
+
+TEST_F(FileDataPluginSetup, StartReturnsBeforeAnythingIsTold)
+{
+    plugin().setDelegate(&recorder);
+    plugin().startAccountSetupWithInput(mailInput("carla@zorbo.example"));
+    EXPECT_THAT(recorder.messages, IsEmpty());
+    EXPECT_TRUE(runUntil([&] { return recorder.hasEnded(); }));
+}
+
+TEST_F(FileDataPluginSetup, FindsTheCalendarsOfAnAddress)
+{
+    const auto input = std::make_shared<KACalDAVAccountSetupInput>();
+    input->setUserName("carla");
+    input->setEmailAddress("carla@zorbo.example");
+    input->setPassword("secret");
+    discover(input, kKACalendarPluginID);
+    const auto result = std::dynamic_pointer_cast<KACalDAVAccountSetupResult>(recorder.result);
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->url(), QUrl("https://calendar.zorbo.example/calendars/carla/"));
+}
+
+TEST_F(FileDataPluginSetup, FindsTheContactsAtAServerThatIsGiven)
+{
+    const auto input = std::make_shared<KACardDAVAccountSetupInput>();
+    input->setUserName("carla");
+    input->setServerAddress("people.zorbo.example");
+    input->setPassword("secret");
+    discover(input, kKAContactsPluginID);
+    const auto result = std::dynamic_pointer_cast<KACardDAVAccountSetupResult>(recorder.result);
+    ASSERT_TRUE(result);
+    EXPECT_EQ(result->url(), QUrl("https://people.zorbo.example/contacts/carla/"));
+}
+
+TEST_F(FileDataPluginSetup, FindsADirectory)
+{
+    const auto input = std::make_shared<KALDAPAccountSetupInput>();
+    input->setServerAddress("directory.zorbo.example");
+    input->setPassword("secret");
+    discover(input, kKAContactsPluginID);
+    EXPECT_TRUE(std::dynamic_pointer_cast<KALDAPAccountSetupResult>(recorder.result));
+}
+
+TEST_F(FileDataPluginSetup, FindsAChatAccount)
+{
+    const auto input = std::make_shared<KAChatAccountSetupInput>();
+    input->setLoginName("carla@zorbo.example");
+    input->setAccountType(KAChatAcctTypeJabber);
+    input->setPassword("secret");
+    discover(input, kKAChatPluginID);
+    const auto result = std::dynamic_pointer_cast<KAChatAccountSetupResult>(recorder.result);
+    ASSERT_TRUE(result);
+    EXPECT_FALSE(result->isExistingAccount());
+}
+
+TEST_F(FileDataPluginSetup, FailsWithoutAnAddress)
+{
+    discover(mailInput("carla"));
+    EXPECT_THAT(recorder.messages, ElementsAre(kLooking, QStringLiteral("fail")));
+    EXPECT_EQ(recorder.error.domain(), "CorvaneKavellAccountsErrorDomain");
+    EXPECT_EQ(recorder.error.code(), 2);
+    EXPECT_EQ(recorder.error.description(),
+              "It is not known whose account this is: an address or a user name is missing.");
+    EXPECT_FALSE(recorder.error.userInformation().contains(kKANonFatalError));
+}
+
+TEST_F(FileDataPluginSetup, FailsWithoutALogin)
+{
+    const auto input = std::make_shared<KAChatAccountSetupInput>();
+    input->setContinueThroughError(true);
+    discover(input, kKAChatPluginID);
+    EXPECT_EQ(recorder.error.code(), 2);
+}
+
+TEST_F(FileDataPluginSetup, FailsForAnInputOfAnotherKindOfData)
+{
+    discover(std::make_shared<KAChatAccountSetupInput>());
+    EXPECT_EQ(recorder.error.description(), "This application cannot use an account of that kind.");
+}
+
+TEST_F(FileDataPluginSetup, AMissingPasswordIsAnErrorThatTheAskerMayContinueThrough)
+{
+    const auto input = mailInput("carla@zorbo.example");
+    input->setPassword({});
+    discover(input);
+    EXPECT_EQ(recorder.error.code(), 4);
+    EXPECT_TRUE(recorder.error.userInformation().value(kKANonFatalError).toBool());
+    recorder.messages.clear();
+
+    input->setContinueThroughError(true);
+    discover(input);
+    EXPECT_THAT(recorder.messages, ElementsAre(kLooking, QStringLiteral("finish")));
+}
+
+TEST_F(FileDataPluginSetup, AMissingServerIsAnErrorThatTheAskerMayContinueThrough)
+{
+    const auto input = std::make_shared<KACalDAVAccountSetupInput>();
+    input->setUserName("carla");
+    input->setPassword("secret");
+    discover(input, kKACalendarPluginID);
+    EXPECT_EQ(recorder.error.code(), 3);
+    recorder.messages.clear();
+
+    input->setContinueThroughError(true);
+    discover(input, kKACalendarPluginID);
+    const auto result = std::dynamic_pointer_cast<KACalDAVAccountSetupResult>(recorder.result);
+    ASSERT_TRUE(result);
+    EXPECT_TRUE(result->url().isEmpty());
+}
+
+TEST_F(FileDataPluginSetup, NothingIsToldOfACancelledSetup)
+{
+    const auto input = mailInput("carla@zorbo.example");
+    plugin().setDelegate(&recorder);
+    plugin().startAccountSetupWithInput(input);
+    plugin().cancelAccountSetupForInput(input);
+    runQueuedEvents();
+    EXPECT_THAT(recorder.messages, IsEmpty());
+}
+
+TEST_F(FileDataPluginSetup, CancellingOneSetupLeavesTheOthers)
+{
+    const auto cancelled = mailInput("carla@zorbo.example");
+    plugin().setDelegate(&recorder);
+    plugin().startAccountSetupWithInput(cancelled);
+    plugin().startAccountSetupWithInput(mailInput("dora@zorbo.example"));
+    plugin().cancelAccountSetupForInput(cancelled);
+    EXPECT_TRUE(runUntil([&] { return recorder.hasEnded(); }));
+    EXPECT_THAT(recorder.messages, ElementsAre(kLooking, QStringLiteral("finish")));
+}
+
+TEST_F(FileDataPluginSetup, ADelegateThatIsGoneIsNotTold)
+{
+    {
+        SetupRecorder gone;
+        plugin().setDelegate(&gone);
+        plugin().startAccountSetupWithInput(mailInput("carla@zorbo.example"));
+        plugin().setDelegate(nullptr);
+    }
+    plugin().setDelegate(&recorder);
+    runQueuedEvents();
+    EXPECT_THAT(recorder.messages, IsEmpty()) << "the next delegate did not ask";
+}
+
+TEST_F(FileDataPluginSetup, AnswersOnTheThreadThatAsked)
+{
+    QThread *told = nullptr;
+    bool wasFound = false;
+    const std::unique_ptr<QThread> worker(QThread::create([&] {
+        SetupRecorder own;
+        plugin().setDelegate(&own);
+        plugin().startAccountSetupWithInput(mailInput("carla@zorbo.example"));
+        wasFound = runUntil([&] { return own.hasEnded(); }) && own.result;
+        told = own.thread;
+        plugin().setDelegate(nullptr);
+    }));
+    worker->start();
+    ASSERT_TRUE(worker->wait(20000));  // while this thread runs no events
+    EXPECT_TRUE(wasFound);
+    EXPECT_EQ(told, worker.get());
+}
+
+TEST_F(FileDataPluginSetup, SaysThatTheApplicationHasTheAccountAlready)
+{
+    (void)makeAccount(plugin(), mailInput("carla@zorbo.example"));
+    discover(mailInput("carla@zorbo.example"));
+    const auto result = std::dynamic_pointer_cast<KAMailAccountSetupResult>(recorder.result);
+    ASSERT_TRUE(result);
+    EXPECT_TRUE(result->receivingAlreadyExistsInMail());
+    EXPECT_TRUE(result->sendingAlreadyExistsInMail());
+}
+
+}  // namespace kavell::test
