@@ -1,0 +1,367 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+//
+// The flow of every account creator: what the newer online service wants first, then discovery and creation by the data
+// plug-in.
+
+#include <kavellaccounts/KAAccountCreator.h>
+
+#include <thread>
+
+#include <QtCore/QCoreApplication>
+#include <QtCore/QEventLoop>
+#include <QtCore/QScopeGuard>
+#include <QtCore/QThread>
+#include <QtCore/QThreadPool>
+
+#include <kavellaccounts/KAAListPlugin.h>
+#include <kavellaccounts/KAAccount.h>
+#include <kavellaccounts/KABundle.h>
+#include <kavellaccounts/KACertificatePanel.h>
+#include <kavellaccounts/KAConstants.h>
+#include <kavellaccounts/KADescription.h>
+#include <kavellaccounts/KAFieldList.h>
+#include <kavellaccounts/KAPluginManager.h>
+#include <kavellaccounts/KAProvider.h>
+#include <kavellaccounts/NBSShim.h>
+
+#include "model/settings_reading.h"
+#include "platform/qt/log.h"
+#include "platform/qt/main_thread.h"
+#include "platform/qt/value_conversion.h"
+
+using kavell::toStoreString;
+
+namespace {
+
+/// What the newer online service and its alert call the kind of account that a data plug-in makes.
+struct OnlineService {
+    const QString &pluginID;
+    const QString &serviceType;
+    const char *constantName;
+};
+
+const OnlineService kOnlineServices[] = {
+    {kKACalendarPluginID, kKAServiceCalDAV, "kNBServiceIDCalendars"},
+    {kKAContactsPluginID, kKAServiceCardDAV, "kNBServiceIDContacts"},
+};
+
+const OnlineService *onlineServiceOf(const QString &pluginID)
+{
+    for (const OnlineService &service : kOnlineServices) {
+        if (service.pluginID == pluginID)
+            return &service;
+    }
+    return nullptr;
+}
+
+/// Gives the calling thread's place in the global thread pool, if it has one, to another task while it waits for a
+/// plug-in. Were it kept, a few creators could fill the pool, and a plug-in that works in the pool could never report.
+class PlaceInPoolForOthers {
+public:
+    PlaceInPoolForOthers()
+    {
+        if (m_isInPool)
+            QThreadPool::globalInstance()->releaseThread();
+    }
+    ~PlaceInPoolForOthers()
+    {
+        if (m_isInPool)
+            QThreadPool::globalInstance()->reserveThread();
+    }
+    PlaceInPoolForOthers(const PlaceInPoolForOthers &) = delete;
+    PlaceInPoolForOthers &operator=(const PlaceInPoolForOthers &) = delete;
+
+private:
+    const bool m_isInPool = QThreadPool::globalInstance()->contains(QThread::currentThread());
+};
+
+}  // namespace
+
+std::shared_ptr<KAAccountCreator> KAAccountCreator::initWithSettings(const std::optional<QVariantMap> &settings,
+                                                                     KADataPlugin *plugin)
+{
+    return std::shared_ptr<KAAccountCreator>(new KAAccountCreator(settings, plugin));
+}
+
+KAAccountCreator::KAAccountCreator(const std::optional<QVariantMap> &settings, KADataPlugin *plugin)
+    : _settings(settings), _plugin(plugin)
+{
+}
+
+KAAccountCreator::~KAAccountCreator()
+{
+    // To none, whoever the delegate is by now: a plug-in is not told of creators that came after one another.
+    if (_plugin)
+        _plugin->setDelegate(nullptr);
+}
+
+std::shared_ptr<KAProvider> KAAccountCreator::provider() const
+{
+    return _provider;
+}
+
+void KAAccountCreator::setProvider(std::shared_ptr<KAProvider> provider)
+{
+    _provider = std::move(provider);
+}
+
+QString KAAccountCreator::corvaneID() const
+{
+    return _corvaneID;
+}
+
+void KAAccountCreator::setCorvaneID(const QString &corvaneID)
+{
+    _corvaneID = corvaneID;
+}
+
+bool KAAccountCreator::create()
+{
+    const bool isQuillane = providerIs(kKAProviderQuillane);
+    if (!_settings) {
+        kavell::log(QStringLiteral("*** KAAccountCreator: _settings was nil"));
+        return failed(QStringLiteral("There are no settings to make an account of."));
+    }
+    if (isQuillane) {
+        if (!_warnAboutMigrationSyncIfNecessary()) {
+            kavell::log(QStringLiteral("*** Canceled at migration/sync alert for plugin %1.")
+                            .arg(KADescription(pluginIdentifier())));
+            return failed(QStringLiteral("The user chose not to move to the online service."));
+        }
+        if (!_enableBrondelService())
+            return failed(QStringLiteral("The account's name at the online service is not known."));
+    }
+    if (!_plugin) {
+        kavell::log(QStringLiteral("*** KAAccountCreator: _plugin was nil"));
+        return failed(QStringLiteral("The application has no plug-in."));
+    }
+    // Calendars and contacts are the online service's own work, which was switched on above.
+    if (isQuillane && pluginIdentifier() != kKAMailPluginID)
+        return true;
+
+    const PlaceInPoolForOthers place;
+    const std::shared_ptr<KAAccountSetupInput> input = _input();
+    const std::shared_ptr<KAAccountSetupResult> result = discover(input);
+    if (!result)
+        return failed(QStringLiteral("The plug-in found nothing to make an account of."));
+    KAError error;
+    const QString uid = _plugin->createAccountForInput(input, result, &error);
+    if (uid.isEmpty())
+        return failed(QStringLiteral("The plug-in made no account of what it had found."), error);
+    const std::lock_guard lock(m_mutex);
+    m_createdAccountUID = uid;
+    return true;
+}
+
+std::shared_ptr<KAAccountSetupResult> KAAccountCreator::discover(const std::shared_ptr<KAAccountSetupInput> &input)
+{
+    {
+        // What a plug-in reported unasked is no report of this discovery.
+        const std::lock_guard lock(m_mutex);
+        _result.reset();
+        m_failureReason = QString();
+    }
+    _waiting = true;
+    const auto waitIsOver = qScopeGuard([this] { _waiting = false; });
+    _plugin->setDelegate(this);
+    _plugin->startAccountSetupWithInput(input);
+    waitForReport();
+    const std::lock_guard lock(m_mutex);
+    return _plugin ? _result : nullptr;
+}
+
+/// Without sleeping between two looks, deliberately: the plug-in reports by events on this thread's loop, by calls from
+/// other threads, or by both, and no single thing could be slept on that wakes up for all of them.
+void KAAccountCreator::waitForReport()
+{
+    const bool hasApplication = QCoreApplication::instance();
+    std::optional<QEventLoop> events;  // which a program without an application object must not make
+    if (hasApplication)
+        events.emplace();
+    while (_waiting) {
+        if (events)
+            events->processEvents();
+        if (!_plugin)
+            endWait(QStringLiteral("The plug-in was destroyed while it looked for the account."));
+        // Events come no more, and the end of the program waits for the threads of the pool.
+        if (hasApplication && !QCoreApplication::instance())
+            endWait(QStringLiteral("The program ended while the plug-in looked for the account."));
+        std::this_thread::yield();
+    }
+}
+
+/// The first report decides, which may be on any thread.
+void KAAccountCreator::endWait(const QString &reason, const KAError &error)
+{
+    {
+        const std::lock_guard lock(m_mutex);
+        if (!_result && m_failureReason.isNull()) {
+            m_failureReason = reason;
+            m_failureError = error;
+        }
+    }
+    _waiting = false;
+}
+
+/// Keeps the reason unless there is a nearer one; false.
+bool KAAccountCreator::failed(const QString &reason, const KAError &error)
+{
+    const std::lock_guard lock(m_mutex);
+    if (m_failureReason.isNull()) {
+        m_failureReason = reason;
+        m_failureError = error;
+    }
+    return false;
+}
+
+QString KAAccountCreator::failureReason() const
+{
+    const std::lock_guard lock(m_mutex);
+    return m_failureReason;
+}
+
+KAError KAAccountCreator::failureError() const
+{
+    const std::lock_guard lock(m_mutex);
+    return m_failureError;
+}
+
+QString KAAccountCreator::createdAccountUID() const
+{
+    const std::lock_guard lock(m_mutex);
+    return m_createdAccountUID;
+}
+
+std::shared_ptr<KAAccountSetupInput> KAAccountCreator::_input() const
+{
+    return nullptr;
+}
+
+QString KAAccountCreator::settingsText(const QString &key) const
+{
+    return _settings ? kavell::textForKey(*_settings, key) : QString();
+}
+
+bool KAAccountCreator::providerIs(const QString &providerType) const
+{
+    return _provider && _provider->providerType() == providerType;
+}
+
+KAAListPlugin *KAAccountCreator::accountListPlugin() const
+{
+    KAPluginManager *const manager = KAPluginManager::shared();
+    const QString identifier = _provider ? manager->pluginIDForProviderID(_provider->providerType()) : QString();
+    return identifier.isNull() ? nullptr : qobject_cast<KAAListPlugin *>(manager->pluginWithIdentifier(identifier));
+}
+
+void KAAccountCreator::fillIn(KAAccountSetupInput &input, const QString &descriptionKey) const
+{
+    input.setContinueThroughError(true);
+    input.setAccountDescription(settingsText(descriptionKey));
+    input.setPassword(settingsText(KAMailPasswordKey));
+}
+
+QString KAAccountCreator::pluginIdentifier() const
+{
+    return _plugin ? _plugin->identifier() : QString();
+}
+
+/// Whether to go on: the account-list plug-in may ask the user first whether calendars or contacts shall move.
+bool KAAccountCreator::_warnAboutMigrationSyncIfNecessary() const
+{
+    KAAListPlugin *const listPlugin = accountListPlugin();
+    const OnlineService *const service = onlineServiceOf(pluginIdentifier());
+    if (!listPlugin || !service)
+        return true;
+    bool goOn = true;
+    kavell::runOnMainThread([&] {
+        if (listPlugin->shouldShowMigrationSyncAlertForService(service->serviceType))
+            goOn = listPlugin->showMigrationSyncAlertForService(service->serviceType);
+    });
+    return goOn;
+}
+
+/// Switches the plug-in's service of the account on, logging in first when that is needed and possible; what comes of
+/// either is not looked at. False when the account has no name.
+bool KAAccountCreator::_enableBrondelService()
+{
+    if (pluginIdentifier() == kKAMailPluginID)
+        return true;
+    if (_corvaneID.isNull())
+        _corvaneID = settingsText(KAMailEmailAddressKey);
+    if (_corvaneID.isNull())
+        _corvaneID = settingsText(KAMailUserNameKey);
+    if (_corvaneID.isNull()) {
+        kavell::log(QStringLiteral("*** KAAccountCreator: couldn't determine Corvane ID"));
+        return false;
+    }
+    const OnlineService *const service = onlineServiceOf(pluginIdentifier());
+    const CSKavellStringRef serviceID = service ? NBSShimGetStringConst(service->constantName) : nullptr;
+    const auto name = toStoreString(_corvaneID);
+    const QString password = settingsText(KAMailPasswordKey);
+    if (!NBSShimAccountIsLoggedIn(name.get()) && !password.isNull())
+        static_cast<void>(NBSShimAccountLogin(name.get(), toStoreString(password).get()));
+    if (serviceID)
+        NBSShimServiceSetEnabled(name.get(), serviceID, true);
+    return true;
+}
+
+void KAAccountCreator::pluginAccountSetupUpdate(KADataPlugin *, const std::shared_ptr<KAAccountSetupInput> &,
+                                                const QVariant &)
+{
+}
+
+void KAAccountCreator::pluginAccountSetupDidFail(KADataPlugin *, const std::shared_ptr<KAAccountSetupInput> &,
+                                                 const KAError &error)
+{
+    endWait(QStringLiteral("The plug-in could not find the account."), error);
+}
+
+void KAAccountCreator::pluginAccountSetupDidFinish(KADataPlugin *, const std::shared_ptr<KAAccountSetupInput> &,
+                                                   const std::shared_ptr<KAAccountSetupResult> &result)
+{
+    {
+        const std::lock_guard lock(m_mutex);
+        if (!_result && m_failureReason.isNull())
+            _result = result;
+    }
+    _waiting = false;
+}
+
+bool KAAccountCreator::pluginHandleCertificateError(KADataPlugin *, const KAError &error)
+{
+    const QString title = KABundle::libraryBundle()->localizedString(QStringLiteral("KAVELL_ACCOUNTS"));
+    const bool trusted = KAShowCertificatePanelForError(error, title);
+    if (!trusted)
+        endWait(QStringLiteral("The server's certificate was not trusted."), error);
+    return trusted;
+}
+
+void KAAccountCreator::pluginDidCreateAccountUID(KADataPlugin *, const QString &)
+{
+}
+
+void KAAccountCreator::pluginDidDeleteAccountUID(KADataPlugin *, const QString &)
+{
+}
+
+void KAAccountCreator::pluginDidChangeAccountUID(KADataPlugin *, const QString &)
+{
+}
+
+void KAAccountCreator::pluginNbsAccountMigrationFinished(KADataPlugin *, const std::shared_ptr<KAAccount> &)
+{
+}
+
+void KAAccountCreator::describeFields(KAFieldList &fields) const
+{
+    const std::lock_guard lock(m_mutex);
+    fields.add("_settings", _settings);
+    fields.add("_plugin", _plugin);
+    fields.add("_result", _result);
+    fields.add("_provider", _provider);
+    fields.add("_corvaneID", _corvaneID);
+    fields.add("_waiting", _waiting.load());
+    KAObject::describeFields(fields);
+}
