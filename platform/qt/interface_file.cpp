@@ -14,10 +14,33 @@
 
 namespace kavell {
 
-std::unique_ptr<InterfaceFile> InterfaceFile::load(const QString &path, QString *problem)
+namespace {
+
+/// Knows the reader's own classes of widgets besides the toolkit's.
+class WidgetLoader : public QUiLoader {
+public:
+    explicit WidgetLoader(const InterfaceFile::WidgetMakers &makers) : m_makers(makers) {}
+
+    QWidget *createWidget(const QString &className, QWidget *parent, const QString &name) override
+    {
+        const auto make = m_makers.value(className);
+        if (!make)
+            return QUiLoader::createWidget(className, parent, name);
+        QWidget *const widget = make(parent);
+        widget->setObjectName(name);
+        return widget;
+    }
+
+private:
+    const InterfaceFile::WidgetMakers &m_makers;
+};
+
+}  // namespace
+
+std::unique_ptr<InterfaceFile> InterfaceFile::load(const QString &path, QString *problem, const WidgetMakers &makers)
 {
     QFile file(path);
-    QUiLoader loader;
+    WidgetLoader loader(makers);
     const bool isOpen = !path.isEmpty() && file.open(QIODevice::ReadOnly);
     QWidget *const root = isOpen ? loader.load(&file) : nullptr;
     if (!root) {
@@ -40,6 +63,14 @@ InterfaceFile::~InterfaceFile()
     for (const QPointer<QWidget> &widget : std::as_const(m_taken))
         delete widget;
     delete m_root;
+}
+
+std::unique_ptr<QWidget> InterfaceFile::takeRoot()
+{
+    std::unique_ptr<QWidget> root(m_root);
+    m_root.clear();
+    m_taken.clear();
+    return root;
 }
 
 bool InterfaceFile::connectActions(QObject *receiver)

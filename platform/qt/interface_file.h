@@ -16,6 +16,7 @@
 
 #include <memory>
 
+#include <QtCore/QHash>
 #include <QtCore/QList>
 #include <QtCore/QPointer>
 #include <QtCore/QString>
@@ -25,9 +26,13 @@ namespace kavell {
 
 class InterfaceFile {
 public:
+    /// Makes the widgets of classes that are not the toolkit's own, by class name.
+    using WidgetMakers = QHash<QString, QWidget *(*)(QWidget *parent)>;
+
     /// Reads a file; null when it is none, with a line in the log or, where `problem` is given, with the reason there. A
     /// null path is one that is missing.
-    [[nodiscard]] static std::unique_ptr<InterfaceFile> load(const QString &path, QString *problem = nullptr);
+    [[nodiscard]] static std::unique_ptr<InterfaceFile> load(const QString &path, QString *problem = nullptr,
+                                                             const WidgetMakers &makers = {});
 
     /// Deletes all its widgets, those too that stand in another window meanwhile.
     ~InterfaceFile();
@@ -36,6 +41,9 @@ public:
 
     /// The outermost widget, which has no parent until somebody shows it.
     [[nodiscard]] QWidget *root() const { return m_root; }
+
+    /// Hands the outermost widget over to the caller; this object deletes nothing afterwards.
+    [[nodiscard]] std::unique_ptr<QWidget> takeRoot();
 
     /// The widget of an object name; null when there is none, and, with a line in the log, when it is of another class.
     template <typename View> [[nodiscard]] View *view(const QString &name)
@@ -68,7 +76,7 @@ private:
     void logOtherClass(const QWidget *widget, const char *wanted) const;
 
     const QString m_path;
-    const QPointer<QWidget> m_root;
+    QPointer<QWidget> m_root;
     QList<QPointer<QWidget>> m_taken;  // out of the outermost widget, perhaps
 };
 

@@ -1,0 +1,65 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+
+#include <kavellaccounts/KAAppTableRowLoader.h>
+
+#include <kavellaccounts/KAAppTableRow.h>
+#include <kavellaccounts/KABundle.h>
+#include <kavellaccounts/KAFieldList.h>
+
+#include "platform/qt/interface_file.h"
+#include "ui/app_name_label.h"
+#include "ui/progress_spinner.h"
+
+namespace {
+
+const QString kInterfaceType = QStringLiteral("ui");
+
+}  // namespace
+
+KAAppTableRowLoader::KAAppTableRowLoader() = default;
+
+KAAppTableRowLoader::~KAAppTableRowLoader() = default;
+
+bool KAAppTableRowLoader::loadNib(const QString &name)
+{
+    static const kavell::InterfaceFile::WidgetMakers makers{
+        {QStringLiteral("KAAppTableRow"),
+         [](QWidget *parent) -> QWidget * {
+             return new KAAppTableRow(parent);
+         }},
+        {QStringLiteral("AppNameLabel"),
+         [](QWidget *parent) -> QWidget * {
+             return new kavell::AppNameLabel(parent);
+         }},
+        {QStringLiteral("ProgressSpinner"),
+         [](QWidget *parent) -> QWidget * {
+             return new kavell::ProgressSpinner(parent);
+         }},
+    };
+    _rowView.reset();
+    const QString path = KABundle::libraryBundle()->pathForResource(name, kInterfaceType);
+    std::unique_ptr<kavell::InterfaceFile> interface = kavell::InterfaceFile::load(path, nullptr, makers);
+    auto *const row = interface ? qobject_cast<KAAppTableRow *>(interface->root()) : nullptr;
+    if (!row || !row->connectOutlets(*interface))
+        return false;
+    (void)interface->takeRoot().release();
+    _rowView = std::shared_ptr<KAAppTableRow>(row, KAAppTableRow::letGo);
+    return true;
+}
+
+std::shared_ptr<KAAppTableRow> KAAppTableRowLoader::rowView() const
+{
+    return _rowView;
+}
+
+void KAAppTableRowLoader::setRowView(std::shared_ptr<KAAppTableRow> rowView)
+{
+    _rowView = std::move(rowView);
+}
+
+void KAAppTableRowLoader::describeFields(KAFieldList &fields) const
+{
+    fields.add("_rowView", _rowView);
+    KAObject::describeFields(fields);
+}

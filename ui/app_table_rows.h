@@ -1,0 +1,65 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+//
+// Shows the rows of an application table below each other. It asks for a row when the row comes into view, and for all
+// others in idle time, so that a long table costs no long frame. A row belongs to its application: a table that goes, or
+// shows other applications, lets it go. Used by KAAppTableController, on the user-interface thread.
+
+#ifndef KAVELL_UI_APP_TABLE_ROWS_H
+#define KAVELL_UI_APP_TABLE_ROWS_H
+
+#include <functional>
+#include <memory>
+#include <vector>
+
+#include <QtCore/QPointer>
+#include <QtCore/QTimer>
+#include <QtWidgets/QScrollArea>
+#include <QtWidgets/QWidget>
+
+class KAAppTableRow;
+
+namespace kavell {
+
+class AppTablePlace;
+
+class AppTableRows : public QObject {
+    Q_OBJECT
+
+public:
+    using RowAt = std::function<std::shared_ptr<KAAppTableRow>(int row)>;
+
+    /// Shows the rows that `rowAt` answers in `table`, which stands in `scrollView`. Either may be null or go first.
+    AppTableRows(QScrollArea *scrollView, QWidget *table, RowAt rowAt);
+    ~AppTableRows() override;
+
+    /// Whether the selected row has a background of its own; true at first.
+    void setHighlightsSelection(bool highlightsSelection);
+
+    /// Shows that many rows, all of them asked for anew: at once in a table that is seen, else when it is shown or the
+    /// event loop is idle.
+    void reload(int count);
+
+protected:
+    bool eventFilter(QObject *watched, QEvent *event) override;
+
+private:
+    void showRow(int row);
+    void showRowsInView();
+    void showRowsInIdleTime();
+    void placeRows();
+    void chainFocus(int row);
+    void selectPlaceOf(QWidget *widget);
+
+    QPointer<QScrollArea> m_scrollView;
+    QPointer<QWidget> m_table;
+    RowAt m_rowAt;
+    std::vector<QPointer<AppTablePlace>> m_places;  // one for each row; null where it was not asked for yet
+    QTimer m_idleTime;
+    int m_rowHeight;
+    bool m_highlightsSelection = true;
+};
+
+}  // namespace kavell
+
+#endif
