@@ -55,6 +55,16 @@ const OnlineService *onlineServiceOf(const QString &pluginID)
     return nullptr;
 }
 
+/// So that plug-ins can queue their messages by name.
+void registerMessageTypes()
+{
+    qRegisterMetaType<KADataPlugin *>();
+    qRegisterMetaType<std::shared_ptr<KAAccountSetupInput>>();
+    qRegisterMetaType<std::shared_ptr<KAAccountSetupResult>>();
+    qRegisterMetaType<std::shared_ptr<KAAccount>>();
+    qRegisterMetaType<KAError>();
+}
+
 /// Gives the calling thread's place in the global thread pool, if it has one, to another task while it waits for a
 /// plug-in. Were it kept, a few creators could fill the pool, and a plug-in that works in the pool could never report.
 class PlaceInPoolForOthers {
@@ -87,6 +97,7 @@ std::shared_ptr<KAAccountCreator> KAAccountCreator::initWithSettings(const std::
 KAAccountCreator::KAAccountCreator(const std::optional<QVariantMap> &settings, KADataPlugin *plugin)
     : _settings(settings), _plugin(plugin)
 {
+    registerMessageTypes();
 }
 
 KAAccountCreator::~KAAccountCreator()

@@ -2,7 +2,10 @@
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
 // A library of the shape of the maker's online service, for tests. Accounts whose names begin with "brondel" are of the
-// newer kind; the account "absent" has no kind. What was called is counted.
+// newer kind; the account "absent" has no kind, and accounts with "nomail" in their name have no address. What was called
+// is counted, and noted line by line.
+
+#include <string>
 
 #include <kavellaccounts/CSKavellBoolean.h>
 #include <kavellaccounts/CSKavellString.h>
@@ -17,6 +20,10 @@ using kavell::toStdString;
 EXPORTED int testCallCount;
 int testCallCount = 0;
 
+/// The calls about the session and about services, each on a line with its arguments. For one thread at a time.
+EXPORTED std::string testCalls;
+std::string testCalls;
+
 EXPORTED bool testServiceEnabled;
 bool testServiceEnabled = false;
 
@@ -26,11 +33,27 @@ const CSKavellStringRef kNBAccountTypeBrondel = makeString("brondel").leak();
 EXPORTED const CSKavellStringRef kNBServiceIDMail;
 const CSKavellStringRef kNBServiceIDMail = makeString("mail").leak();
 
+/// Variables, so that a test can take one away.
+EXPORTED CSKavellStringRef kNBServiceIDCalendars;
+CSKavellStringRef kNBServiceIDCalendars = makeString("calendars").leak();
+EXPORTED CSKavellStringRef kNBServiceIDContacts;
+CSKavellStringRef kNBServiceIDContacts = makeString("contacts").leak();
+
+EXPORTED const CSKavellStringRef kNBPropertyMailEmailAddress;
+const CSKavellStringRef kNBPropertyMailEmailAddress = makeString("address").leak();
+
 namespace {
 
 CSKavellStringRef joined(CSKavellStringRef first, CSKavellStringRef second)
 {
     return makeString(toStdString(first) + "/" + toStdString(second)).leak();
+}
+
+template <typename... Arguments> void note(const char *call, Arguments... arguments)
+{
+    testCalls += call;
+    ((testCalls += " " + toStdString(arguments)), ...);
+    testCalls += '\n';
 }
 
 }  // namespace
@@ -39,6 +62,9 @@ EXPORTED CSKavellTypeRef NBServiceCopyProperty(CSKavellStringRef account, CSKave
                                                CSKavellStringRef property)
 {
     ++testCallCount;
+    note("copyProperty", account, service, property);
+    if (toStdString(account).find("nomail") != std::string::npos)
+        return nullptr;
     const auto accountAndService = kavell::adopt(joined(account, service));
     return joined(accountAndService.get(), property);
 }
@@ -49,15 +75,17 @@ EXPORTED CSKavellTypeRef NBAccountCopyProperty(CSKavellStringRef account, CSKave
     return joined(account, property);
 }
 
-EXPORTED void NBServiceSetEnabled(CSKavellStringRef, CSKavellStringRef, bool enabled)
+EXPORTED void NBServiceSetEnabled(CSKavellStringRef account, CSKavellStringRef service, bool enabled)
 {
     ++testCallCount;
+    note(enabled ? "enable" : "disable", account, service);
     testServiceEnabled = enabled;
 }
 
-EXPORTED bool NBServiceIsEnabled(CSKavellStringRef, CSKavellStringRef)
+EXPORTED bool NBServiceIsEnabled(CSKavellStringRef account, CSKavellStringRef service)
 {
     ++testCallCount;
+    note("isEnabled", account, service);
     return testServiceEnabled;
 }
 
@@ -76,19 +104,22 @@ EXPORTED CSKavellTypeRef NBCopyAccountType(CSKavellStringRef account)
     return makeString(name.starts_with("brondel") ? "brondel" : "plain").leak();
 }
 
-EXPORTED void NBAccountRefreshLoggedIn(CSKavellStringRef)
+EXPORTED void NBAccountRefreshLoggedIn(CSKavellStringRef account)
 {
     ++testCallCount;
+    note("refresh", account);
 }
 
 EXPORTED bool NBAccountIsLoggedIn(CSKavellStringRef account)
 {
     ++testCallCount;
+    note("isLoggedIn", account);
     return toStdString(account) == "anna";
 }
 
-EXPORTED bool NBAccountLogin(CSKavellStringRef, CSKavellStringRef password)
+EXPORTED bool NBAccountLogin(CSKavellStringRef account, CSKavellStringRef password)
 {
     ++testCallCount;
+    note("login", account, password);
     return toStdString(password) == "right";
 }

@@ -3,10 +3,14 @@
 //
 // An account-list plug-in and a data plug-in that their information dictionary describes (plugin_directory.h).
 
+#include <QtCore/QThread>
+
 #include <kavellaccounts/KAAListPlugin.h>
 #include <kavellaccounts/KABundle.h>
 #include <kavellaccounts/KADataPlugin.h>
 #include <kavellaccounts/KAProvider.h>
+
+#include "tests/support/scripted_data_plugin.h"
 
 namespace {
 
@@ -36,11 +40,32 @@ public:
         image.fill(Qt::green);
         return image;
     }
+
+    /// The property "autodiscoverDomain", else the bundle's text.
+    [[nodiscard]] QString autodiscoverDomain() const override
+    {
+        const QVariant domain = property("autodiscoverDomain");
+        return domain.isValid() ? domain.toString() : KAAListPlugin::autodiscoverDomain();
+    }
+
+    /// For the services of the property "alertServices".
+    [[nodiscard]] bool shouldShowMigrationSyncAlertForService(const QString &service) const override
+    {
+        return property("alertServices").toStringList().contains(service);
+    }
+
+    /// The property "alertAnswer"; adds the service to "alertsShown", on which thread to "alertThread".
+    [[nodiscard]] bool showMigrationSyncAlertForService(const QString &service) override
+    {
+        setProperty("alertsShown", property("alertsShown").toStringList() + QStringList{service});
+        setProperty("alertThread", QVariant::fromValue(QThread::currentThread()));
+        return property("alertAnswer").toBool();
+    }
 };
 
-class ConfigurableDataPlugin : public KADataPlugin {
+class ConfigurableDataPlugin : public kavell::test::ScriptedDataPlugin {
 public:
-    using KADataPlugin::KADataPlugin;
+    using ScriptedDataPlugin::ScriptedDataPlugin;
 
     void pluginDidLoad() override { setProvider(describedProvider(*bundle())); }
 
