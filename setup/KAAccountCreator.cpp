@@ -186,9 +186,8 @@ std::shared_ptr<KAAccountSetupResult> KAAccountCreator::discover(const std::shar
 /// other threads, or by both, and no single thing could be slept on that wakes up for all of them.
 void KAAccountCreator::waitForReport()
 {
-    const bool hasApplication = QCoreApplication::instance();
     std::optional<QEventLoop> events;  // which a program without an application object must not make
-    if (hasApplication)
+    if (QCoreApplication::instance())
         events.emplace();
     while (_waiting) {
         if (events)
@@ -196,7 +195,7 @@ void KAAccountCreator::waitForReport()
         if (!_plugin)
             endWait(QStringLiteral("The plug-in was destroyed while it looked for the account."));
         // Events come no more, and the end of the program waits for the threads of the pool.
-        if (hasApplication && !QCoreApplication::instance())
+        if (QCoreApplication::closingDown())
             endWait(QStringLiteral("The program ended while the plug-in looked for the account."));
         std::this_thread::yield();
     }

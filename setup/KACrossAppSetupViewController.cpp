@@ -128,7 +128,8 @@ void KACrossAppSetupViewController::setUpCheckboxes()
         if (!application)
             continue;
         if (unused.isEmpty()) {
-            kavell::log(QStringLiteral("*** No check box is left for %1").arg(destination.appBundleID));
+            if (_view)
+                kavell::log(QStringLiteral("*** No check box is left for %1").arg(destination.appBundleID));
             continue;
         }
         QCheckBox *const checkbox = unused.takeFirst();
