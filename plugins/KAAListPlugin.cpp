@@ -4,6 +4,7 @@
 #include <kavellaccounts/KAAListPlugin.h>
 
 #include <QtCore/QFile>
+#include <QtWidgets/QVBoxLayout>
 
 #include <kavellaccounts/KAAccount.h>
 #include <kavellaccounts/KAAppTableController.h>
@@ -223,6 +224,23 @@ bool KAAListPlugin::loadInterfaceFile(const QString &name)
     complete &= interface->connectActions(this);
     m_interfaces.push_back(std::move(interface));
     return complete;
+}
+
+void KAAListPlugin::makeAppTable(const std::shared_ptr<KAAccount> &account)
+{
+    _appTableController = KAAppTableController::initWithAccount(account, this);
+    _appTableController->setDelegate(this);
+    _appTableController->setSpinOnSelection(false);
+    _appTableController->setShowInfoButtons(false);
+    if (_appTableContainer && _appTableController->view()) {
+        if (!_appTableContainer->layout())
+            (new QVBoxLayout(_appTableContainer))->setContentsMargins(0, 0, 0, 0);
+        _appTableContainer->layout()->addWidget(_appTableController->view());
+    }
+    if (_appSelectionAccountName) {
+        _appSelectionAccountName->setTextFormat(Qt::PlainText);
+        _appSelectionAccountName->setText(account ? account->loginName() : QString());
+    }
 }
 
 void KAAListPlugin::describeFields(KAFieldList &fields) const

@@ -14,8 +14,11 @@
     <message id="CALENDAR_DATA_NAME"><source></source><translation>‏‮Calendars‬‏</translation></message>
     <message id="PARLEX_DATA_NAME"><source></source><translation>‏‮Messages‬‏</translation></message>
     <message id="CD_DATA_NAME"><source></source><translation>‏‮Contacts‬‏</translation></message>
-    <message id="CONFLICTS_WITH_AERWYN"><source></source><translation>‏‮Not‬‏ ‏‮available‬‏ ‏‮together‬‏ ‏‮with‬‏ ‏‮your‬‏ ‏‮online-service‬‏ ‏‮account‬‏</translation></message>
-    <message id="APP_ROW_LABEL_FORMAT"><source></source><translation>%1 %2</translation></message>
+    <message id="CONFLICTS_WITH_AERWYN"><source></source><translation>‏‮Not‬‏ ‏‮available‬‏ ‏‮with‬‏ ‏‮your‬‏ ‏‮online-service‬‏ ‏‮account‬‏</translation></message>
+    <message id="APP_ROW_LABEL_FORMAT"><source></source><translation>%1 (%2)</translation></message>
+    <message id="APP_TABLE"><source></source><translation>‏‮Applications‬‏</translation></message>
+    <message id="APP_ROW_INFO"><source></source><translation>‏‮Information‬‏ ‏‮about‬‏ %1</translation></message>
+    <message id="APP_ROW_PROGRESS"><source></source><translation>‏‮Setting‬‏ ‏‮up‬‏ %1</translation></message>
     <message id="KAVELL_ACCOUNTS"><source></source><translation>‏‮Online‬‏ ‏‮Accounts‬‏</translation></message>
     <message id="CERT_ERROR_TITLE"><source></source><translation>%1 ‏‮can’t‬‏ ‏‮verify‬‏ ‏‮the‬‏ ‏‮identity‬‏ ‏‮of‬‏ ‏‮the‬‏ ‏‮server‬‏ “%2”.</translation></message>
     <message id="CERT_NOT_YET_VALID_ERROR"><source></source><translation>‏‮The‬‏ ‏‮certificate‬‏ ‏‮of‬‏ “%1” ‏‮is‬‏ ‏‮not‬‏ ‏‮valid‬‏ ‏‮yet.‬‏ ‏‮You‬‏ ‏‮might‬‏ ‏‮be‬‏ ‏‮connecting‬‏ ‏‮to‬‏ ‏‮a‬‏ ‏‮server‬‏ ‏‮that‬‏ ‏‮pretends‬‏ ‏‮to‬‏ ‏‮be‬‏ “%1”, ‏‮which‬‏ ‏‮could‬‏ ‏‮put‬‏ ‏‮your‬‏ ‏‮confidential‬‏ ‏‮information‬‏ ‏‮at‬‏ ‏‮risk.‬‏</translation></message>

@@ -48,12 +48,27 @@
     <message id="CONFLICTS_WITH_AERWYN">
         <source></source>
         <extracomment>Why an application cannot be picked for an account</extracomment>
-        <translation>Not available together with your online-service account</translation>
+        <translation>Not available with your online-service account</translation>
     </message>
     <message id="APP_ROW_LABEL_FORMAT">
         <source></source>
         <extracomment>A row of the applications: the application's name (%1, which comes first), then the service's</extracomment>
-        <translation>%1 %2</translation>
+        <translation>%1 (%2)</translation>
+    </message>
+    <message id="APP_TABLE">
+        <source></source>
+        <extracomment>The table of the applications that can use an account, for screen readers</extracomment>
+        <translation>Applications</translation>
+    </message>
+    <message id="APP_ROW_INFO">
+        <source></source>
+        <extracomment>Information button of a row of the applications; %1 is the row's name</extracomment>
+        <translation>Information about %1</translation>
+    </message>
+    <message id="APP_ROW_PROGRESS">
+        <source></source>
+        <extracomment>In place of a row's check box, for screen readers; %1 is the row's name</extracomment>
+        <translation>Setting up %1</translation>
     </message>
     <message id="KAVELL_ACCOUNTS">
         <source></source>

@@ -96,6 +96,8 @@ void KAAppTableController::loadTable(const QString &name, const std::shared_ptr<
         _scrollView = outlet<QScrollArea>(QStringLiteral("scrollView"));
         _appTable = outlet<QWidget>(QStringLiteral("appsTable"));
     }
+    if (_appTable)
+        _appTable->setAccessibleName(libraryText("APP_TABLE"));
     m_rows =
         std::make_unique<kavell::AppTableRows>(_scrollView, _appTable, [this](int row) { return rowViewForRow(row); });
     if (_scrollView) {
@@ -214,15 +216,12 @@ void KAAppTableController::updateTable()
 void KAAppTableController::selectAllApps()
 {
     for (const Application &application : apps()) {
-        const std::shared_ptr<KAAppTableRow> row = rowViewForApp(application);
-        if (!row)
-            continue;
-        if (row->disableControls()) {
-            row->syncUI();
-            continue;
-        }
-        application->setEnabled(true);
-        row->select();
+        const std::shared_ptr<KAAppTableRow> row = existingRow(application);
+        const bool isDisabled = row ? row->disableControls() : isConflicting(*application);
+        if (!isDisabled)
+            application->setEnabled(true);
+        if (row)
+            isDisabled ? row->syncUI() : row->select();
     }
     reloadTable();
 }
@@ -270,8 +269,10 @@ void KAAppTableController::stopProgressForApp(const Application &application)
 
 void KAAppTableController::stopProgressForAllApps()
 {
-    for (const Application &application : apps())
-        stopProgressForApp(application);
+    for (const Application &application : apps()) {
+        if (existingRow(application))
+            stopProgressForApp(application);
+    }
 }
 
 Application KAAppTableController::appAtRow(int row) const

@@ -15,8 +15,8 @@
 
 #include "platform/qt/interface_file.h"
 #include "platform/qt/log.h"
-#include "ui/app_name_label.h"
 #include "ui/progress_spinner.h"
+#include "ui/row_label.h"
 
 namespace {
 
@@ -61,8 +61,8 @@ void KAAppTableRow::letGo(KAAppTableRow *row)
 bool KAAppTableRow::connectOutlets(kavell::InterfaceFile &interface)
 {
     _checkbox = interface.view<QCheckBox>(QStringLiteral("checkbox"));
-    _appNameField = interface.view<kavell::AppNameLabel>(QStringLiteral("appNameField"));
-    _secondaryTextField = interface.view<QLabel>(QStringLiteral("secondaryTextField"));
+    _appNameField = interface.view<kavell::RowLabel>(QStringLiteral("appNameField"));
+    _secondaryTextField = interface.view<kavell::RowLabel>(QStringLiteral("secondaryTextField"));
     _icon = interface.view<QLabel>(QStringLiteral("icon"));
     _spinner = interface.view<kavell::ProgressSpinner>(QStringLiteral("spinner"));
     _infoButton = interface.view<QAbstractButton>(QStringLiteral("infoButton"));
@@ -252,10 +252,18 @@ void KAAppTableRow::appInfo(QObject *)
 void KAAppTableRow::syncUI()
 {
     const std::shared_ptr<KAApplication> shown = application();
-    _infoButton->setVisible(_showInfoButton && !isSpinning() && shown && shown->enabled());
+    showInfoButtonIf(_showInfoButton && !isSpinning() && shown && shown->enabled());
     _secondaryTextField->setVisible(!_secondaryText.isEmpty());
     if (_disableControls && !_controlsAreDisabled)
         greyOut();
+}
+
+void KAAppTableRow::showInfoButtonIf(bool isNeeded)
+{
+    if (_infoButton->isHidden() == !isNeeded)
+        return;
+    _infoButton->setVisible(isNeeded);
+    placeControls();  // the texts reach as far as there is room
 }
 
 void KAAppTableRow::greyOut()
@@ -264,11 +272,12 @@ void KAAppTableRow::greyOut()
     if (const std::shared_ptr<KAApplication> shown = application())
         shown->setEnabled(false);
     QPalette grey = _appNameField->palette();
-    grey.setColor(_appNameField->foregroundRole(), Qt::gray);
+    for (const QPalette::ColorRole role : {QPalette::WindowText, QPalette::Text})  // the table decides which
+        grey.setColor(role, Qt::gray);
     _appNameField->setPalette(grey);
     _checkbox->setChecked(false);
     _checkbox->setEnabled(false);
-    _infoButton->hide();
+    showInfoButtonIf(false);
     m_iconImage = KAExtras::disabledImage(m_iconImage);
     showIcon();
 }

@@ -15,15 +15,17 @@
 #include <kavellaccounts/KAApplication.h>
 #include <kavellaccounts/KABundle.h>
 
-#include "ui/app_name_label.h"
 #include "ui/progress_spinner.h"
+#include "ui/row_label.h"
 
 namespace {
 
 const QString kImageType = QStringLiteral("png");
 
 constexpr int kRoomAboveName = 7;
-constexpr float kServiceWhite = 0.6F;
+constexpr int kRightMargin = 12;
+constexpr int kDarkOutline = 150;  // per cent
+const QColor kServiceColour = QColor::fromRgbF(0.6F, 0.6F, 0.6F);
 
 /// The two pictures of the information button, read once for all rows and never released.
 struct InfoButtonImages {
@@ -69,21 +71,28 @@ void KAAppTableRow::showTexts()
     const std::shared_ptr<KAApplication> shown = application();
     if (_appDisplayName.isEmpty() && shown)
         _appDisplayName = shown->displayNameForData();
-    if (_serviceDisplayName.isEmpty()) {
-        _appNameField->setTwoToneText(_appDisplayName, -1, {});
-    } else {
-        const QString format = libraryText("APP_ROW_LABEL_FORMAT");
-        const bool isTwoTone = layoutDirection() == Qt::LeftToRight;
-        _appNameField->setTwoToneText(format.arg(_appDisplayName, _serviceDisplayName),
-                                      isTwoTone ? _appDisplayName.size() : -1,
-                                      QColor::fromRgbF(kServiceWhite, kServiceWhite, kServiceWhite));
-    }
+    const QString name = _serviceDisplayName.isEmpty()
+                             ? _appDisplayName
+                             : libraryText("APP_ROW_LABEL_FORMAT").arg(_appDisplayName, _serviceDisplayName);
+    // From right to left the name's end need not be where the service is.
+    if (_serviceDisplayName.isEmpty() || layoutDirection() == Qt::RightToLeft)
+        _appNameField->setOneToneText(name);
+    else
+        _appNameField->setTwoToneText(name, _appDisplayName.size(), kServiceColour);
     _secondaryTextField->setText(_secondaryText.isNull() ? QStringLiteral("") : _secondaryText);
+    showAccessibleTexts();
+}
 
-    _checkbox->setAccessibleName(_appNameField->text());
+void KAAppTableRow::showAccessibleTexts()
+{
+    const std::shared_ptr<KAApplication> shown = application();
+    // What cannot be seen by its icon still has a name to be read out.
+    const QString name = _appNameField->text().isEmpty() && shown ? shown->displayName() : _appNameField->text();
+    setAccessibleName(name);
+    _checkbox->setAccessibleName(name);
     _checkbox->setAccessibleDescription(_secondaryText);
-    _spinner->setAccessibleName(_appNameField->text());
-    _infoButton->setAccessibleName(_appNameField->text());
+    _spinner->setAccessibleName(libraryText("APP_ROW_PROGRESS").arg(name));
+    _infoButton->setAccessibleName(libraryText("APP_ROW_INFO").arg(name));
 }
 
 void KAAppTableRow::showIcon()
@@ -122,14 +131,28 @@ void KAAppTableRow::placeControls()
         place(control, centred(m_designed.value(control)));
     place(_infoButton, centred(m_designed.value(_infoButton).translated(wider, 0)));
 
-    QRect name = m_designed.value(_appNameField).adjusted(0, 0, wider, 0);
-    name.setHeight(std::max(name.height(), _appNameField->fontMetrics().height()));
-    name = centred(name);
-    QRect secondary = m_designed.value(_secondaryTextField).adjusted(0, 0, wider, 0);
-    secondary.setHeight(std::max(secondary.height(), _secondaryTextField->fontMetrics().height()));
+    const auto stretched = [this, wider](const QLabel *field) {
+        QRect place = m_designed.value(field).adjusted(0, 0, wider, 0);
+        if (_infoButton->isHidden())
+            place.setRight(width() - kRightMargin);
+        place.setHeight(std::max(place.height(), field->fontMetrics().height()));
+        return place;
+    };
+    const QRect name = centred(stretched(_appNameField));
+    QRect secondary = stretched(_secondaryTextField);
     secondary.moveBottom(name.top() + kRoomAboveName - 1);
     place(_appNameField, name.translated(0, m_nameOffset));
     place(_secondaryTextField, secondary);
+}
+
+void KAAppTableRow::outlineCheckbox()
+{
+    // Styles draw a check box's outline darker than the window, which cannot be seen in a dark table.
+    QPalette outlined = palette();
+    const QColor base = outlined.color(QPalette::Base), text = outlined.color(QPalette::Text);
+    if (base.lightness() < text.lightness())
+        outlined.setColor(QPalette::Window, text.darker(kDarkOutline));
+    _checkbox->setPalette(outlined);
 }
 
 QSize KAAppTableRow::sizeHint() const
@@ -142,6 +165,11 @@ QSize KAAppTableRow::sizeHint() const
 bool KAAppTableRow::event(QEvent *event)
 {
     switch (event->type()) {
+    case QEvent::PaletteChange:
+    case QEvent::ParentChange:
+        if (_checkbox)
+            outlineCheckbox();
+        break;
     case QEvent::LayoutDirectionChange:
     case QEvent::FontChange:
         if (_appNameField) {

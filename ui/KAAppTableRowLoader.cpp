@@ -8,8 +8,8 @@
 #include <kavellaccounts/KAFieldList.h>
 
 #include "platform/qt/interface_file.h"
-#include "ui/app_name_label.h"
 #include "ui/progress_spinner.h"
+#include "ui/row_label.h"
 
 namespace {
 
@@ -28,9 +28,9 @@ bool KAAppTableRowLoader::loadNib(const QString &name)
          [](QWidget *parent) -> QWidget * {
              return new KAAppTableRow(parent);
          }},
-        {QStringLiteral("AppNameLabel"),
+        {QStringLiteral("RowLabel"),
          [](QWidget *parent) -> QWidget * {
-             return new kavell::AppNameLabel(parent);
+             return new kavell::RowLabel(parent);
          }},
         {QStringLiteral("ProgressSpinner"),
          [](QWidget *parent) -> QWidget * {

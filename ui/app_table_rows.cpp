@@ -48,8 +48,8 @@ AppTableRows::AppTableRows(QScrollArea *scrollView, QWidget *table, RowAt rowAt)
 
 AppTableRows::~AppTableRows()
 {
-    for (AppTablePlace *place : m_places)
-        delete place;
+    for (const Slot &slot : m_slots)
+        delete slot.place;
 }
 
 void AppTableRows::setHighlightsSelection(bool highlightsSelection)
@@ -61,9 +61,11 @@ void AppTableRows::reload(int count)
 {
     if (!m_table)
         return;
-    for (AppTablePlace *place : m_places)
-        delete place;
-    m_places.assign(size_t(count), nullptr);
+    for (size_t row = size_t(count); row < m_slots.size(); ++row)
+        delete m_slots[row].place;
+    m_slots.resize(size_t(count));
+    for (Slot &slot : m_slots)
+        slot.isCurrent = false;
     m_table->setMinimumHeight(count * m_rowHeight);
     m_idleTime.start(0);
     if (m_table->isVisible())
@@ -72,19 +74,19 @@ void AppTableRows::reload(int count)
 
 void AppTableRows::showRow(int row)
 {
-    if (m_places[size_t(row)])
+    Slot &slot = m_slots[size_t(row)];
+    if (slot.isCurrent)
         return;
+    slot.isCurrent = true;
     const std::shared_ptr<KAAppTableRow> view = m_rowAt(row);
+    if (slot.place && slot.place->row() == view.get())
+        return;
+    delete slot.place;
     auto *const place = new AppTablePlace(m_table, m_highlightsSelection);
-    m_places[size_t(row)] = place;
+    slot.place = place;
     connect(place, &AppTablePlace::clicked, this, [this, place] { selectPlaceOf(place); });
-    if (view) {
-        if (const int height = view->sizeHint().height(); height != m_rowHeight) {
-            m_rowHeight = height;
-            m_table->setMinimumHeight(int(m_places.size()) * height);
-            placeRows();
-        }
-    }
+    if (view)
+        adoptRowHeight(view->sizeHint().height());
     place->setGeometry(0, row * m_rowHeight, m_table->width(), m_rowHeight);
     if (view)
         place->hold(view);
@@ -94,20 +96,20 @@ void AppTableRows::showRow(int row)
 
 void AppTableRows::showRowsInView()
 {
-    if (!m_table || m_places.empty())
+    if (!m_table || !m_scrollView)
         return;
     const int top = m_scrollView->verticalScrollBar()->value();
-    const int last = (top + m_scrollView->viewport()->height()) / m_rowHeight;
-    for (int row = top / m_rowHeight; row <= std::min(last, int(m_places.size()) - 1); ++row)
+    const int end = std::min((top + m_scrollView->viewport()->height()) / m_rowHeight + 1, int(m_slots.size()));
+    for (int row = top / m_rowHeight; row < end; ++row)
         showRow(row);
 }
 
 void AppTableRows::showRowsInIdleTime()
 {
-    showRowsInView();
     QElapsedTimer clock;
     clock.start();
-    for (size_t row = 0; m_table && row < m_places.size(); ++row) {
+    showRowsInView();
+    for (size_t row = 0; m_table && row < m_slots.size(); ++row) {
         if (clock.elapsed() >= kIdleMilliseconds)
             return;
         showRow(int(row));
@@ -115,52 +117,60 @@ void AppTableRows::showRowsInIdleTime()
     m_idleTime.stop();
 }
 
+void AppTableRows::adoptRowHeight(int height)
+{
+    if (height == m_rowHeight)
+        return;
+    m_rowHeight = height;
+    m_table->setMinimumHeight(int(m_slots.size()) * height);
+    placeRows();
+}
+
 void AppTableRows::placeRows()
 {
-    for (size_t row = 0; row < m_places.size(); ++row) {
-        if (m_places[row])
-            m_places[row]->setGeometry(0, int(row) * m_rowHeight, m_table->width(), m_rowHeight);
+    for (size_t row = 0; row < m_slots.size(); ++row) {
+        if (m_slots[row].place)
+            m_slots[row].place->setGeometry(0, int(row) * m_rowHeight, m_table->width(), m_rowHeight);
     }
+}
+
+KAAppTableRow *AppTableRows::rowInSlot(int row) const
+{
+    const AppTablePlace *const place = m_slots[size_t(row)].place;
+    return place ? place->row() : nullptr;
 }
 
 void AppTableRows::chainFocus(int row)
 {
     // Rows are made in any order; Tab walks them from top to bottom.
-    QWidget *last = nullptr;
-    const auto append = [&last](const KAAppTableRow &next) {
-        for (QWidget *control : focusControls(next)) {
-            if (last)
-                QWidget::setTabOrder(last, control);
-            last = control;
+    QList<QWidget *> chain;
+    for (int before = row - 1; before >= 0 && chain.isEmpty(); --before) {
+        if (const KAAppTableRow *const view = rowInSlot(before))
+            chain += focusControls(*view).last();
+    }
+    if (const KAAppTableRow *const view = rowInSlot(row))
+        chain += focusControls(*view);
+    for (int after = row + 1; after < int(m_slots.size()); ++after) {
+        if (const KAAppTableRow *const view = rowInSlot(after)) {
+            chain += focusControls(*view).first();
+            break;
         }
-    };
-    const auto rowOf = [this](int index) -> KAAppTableRow * {
-        const bool exists = index >= 0 && index < int(m_places.size()) && m_places[size_t(index)];
-        return exists ? m_places[size_t(index)]->row() : nullptr;
-    };
-    for (int before = row - 1; before >= 0 && !last; --before) {
-        if (const KAAppTableRow *const view = rowOf(before))
-            last = focusControls(*view).last();
     }
-    if (const KAAppTableRow *const view = rowOf(row))
-        append(*view);
-    for (int after = row + 1; after < int(m_places.size()); ++after) {
-        if (const KAAppTableRow *const view = rowOf(after))
-            return append(*view);
-    }
+    for (qsizetype place = 1; place < chain.size(); ++place)
+        QWidget::setTabOrder(chain.at(place - 1), chain.at(place));
 }
 
 void AppTableRows::selectPlaceOf(QWidget *widget)
 {
-    if (!m_table || !widget || !m_table->isAncestorOf(widget))
+    if (!m_table || !m_scrollView || !widget || !m_table->isAncestorOf(widget))
         return;
-    for (AppTablePlace *place : m_places) {
-        if (!place)
+    for (const Slot &slot : m_slots) {
+        if (!slot.place)
             continue;
-        const bool isSelected = place == widget || place->isAncestorOf(widget);
-        place->setSelected(isSelected);
+        const bool isSelected = slot.place == widget || slot.place->isAncestorOf(widget);
+        slot.place->setSelected(isSelected);
         if (isSelected)
-            m_scrollView->ensureWidgetVisible(place, 0, 0);
+            m_scrollView->ensureWidgetVisible(slot.place, 0, 0);
     }
 }
 

@@ -36,15 +36,22 @@ public:
     /// Whether the selected row has a background of its own; true at first.
     void setHighlightsSelection(bool highlightsSelection);
 
-    /// Shows that many rows, all of them asked for anew: at once in a table that is seen, else when it is shown or the
-    /// event loop is idle.
+    /// Shows that many rows, all of them asked for anew: those in view at once in a table that is shown, and all others
+    /// when they come into view or the event loop is idle. A row that stays where it is keeps the focus.
     void reload(int count);
 
 protected:
     bool eventFilter(QObject *watched, QEvent *event) override;
 
 private:
+    struct Slot {
+        QPointer<AppTablePlace> place;  // null where the row was not asked for yet
+        bool isCurrent = false;         // whether the row was asked for since the last reload
+    };
+
     void showRow(int row);
+    void adoptRowHeight(int height);
+    [[nodiscard]] KAAppTableRow *rowInSlot(int row) const;
     void showRowsInView();
     void showRowsInIdleTime();
     void placeRows();
@@ -54,7 +61,7 @@ private:
     QPointer<QScrollArea> m_scrollView;
     QPointer<QWidget> m_table;
     RowAt m_rowAt;
-    std::vector<QPointer<AppTablePlace>> m_places;  // one for each row; null where it was not asked for yet
+    std::vector<Slot> m_slots;  // one for each row
     QTimer m_idleTime;
     int m_rowHeight;
     bool m_highlightsSelection = true;

@@ -144,6 +144,11 @@ protected:
     /// there is no such file, a widget is of the wrong class, or an action has no method.
     bool loadInterfaceFile(const QString &name);
 
+    /// Makes the table of the applications that can use the account, for showAppSelectionPanel: fills _appTableContainer
+    /// with it, in place of an earlier one, lets appToggle of this plug-in decide, and writes the account's login name
+    /// into _appSelectionAccountName. Spinners and information buttons are off: nothing is set up before addAccount.
+    void makeAppTable(const std::shared_ptr<KAAccount> &account);
+
     std::shared_ptr<KAAppTableController> _appTableController;
     std::shared_ptr<KAAccount> _provisionalAccount;  ///< the account being made in the sheet
     std::shared_ptr<KASheetMorpher> _sheetMorpher;

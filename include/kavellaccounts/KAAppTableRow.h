@@ -30,7 +30,7 @@ class KAAppTableController;
 class KAApplication;
 
 namespace kavell {
-class AppNameLabel;
+class RowLabel;
 class InterfaceFile;
 class ProgressSpinner;
 }  // namespace kavell
@@ -118,16 +118,19 @@ private:
 
     bool connectOutlets(kavell::InterfaceFile &interface);
     void greyOut();
+    void showInfoButtonIf(bool isNeeded);
     void showIcon();
+    void outlineCheckbox();
     void placeControls();
     void place(QWidget *control, const QRect &leftToRight) const;
     void textsChanged();
     void showTexts();
+    void showAccessibleTexts();
     void showInfoButtonImage();
 
     QPointer<QCheckBox> _checkbox;
-    QPointer<kavell::AppNameLabel> _appNameField;
-    QPointer<QLabel> _secondaryTextField;
+    QPointer<kavell::RowLabel> _appNameField;
+    QPointer<kavell::RowLabel> _secondaryTextField;
     QPointer<QLabel> _icon;
     QPointer<kavell::ProgressSpinner> _spinner;
     QPointer<QAbstractButton> _infoButton;
