@@ -14,7 +14,6 @@
 #include <kavellaccounts/KAImageExtras.h>
 
 #include "platform/qt/interface_file.h"
-#include "platform/qt/log.h"
 #include "ui/progress_spinner.h"
 #include "ui/row_label.h"
 
@@ -66,10 +65,8 @@ bool KAAppTableRow::connectOutlets(kavell::InterfaceFile &interface)
     _icon = interface.view<QLabel>(QStringLiteral("icon"));
     _spinner = interface.view<kavell::ProgressSpinner>(QStringLiteral("spinner"));
     _infoButton = interface.view<QAbstractButton>(QStringLiteral("infoButton"));
-    if (!_checkbox || !_appNameField || !_secondaryTextField || !_icon || !_spinner || !_infoButton) {
-        kavell::log(QStringLiteral("*** The interface file of a row lacks a control"));
+    if (!_checkbox || !_appNameField || !_secondaryTextField || !_icon || !_spinner || !_infoButton)
         return false;
-    }
     m_designedSize = size();
     for (const QWidget *control : {static_cast<QWidget *>(_checkbox), static_cast<QWidget *>(_appNameField),
                                    static_cast<QWidget *>(_secondaryTextField), static_cast<QWidget *>(_icon),

@@ -119,6 +119,11 @@ void KAAppTableRow::place(QWidget *control, const QRect &leftToRight) const
     control->setGeometry(QStyle::visualRect(layoutDirection(), rect(), leftToRight));
 }
 
+int KAAppTableRow::heightOf(const QLabel *field) const
+{
+    return std::max(m_designed.value(field).height(), field->fontMetrics().height());
+}
+
 void KAAppTableRow::placeControls()
 {
     const int wider = width() - m_designedSize.width();
@@ -135,7 +140,7 @@ void KAAppTableRow::placeControls()
         QRect place = m_designed.value(field).adjusted(0, 0, wider, 0);
         if (_infoButton->isHidden())
             place.setRight(width() - kRightMargin);
-        place.setHeight(std::max(place.height(), field->fontMetrics().height()));
+        place.setHeight(heightOf(field));
         return place;
     };
     const QRect name = centred(stretched(_appNameField));
@@ -157,8 +162,9 @@ void KAAppTableRow::outlineCheckbox()
 
 QSize KAAppTableRow::sizeHint() const
 {
-    const int texts =
-        _appNameField->fontMetrics().height() + _secondaryTextField->fontMetrics().height() + 2 * kRoomAboveName;
+    const int name = heightOf(_appNameField), secondary = heightOf(_secondaryTextField);
+    // The name stands in the middle, and the secondary text ends where the name is once moved down.
+    const int texts = name + 2 * std::max(secondary - kRoomAboveName, kRoomAboveName);
     return {m_designedSize.width(), std::max(m_designedSize.height(), texts)};
 }
 

@@ -8,6 +8,7 @@
 #include <kavellaccounts/KAFieldList.h>
 
 #include "platform/qt/interface_file.h"
+#include "platform/qt/log.h"
 #include "ui/progress_spinner.h"
 #include "ui/row_label.h"
 
@@ -40,9 +41,13 @@ bool KAAppTableRowLoader::loadNib(const QString &name)
     _rowView.reset();
     const QString path = KABundle::libraryBundle()->pathForResource(name, kInterfaceType);
     std::unique_ptr<kavell::InterfaceFile> interface = kavell::InterfaceFile::load(path, nullptr, makers);
-    auto *const row = interface ? qobject_cast<KAAppTableRow *>(interface->root()) : nullptr;
-    if (!row || !row->connectOutlets(*interface))
+    if (!interface)
         return false;
+    auto *const row = qobject_cast<KAAppTableRow *>(interface->root());
+    if (!row || !row->connectOutlets(*interface)) {
+        kavell::log(QStringLiteral("*** The interface file %1 has no row, or one that lacks a control").arg(path));
+        return false;
+    }
     (void)interface->takeRoot().release();
     _rowView = std::shared_ptr<KAAppTableRow>(row, KAAppTableRow::letGo);
     return true;

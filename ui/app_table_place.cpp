@@ -54,6 +54,11 @@ void AppTablePlace::mousePressEvent(QMouseEvent *)
     emit clicked();
 }
 
+void AppTablePlace::mouseReleaseEvent(QMouseEvent *)
+{
+    // Taken with the press that it ends.
+}
+
 void AppTablePlace::paintEvent(QPaintEvent *)
 {
     QPainter painter(this);

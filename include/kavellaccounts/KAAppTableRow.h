@@ -122,6 +122,7 @@ private:
     void showIcon();
     void outlineCheckbox();
     void placeControls();
+    [[nodiscard]] int heightOf(const QLabel *field) const;
     void place(QWidget *control, const QRect &leftToRight) const;
     void textsChanged();
     void showTexts();

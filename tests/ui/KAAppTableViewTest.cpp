@@ -1,0 +1,341 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+//
+// The application table on the screen: clicks and keys, which rows stand in it, and how long rows live.
+
+#include <thread>
+
+#include <gmock/gmock.h>
+
+#include <QtCore/QPointer>
+#include <QtGui/QAccessible>
+#include <QtTest/QTest>
+#include <QtWidgets/QApplication>
+#include <QtWidgets/QScrollBar>
+
+#include "tests/ui/app_table_fixture.h"
+
+using namespace kavell::test;
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+namespace {
+
+QList<Application> manyApplications(int count)
+{
+    QList<Application> applications;
+    for (int number = 0; number < count; ++number) {
+        applications += KAApplication::initWithBundleID("com.example." + QString::number(number));
+        applications.last()->setDisplayName("Application " + QString::number(number));
+    }
+    return applications;
+}
+
+std::shared_ptr<KAAppTableRow> keptRow(const Application &application)
+{
+    return application->userInfo()->value("rowView").value<std::shared_ptr<KAAppTableRow>>();
+}
+
+class KAAppTableViewTest : public testing::Test {
+protected:
+    KAAppTableViewTest()
+    {
+        table->setDelegate(&delegate);
+        table->setSpinOnSelection(false);
+    }
+
+    ~KAAppTableViewTest() override { qApp->setLayoutDirection(Qt::LeftToRight); }
+
+    void show(int height = 240)
+    {
+        table->view()->resize(420, height);
+        table->view()->show();
+        ASSERT_TRUE(QTest::qWaitForWindowActive(table->view()));
+    }
+
+    /// Shows that many applications which no plug-in knows.
+    void showMany(int count)
+    {
+        table->setApps(manyApplications(count));
+        table->reloadTable();
+    }
+
+    [[nodiscard]] int rowsMade() const
+    {
+        int made = 0;
+        for (const Application &application : table->apps())
+            made += keptRow(application) ? 1 : 0;
+        return made;
+    }
+
+    [[nodiscard]] QScrollArea *scrollView() const { return qobject_cast<QScrollArea *>(table->view()); }
+    [[nodiscard]] KAAppTableRow &row(int index) const { return *table->rowViewForRow(index); }
+    [[nodiscard]] bool isShown(const KAAppTableRow &view) const { return scrollView()->widget()->isAncestorOf(&view); }
+
+    OfferingPlugin plugin{allServices()};
+    RecordingDelegate delegate;
+    std::shared_ptr<KAAppTableController> table = KAAppTableController::initWithAccount(accountFor({}), &plugin);
+};
+
+TEST_F(KAAppTableViewTest, AClickOnACheckBoxAsksTheDelegate)
+{
+    show();
+    QTest::mouseClick(checkboxOf(row(2)), Qt::LeftButton);
+    EXPECT_THAT(delegate.toggled, ElementsAre(table->appAtRow(2)));
+    EXPECT_TRUE(table->appAtRow(2)->enabled());
+    EXPECT_TRUE(checkboxOf(row(2))->isChecked());
+    EXPECT_TRUE(infoButtonOf(row(2))->isVisible());
+}
+
+TEST_F(KAAppTableViewTest, ARefusedClickIsTakenBackOnTheScreen)
+{
+    delegate.accepts = false;
+    show();
+    QTest::mouseClick(checkboxOf(row(0)), Qt::LeftButton);
+    EXPECT_FALSE(checkboxOf(row(0))->isChecked());
+    EXPECT_TRUE(table->appAtRow(0)->enabled());
+}
+
+TEST_F(KAAppTableViewTest, AClickedRowSpinsUntilItIsToldToStop)
+{
+    row(0).setSpinOnSelection(true);
+    show();
+    QTest::mouseClick(checkboxOf(row(0)), Qt::LeftButton);
+    EXPECT_TRUE(row(0).isSpinning());
+    EXPECT_FALSE(infoButtonOf(row(0))->isVisible());
+    table->stopProgressForAllApps();
+    EXPECT_TRUE(checkboxOf(row(0))->isVisible());
+    EXPECT_TRUE(infoButtonOf(row(0))->isVisible());
+}
+
+TEST_F(KAAppTableViewTest, TheInformationButtonTellsTheDelegate)
+{
+    show();
+    table->selectAllApps();
+    QTest::mouseClick(infoButtonOf(row(1)), Qt::LeftButton);
+    EXPECT_THAT(delegate.shown, ElementsAre(table->appAtRow(1)));
+    EXPECT_THAT(delegate.toggled, IsEmpty());
+}
+
+TEST_F(KAAppTableViewTest, AClickOnARowSelectsItAlone)
+{
+    show();
+    QTest::mouseClick(nameOf(row(1)), Qt::LeftButton);
+    EXPECT_TRUE(row(1).isSelected());
+    QTest::mouseClick(nameOf(row(2)), Qt::LeftButton);
+    EXPECT_FALSE(row(1).isSelected());
+    EXPECT_TRUE(row(2).isSelected());
+}
+
+TEST_F(KAAppTableViewTest, ASelectedRowOfAnAccountsTableHasNoHighlight)
+{
+    show();
+    const auto background = [this] {
+        return table->view()->grab().toImage().pixelColor(nameOf(row(3))->mapTo(table->view(), QPoint(-4, 0)));
+    };
+    const QColor before = background();
+    row(3).setSelected(true);
+    EXPECT_EQ(background(), before);
+}
+
+TEST_F(KAAppTableViewTest, SpaceTogglesAndTabWalksFromTopToBottom)
+{
+    table->appAtRow(1)->setEnabled(true);
+    show();
+    for (int index : {3, 1, 0, 2})
+        (void)row(index);
+    checkboxOf(row(0))->setFocus();
+    QTest::keyClick(QApplication::focusWidget(), Qt::Key_Space);
+    EXPECT_THAT(delegate.toggled, ElementsAre(table->appAtRow(0)));
+    const QList<QWidget *> expected = {infoButtonOf(row(0)), checkboxOf(row(1)), infoButtonOf(row(1)),
+                                       checkboxOf(row(2)), checkboxOf(row(3))};
+    for (QWidget *const next : expected) {
+        QTest::keyClick(QApplication::focusWidget(), Qt::Key_Tab);
+        EXPECT_EQ(QApplication::focusWidget(), next);
+    }
+    EXPECT_TRUE(row(3).isSelected());
+    QTest::keyClick(QApplication::focusWidget(), Qt::Key_Backtab, Qt::ShiftModifier);
+    EXPECT_EQ(QApplication::focusWidget(), checkboxOf(row(2)));
+}
+
+TEST_F(KAAppTableViewTest, TabReachesRowsThatWereOutOfView)
+{
+    showMany(50);
+    show(120);
+    checkboxOf(row(0))->setFocus();
+    for (int index = 1; index < 50; ++index) {
+        QTest::keyClick(QApplication::focusWidget(), Qt::Key_Tab);
+        ASSERT_EQ(QApplication::focusWidget(), checkboxOf(row(index)));
+        ASSERT_FALSE(row(index).visibleRegion().isEmpty());
+    }
+}
+
+TEST_F(KAAppTableViewTest, TheSpinnerKeepsTheFocusInItsRow)
+{
+    row(0).setSpinOnSelection(true);
+    show();
+    checkboxOf(row(0))->setFocus();
+    QTest::keyClick(checkboxOf(row(0)), Qt::Key_Space);
+    EXPECT_TRUE(row(0).isAncestorOf(QApplication::focusWidget()));
+    table->stopProgressForApp(table->appAtRow(0));
+    EXPECT_EQ(QApplication::focusWidget(), checkboxOf(row(0)));
+}
+
+TEST_F(KAAppTableViewTest, ReloadingKeepsTheFocus)
+{
+    show();
+    checkboxOf(row(1))->setFocus();
+    table->selectAllApps();
+    EXPECT_EQ(QApplication::focusWidget(), checkboxOf(row(1)));
+}
+
+TEST_F(KAAppTableViewTest, RowsStandBelowEachOtherInTheOrderOfTheApplications)
+{
+    show();
+    for (int index = 0; index < 4; ++index) {
+        EXPECT_EQ(row(index).mapTo(scrollView()->widget(), QPoint()), QPoint(0, 48 * index));
+        EXPECT_EQ(row(index).width(), scrollView()->viewport()->width());
+    }
+    table->view()->resize(600, 240);
+    EXPECT_EQ(row(3).width(), scrollView()->viewport()->width());
+}
+
+TEST_F(KAAppTableViewTest, NoRowIsMadeBeforeTheTableIsShown)
+{
+    EXPECT_EQ(rowsMade(), 0);
+    show();
+    EXPECT_EQ(rowsMade(), 4);
+}
+
+TEST_F(KAAppTableViewTest, RowsInViewAreMadeAtOnceAndAllOthersInIdleTime)
+{
+    show();
+    showMany(50);
+    EXPECT_EQ(rowsMade(), 5);
+    ASSERT_TRUE(QTest::qWaitFor([this] { return rowsMade() == 50; }));
+    EXPECT_EQ(scrollView()->verticalScrollBar()->maximum(), 50 * 48 - scrollView()->viewport()->height());
+}
+
+TEST_F(KAAppTableViewTest, ScrollingMakesTheRowsThatComeIntoView)
+{
+    show();
+    showMany(50);
+    scrollView()->verticalScrollBar()->setValue(scrollView()->verticalScrollBar()->maximum());
+    EXPECT_TRUE(keptRow(table->apps().last()));
+    EXPECT_FALSE(keptRow(table->apps().at(20)));
+    EXPECT_TRUE(isShown(row(49)));
+}
+
+TEST_F(KAAppTableViewTest, OtherApplicationsTakeTheRowsPlaces)
+{
+    show();
+    const QList<Application> former = table->apps();
+    table->setApps({former.at(3), former.at(0)});
+    table->setPairedServices({kKAServiceIM, kKAServiceIMAP});
+    table->reloadTable();
+    EXPECT_EQ(row(0).mapTo(scrollView()->widget(), QPoint()), QPoint(0, 0));
+    EXPECT_EQ(row(1).mapTo(scrollView()->widget(), QPoint()), QPoint(0, 48));
+    EXPECT_EQ(row(0).application(), former.at(3));
+    EXPECT_FALSE(isShown(*keptRow(former.at(2))));
+    EXPECT_FALSE(keptRow(former.at(2))->isVisible());
+}
+
+TEST_F(KAAppTableViewTest, ARowDiesWithItsApplication)
+{
+    show();
+    QList<QPointer<KAAppTableRow>> rows;
+    for (int index = 0; index < 4; ++index)
+        rows += &row(index);
+    table->setApps({});
+    for (const QPointer<KAAppTableRow> &dead : rows)
+        EXPECT_FALSE(dead);
+    table->reloadTable();
+    table->view()->repaint();
+}
+
+TEST_F(KAAppTableViewTest, ARowOutlivesTheTableThatShowedIt)
+{
+    show();
+    const Application mail = table->appAtRow(0);
+    const QPointer<KAAppTableRow> view = &row(0);
+    table.reset();
+    ASSERT_TRUE(view);
+    EXPECT_EQ(view->parent(), nullptr);
+    EXPECT_FALSE(view->isVisible());
+    EXPECT_EQ(view->delegate(), nullptr);
+    checkboxOf(*view)->click();
+    EXPECT_THAT(delegate.toggled, IsEmpty());
+}
+
+TEST_F(KAAppTableViewTest, ARowThatIsShownElsewhereMovesThere)
+{
+    show();
+    const auto other = KAAppTableController::initWithAccount(accountFor({}), &plugin);
+    other->view()->resize(420, 240);
+    other->view()->show();
+    other->setApps({table->appAtRow(0)});
+    other->reloadTable();
+    EXPECT_TRUE(other->view()->isAncestorOf(&row(0)));
+    EXPECT_EQ(other->rowViewForRow(0).get(), &row(0));
+    EXPECT_EQ(row(0).delegate(), table.get());
+    table->reloadTable();
+    EXPECT_TRUE(isShown(row(0)));
+}
+
+TEST_F(KAAppTableViewTest, ARowWhoseTableIsGoneAnswersToTheNext)
+{
+    const Application mail = table->appAtRow(0);
+    (void)row(0);
+    const auto other = KAAppTableController::initWithAccount(accountFor({}), &plugin);
+    table.reset();
+    EXPECT_EQ(other->rowViewForApp(mail)->delegate(), other.get());
+}
+
+TEST_F(KAAppTableViewTest, TheLastReferenceMayGoOnAnotherThread)
+{
+    show();
+    const QPointer<KAAppTableRow> view = &row(0);
+    Application mail = table->appAtRow(0);
+    table->setApps({});
+    std::thread([&mail] { mail.reset(); }).join();
+    ASSERT_TRUE(QTest::qWaitFor([&view] { return view.isNull(); }));
+}
+
+TEST_F(KAAppTableViewTest, TheApplicationsMayGoWhileTheDelegateIsAsked)
+{
+    show();
+    const QPointer<KAAppTableRow> view = &row(0);
+    delegate.whenAsked = [this] {
+        delegate.toggled.clear();
+        table->setApps({});
+    };
+    QTest::mouseClick(checkboxOf(*view), Qt::LeftButton);
+    ASSERT_TRUE(QTest::qWaitFor([&view] { return view.isNull(); }));
+}
+
+TEST_F(KAAppTableViewTest, AViewThatIsDeletedFirstDoesNotHurt)
+{
+    show();
+    const QPointer<KAAppTableRow> view = &row(0);
+    delete table->view();
+    EXPECT_TRUE(view);
+    table->reloadTable();
+    table->selectAllApps();
+    EXPECT_TRUE(checkboxOf(*view)->isChecked());
+}
+
+TEST_F(KAAppTableViewTest, ScreenReadersFindTheTableAndItsControls)
+{
+    show();
+    EXPECT_EQ(scrollView()->widget()->accessibleName(), "Applications");
+    QAccessibleInterface *const box = QAccessible::queryAccessibleInterface(checkboxOf(row(0)));
+    ASSERT_TRUE(box);
+    EXPECT_EQ(box->text(QAccessible::Name), "Letters (Zorbo Mail)");
+    EXPECT_EQ(box->role(), QAccessible::CheckBox);
+    QAccessibleInterface *ancestor = box;
+    while (ancestor && ancestor->object() != scrollView()->widget())
+        ancestor = ancestor->parent();
+    EXPECT_TRUE(ancestor);
+}
+
+}  // namespace
