@@ -12,6 +12,9 @@
     <message id="USER_NAME_LABEL"><source></source><translation>E-mail address:</translation></message>
     <message id="PASSWORD_LABEL"><source></source><translation>Password:</translation></message>
     <message id="FULL_NAME_LABEL"><source></source><translation>Full name:</translation></message>
+    <message id="SERVICE_DISPLAY_NAME_MAIL"><source></source><translation>Zorbo Mail</translation></message>
+    <message id="SERVICE_DISPLAY_NAME_CALENDARS"><source></source><translation>Zorbo Calendars</translation></message>
+    <message id="SERVICE_DISPLAY_NAME_CONTACTS"><source></source><translation>Zorbo Contacts</translation></message>
     <message id="SERVICE_DISPLAY_NAME_IM"><source></source><translation>Zorbo Talk</translation></message>
     <message id="MAIL_DATA_NAME"><source></source><translation>Mail</translation></message>
     <message id="CALENDAR_DATA_NAME"><source></source><translation>Calendars</translation></message>

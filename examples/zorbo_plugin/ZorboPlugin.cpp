@@ -192,6 +192,9 @@ void ZorboPlugin::endAttempt(int returnCode)
 /// presses and the keyboard where the user goes on.
 void ZorboPlugin::showView(QWidget *view, bool animate)
 {
+    // A page that is not on the screen is not told of what became visible in it.
+    view->layout()->invalidate();
+    view->layout()->activate();
     int width = view->sizeHint().width();
     for (const QWidget *page : {m_signIn->view(), _validationView.data(), _appSelectionView.data()})
         width = std::max(width, page->sizeHint().width());

@@ -12,21 +12,17 @@
 namespace {
 
 constexpr int kCharacters = 32;  // of a field that can be seen at once
-constexpr int kProblemLines = 2;
 
 }  // namespace
 
 void showProblem(QLabel *label, QLabel *icon, const QString &sentence)
 {
-    const int side = label->style()->pixelMetric(QStyle::PM_SmallIconSize, nullptr, label);
-    icon->setFixedWidth(sentence.isEmpty() ? 0 : side);
-    icon->setPixmap(sentence.isEmpty()
-                        ? QPixmap()
-                        : label->style()->standardIcon(QStyle::SP_MessageBoxWarning, nullptr, label).pixmap(side));
-    icon->setAlignment(Qt::AlignTop);
-    label->setAlignment(Qt::AlignTop | Qt::AlignLeading);
-    label->setMinimumHeight(label->fontMetrics().lineSpacing() * kProblemLines);
+    const QStyle *const style = label->style();
+    const int side = style->pixelMetric(QStyle::PM_SmallIconSize, nullptr, label);
+    icon->setPixmap(style->standardIcon(QStyle::SP_MessageBoxWarning, nullptr, label).pixmap(side));
+    icon->setVisible(!sentence.isEmpty());
     label->setText(sentence);
+    label->setVisible(!sentence.isEmpty());
     if (!sentence.isEmpty()) {
         QAccessibleEvent news(label, QAccessible::Alert);
         QAccessible::updateAccessibility(&news);

@@ -20,8 +20,8 @@
 #include <QtWidgets/QPushButton>
 #include <QtWidgets/QWidget>
 
-/// Shows a sentence in a label for problems, which keeps its place when there is none, with a warning sign beside it,
-/// and has screen readers say it. An empty one takes both away.
+/// Shows a sentence in a label for problems, with a warning sign beside it, and has screen readers say it. An empty one
+/// takes both away. Called before the page is shown, which is then made high enough.
 void showProblem(QLabel *label, QLabel *icon, const QString &sentence);
 
 class SignInPage {

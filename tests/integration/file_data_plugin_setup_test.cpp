@@ -7,7 +7,9 @@
 
 #include <QtCore/QUrl>
 
+#include <kavellaccounts/KAAccountCreator.h>
 #include <kavellaccounts/KAConstants.h>
+#include <kavellaccounts/KAProvider.h>
 
 #include "tests/integration/data_plugin_fixture.h"
 
@@ -216,6 +218,50 @@ TEST_F(FileDataPluginSetup, SaysThatTheApplicationHasTheAccountAlready)
     ASSERT_TRUE(result);
     EXPECT_TRUE(result->receivingAlreadyExistsInMail());
     EXPECT_TRUE(result->sendingAlreadyExistsInMail());
+}
+
+/// Creates an account as the library does for a user who wants it in a second application: on a worker thread, whose
+/// events the creator runs while this thread does nothing. The settings of the account that was made.
+template <typename Creator> QVariantMap createdBy(KADataPlugin &dataPlugin, const QVariantMap &settings)
+{
+    bool isMade = false;
+    const std::unique_ptr<QThread> worker(QThread::create([&] {
+        const auto creator = Creator::initWithSettings(settings, &dataPlugin);
+        creator->setProvider(KAProvider::initWithProviderType("com.example.account.zorbo"));
+        isMade = creator->create();
+        EXPECT_TRUE(isMade) << creator->failureReason().toStdString();
+    }));
+    worker->start();
+    EXPECT_TRUE(worker->wait(20000));
+    const QStringList uids = dataPlugin.accountUIDs();
+    return isMade && uids.size() == 1 ? dataPlugin.settingsForAccountUID(uids.first()) : QVariantMap();
+}
+
+TEST_F(FileDataPluginSetup, TheCreatorOfMailAccountsMakesOne)
+{
+    const QVariantMap made = createdBy<KAMailAccountCreator>(
+        plugin(), {{"emailAddress", "carla@zorbo.example"}, {"accountDescription", "Work"}});
+    EXPECT_EQ(made.value("emailAddress").toString(), "carla@zorbo.example");
+    EXPECT_EQ(made.value("accountDescription").toString(), "Work");
+}
+
+TEST_F(FileDataPluginSetup, TheCreatorsOfTheOtherApplicationsMakeOneEach)
+{
+    const QVariantMap settings{{"userName", "carla@zorbo.example"}, {"emailAddress", "carla@zorbo.example"}};
+    EXPECT_EQ(createdBy<KATidewellAccountCreator>(plugin(kKACalendarPluginID), settings).value("serverAddress"),
+              "calendar.zorbo.example");
+    EXPECT_EQ(createdBy<KACardellAccountCreator>(plugin(kKAContactsPluginID), settings).value("serverAddress"),
+              "contacts.zorbo.example");
+    EXPECT_EQ(createdBy<KAParlexAccountCreator>(plugin(kKAChatPluginID), settings).value("KAChatLoginName"),
+              "carla@zorbo.example");
+}
+
+TEST_F(FileDataPluginSetup, ACreatorIsToldThatAnAccountIsImpossible)
+{
+    const auto creator = KAMailAccountCreator::initWithSettings(QVariantMap{{"emailAddress", "carla"}}, &plugin());
+    creator->setProvider(KAProvider::initWithProviderType("com.example.account.zorbo"));
+    EXPECT_FALSE(creator->create());
+    EXPECT_THAT(plugin().accountUIDs(), IsEmpty());
 }
 
 }  // namespace kavell::test

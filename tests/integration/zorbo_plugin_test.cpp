@@ -4,8 +4,11 @@
 // The example account-list plug-in, loaded as the build makes it, and its sheet used by hand: fields are filled in,
 // buttons are clicked and keys pressed.
 
-#include <gmock/gmock.h>
+#include <fcntl.h>
 #include <sys/file.h>
+#include <unistd.h>
+
+#include <gmock/gmock.h>
 
 #include <QtCore/QProcess>
 #include <QtCore/QTimer>
@@ -14,6 +17,7 @@
 
 #include <kavellaccounts/CSKavellAccountConstants.h>
 #include <kavellaccounts/CSKavellNotification.h>
+#include <kavellaccounts/Ref.h>
 
 #include "tests/integration/zorbo_fixture.h"
 
@@ -62,7 +66,7 @@ TEST_F(ZorboSheet, ThePluginSaysWhatItsTablesSay)
     EXPECT_EQ(zorbo().supportURL(), QUrl("https://help.zorbo.example/en/"));
     EXPECT_EQ(zorbo().autodiscoverDomain(), "zorbo.example");
     EXPECT_EQ(zorbo().serviceDisplayNameForService(kKAServiceIM), "Zorbo Talk");
-    EXPECT_EQ(zorbo().serviceDisplayNameForService(kKAServiceIMAP), "Zorbo Mail");
+    EXPECT_EQ(zorbo().serviceDisplayNameForService(kKAServiceCalDAV), "Zorbo Calendars");
     EXPECT_EQ(zorbo().displayNameForApplication(KAPluginManager::shared()->parlexApp()), "Messages");
     EXPECT_FALSE(zorbo().bannerImage().isNull());
     EXPECT_FALSE(zorbo().imageForAccount(nullptr).isNull());
@@ -333,6 +337,33 @@ TEST_F(ZorboSheet, TheWindowMayGoDuringTheValidation)
     click("appSelectionOKButton");
     EXPECT_TRUE(runUntil([] { return !sheet(); }));
     EXPECT_THAT(storedAccounts(), SizeIs(1));
+}
+
+TEST_F(ZorboSheet, CancelWhileTheAccountIsBeingSavedTakesItBack)
+{
+    openApplications();
+    // Somebody else has the vault for a while, so that saving takes as long as this test wants.
+    const std::string vault = homePath("data/kavell-accounts");
+    std::filesystem::create_directories(vault);
+    const int lock = open((vault + "/vault.lock").c_str(), O_RDWR | O_CREAT | O_CLOEXEC, 0600);
+    ASSERT_EQ(flock(lock, LOCK_EX), 0);
+    const auto changes = adopt(CSKavellNotificationObserverCreate(kCSKavellAccountNotificationSender));
+    auto changesSeen = [&, seen = 0]() mutable {
+        while (adopt(CSKavellNotificationObserverCopyNext(changes.get())))
+            ++seen;
+        return seen;
+    };
+
+    click("appSelectionOKButton");
+    ASSERT_TRUE(reaches("validationView"));
+    EXPECT_EQ(textOf("validationStatus"), "Saving the account…");
+    click("validationCancel");
+    EXPECT_FALSE(sheet());
+    close(lock);
+
+    ASSERT_TRUE(runUntil([&] { return changesSeen() == 2; })) << "saved, and removed";
+    EXPECT_THAT(storedAccounts(), IsEmpty());
+    EXPECT_TRUE(newAccount("carla@zorbo.example", kZorboProviderType)->password().isNull());
 }
 
 TEST_F(ZorboSheet, AnAccountWhosePasswordCannotBeStoredIsNotAdded)
