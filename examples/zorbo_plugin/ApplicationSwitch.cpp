@@ -3,10 +3,15 @@
 
 #include "ApplicationSwitch.h"
 
+#include <iterator>
+
 #include <QtWidgets/QMessageBox>
 #include <QtWidgets/QPushButton>
 
 #include <kavellaccounts/CSKavellAccount.h>
+#include <kavellaccounts/CSKavellAccountConstants.h>
+#include <kavellaccounts/CSKavellDictionary.h>
+#include <kavellaccounts/CSKavellNotification.h>
 #include <kavellaccounts/KAAListPlugin.h>
 #include <kavellaccounts/KAAccount.h>
 #include <kavellaccounts/KAApplication.h>
@@ -16,6 +21,7 @@
 #include <kavellaccounts/KANotificationCenter.h>
 #include <kavellaccounts/KAPluginManager.h>
 #include <kavellaccounts/KAProvider.h>
+#include <kavellaccounts/Ref.h>
 
 #include "SetupDriver.h"
 #include "application_input.h"
@@ -44,6 +50,18 @@ QString childUIDOf(const KAAccount &account, const KAApplication &application)
 bool isStored(const KAAccount &account)
 {
     return KAProvider::initWithProviderType(account.provider())->hasAccountWithLoginName(account.loginName());
+}
+
+/// Tells every process, as saving an account does, that there is something new about it.
+void announce(const KAAccount &account)
+{
+    const auto provider = kavell::makeString(account.provider().toStdString());
+    const auto loginName = kavell::makeString(account.loginName().toStdString());
+    const CSKavellTypeRef keys[] = {kCSKavellAccountProviderName, kCSKavellAccountUserLoginName};
+    const CSKavellTypeRef values[] = {provider.get(), loginName.get()};
+    const auto information = kavell::adopt(CSKavellDictionaryCreate(keys, values, std::size(keys)));
+    (void)CSKavellNotificationPost(kCSKavellAccountNotificationSender,
+                                   kCSKavellAccountProviderSettingsChangedNotification, information.get());
 }
 
 bool isInactive(const QVariantMap &settings)
@@ -147,22 +165,24 @@ void ApplicationSwitch::finish(const Order &order, const Outcome &outcome)
                                         {{QStringLiteral("plugin"), QVariant::fromValue(m_plugin)}});
 }
 
-/// Stores the child's settings in the online account, or forgets a child that the application does not have, and
-/// commits, which tells other processes.
+/// Stores the child's settings in the online account, or forgets a child that the application does not have. Where the
+/// account has nothing new to store it is not saved either: whether the child is inactive, the application alone keeps.
 void ApplicationSwitch::remember(const Order &order, const Outcome &outcome) const
 {
-    if (outcome.childUID.isNull())
+    if (outcome.childUID.isNull() || (outcome.settings.isEmpty() && order.on))
         return;
-    if (!outcome.settings.isEmpty()) {
-        const QString pluginID = order.application->associatedPluginID();
-        order.account->addChildAccountDict(
-            KAAccount::childDictionaryWithSettings(outcome.settings, outcome.childUID, pluginID), outcome.childUID);
-    } else if (!order.on) {
-        order.account->removeChildAccountWithUID(outcome.childUID);
+    KAAccount &account = *order.account;
+    const QVariantMap child = KAAccount::childDictionaryWithSettings(outcome.settings, outcome.childUID,
+                                                                     order.application->associatedPluginID());
+    if (outcome.settings.isEmpty()) {
+        account.removeChildAccountWithUID(outcome.childUID);
+    } else if (account.childAccountWithUID(outcome.childUID) != child) {
+        account.addChildAccountDict(child, outcome.childUID);
     } else {
+        announce(account);
         return;
     }
-    _CSKavellAccountCommitChanges(order.account->accountRef());
+    _CSKavellAccountCommitChanges(account.accountRef());
 }
 
 void ApplicationSwitch::showProblem(QWidget *window, const QString &sentence) const

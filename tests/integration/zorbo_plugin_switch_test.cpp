@@ -6,6 +6,10 @@
 
 #include <gmock/gmock.h>
 
+#include <kavellaccounts/CSKavellAccountConstants.h>
+#include <kavellaccounts/CSKavellNotification.h>
+#include <kavellaccounts/Ref.h>
+
 #include "tests/integration/zorbo_fixture.h"
 
 namespace kavell::test {
@@ -139,6 +143,28 @@ TEST_F(ZorboSwitch, OffKeepsTheApplicationsAccountForTheNextOn)
     EXPECT_TRUE(account->enabledForApplication(kKAMailAppID));
     EXPECT_EQ(childUID(*account), uid);
     EXPECT_THAT(mailData().accountUIDs(), ElementsAre(uid));
+}
+
+TEST_F(ZorboSwitch, OffAndOnTellEveryProcessWithoutSavingWhatIsNoNews)
+{
+    installAllDataPlugins();
+    const auto account = storedAccount();
+    turn(true, kKAMailAppID, account);
+    const std::string path = dataFilePath(kZorboProviderType.toStdString(), "carla@zorbo.example");
+    const auto saved = std::filesystem::last_write_time(path);
+    const auto changes = adopt(CSKavellNotificationObserverCreate(kCSKavellAccountNotificationSender));
+    for (const bool on : {false, true}) {
+        turn(on, kKAMailAppID, account);
+        const auto change = adopt(CSKavellNotificationObserverCopyNext(changes.get()));
+        ASSERT_TRUE(change);
+        EXPECT_TRUE(CSKavellEqual(CSKavellNotificationGetObject(change.get()),
+                                  kCSKavellAccountProviderSettingsChangedNotification));
+        EXPECT_EQ(toStringView(static_cast<CSKavellStringRef>(CSKavellDictionaryGetValue(
+                      CSKavellNotificationGetUserInformation(change.get()), kCSKavellAccountUserLoginName))),
+                  "carla@zorbo.example");
+        EXPECT_FALSE(adopt(CSKavellNotificationObserverCopyNext(changes.get())));
+    }
+    EXPECT_EQ(std::filesystem::last_write_time(path), saved);
 }
 
 TEST_F(ZorboSwitch, OffOfWhatIsNotOnChangesNothing)
