@@ -8,13 +8,16 @@
 #include <gmock/gmock.h>
 
 #include <QtCore/QPointer>
+#include <QtWidgets/QCheckBox>
 
 #include <kavellaccounts/KAAccount.h>
 #include <kavellaccounts/KAAppTableController.h>
+#include <kavellaccounts/KAAppTableRow.h>
 #include <kavellaccounts/KAApplication.h>
 #include <kavellaccounts/KABundle.h>
 #include <kavellaccounts/KAConstants.h>
 #include <kavellaccounts/KANotificationCenter.h>
+#include <kavellaccounts/KAProvider.h>
 #include <kavellaccounts/KASheetMorpher.h>
 #include <kavellaccounts/KASheetWindow.h>
 
@@ -41,6 +44,28 @@ public:
     using KAAListPlugin::_validationView;
     using KAAListPlugin::KAAListPlugin;
     using KAAListPlugin::loadInterfaceFile;
+    using KAAListPlugin::makeAppTable;
+};
+
+/// A plug-in with mail and chat, its interface read, whose sheet shows the applications of an account.
+class AppSelection {
+public:
+    AppSelection()
+    {
+        const auto provider = KAProvider::initWithProviderType(kKAProviderTest);
+        provider->setServiceTypesProvided({kKAServiceIM, kKAServiceIMAP});
+        plugin.setProvider(provider);
+        isLoaded = plugin.loadInterfaceFile("Sheet");
+        plugin._provisionalAccount = KAAccount::initWithProviderType(kKAProviderTest, "<b>anna</b>");
+        plugin.makeAppTable(plugin._provisionalAccount);
+        plugin.showAppSelectionPanel(false);
+    }
+
+    [[nodiscard]] KAAppTableController &table() { return *plugin._appTableController; }
+    void click(int row) { table().rowViewForRow(row)->findChild<QCheckBox *>("checkbox")->click(); }
+
+    OpenPlugin plugin{KABundle::bundleWithPath(QStringLiteral(KAVELL_TEST_BUNDLES "/good/ExampleList.kaplugin"))};
+    bool isLoaded = false;
 };
 
 std::shared_ptr<KABundle> exampleBundle()
@@ -172,6 +197,77 @@ TEST(KAAListPluginSheet, ShowingTheApplicationsEnablesOKOnlyForASelection)
     plugin.showAppSelectionPanel(false);
     EXPECT_TRUE(button.isEnabled());
     plugin._hostSheet->setContentView(nullptr);
+}
+
+TEST(KAAListPluginSheet, TheTableFillsItsContainerBesideTheAccountsName)
+{
+    AppSelection selection;
+    ASSERT_TRUE(selection.isLoaded);
+    EXPECT_EQ(selection.table().view()->parent(), selection.plugin._appTableContainer);
+    EXPECT_EQ(selection.table().numberOfRows(), 2);
+    EXPECT_EQ(selection.plugin._appSelectionAccountName->text(), "<b>anna</b>");
+    EXPECT_EQ(selection.plugin._appSelectionAccountName->textFormat(), Qt::PlainText);
+    selection.plugin._appTableContainer->resize(300, 150);
+    (void)selection.plugin._appTableContainer->grab();
+    EXPECT_EQ(selection.table().view()->geometry(), QRect(0, 0, 300, 150));
+}
+
+TEST(KAAListPluginSheet, ClickedCheckBoxesEnableOKWhileOneIsOn)
+{
+    AppSelection selection;
+    EXPECT_FALSE(selection.plugin._appSelectionOKButton->isEnabled());
+    selection.click(0);
+    EXPECT_TRUE(selection.plugin._appSelectionOKButton->isEnabled());
+    selection.click(1);
+    selection.click(0);
+    EXPECT_TRUE(selection.plugin._appSelectionOKButton->isEnabled());
+    selection.click(1);
+    EXPECT_FALSE(selection.plugin._appSelectionOKButton->isEnabled());
+}
+
+TEST(KAAListPluginSheet, RowsOfTheSheetNeitherSpinNorInform)
+{
+    AppSelection selection;
+    selection.click(0);
+    EXPECT_FALSE(selection.table().rowViewForRow(0)->isSpinning());
+    EXPECT_FALSE(selection.table().rowViewForRow(0)->showInfoButton());
+}
+
+TEST(KAAListPluginSheet, OKTellsTheApplicationsThatAreOnInTheTablesOrder)
+{
+    AppSelection selection;
+    selection.click(1);
+    selection.click(0);
+    QList<std::shared_ptr<KAApplication>> chosen;
+    const auto observation =
+        KANotificationCenter::shared().addObserver(KACreatedAccountsNotification, [&](const KANotification &posted) {
+            chosen = posted.userInformation.value("selectedApps").value<QList<std::shared_ptr<KAApplication>>>();
+        });
+    selection.plugin._appSelectionOKButton->click();
+    ASSERT_EQ(chosen.size(), 2);
+    EXPECT_EQ(chosen.at(0)->bundleID(), kKAMailAppID);
+    EXPECT_EQ(chosen.at(1)->bundleID(), kKAParlexAppID);
+}
+
+TEST(KAAListPluginSheet, AnotherAccountsTableTakesThePlaceOfTheFormer)
+{
+    AppSelection selection;
+    const QPointer<QWidget> former = selection.table().view();
+    selection.click(0);
+    selection.plugin.makeAppTable(KAAccount::initWithProviderType(kKAProviderTest, "berta"));
+    selection.plugin.showAppSelectionPanel(false);
+    EXPECT_FALSE(former);
+    EXPECT_EQ(selection.plugin._appTableContainer->findChildren<QScrollArea *>().size(), 1);
+    EXPECT_EQ(selection.plugin._appSelectionAccountName->text(), "berta");
+    EXPECT_FALSE(selection.plugin._appSelectionOKButton->isEnabled());
+}
+
+TEST(KAAListPluginSheet, ATableWithoutItsOutletsStillAnswers)
+{
+    OpenPlugin plugin(nullptr);
+    plugin.makeAppTable(nullptr);
+    ASSERT_TRUE(plugin._appTableController);
+    EXPECT_TRUE(plugin._appTableController->selectedApps().isEmpty());
 }
 
 TEST(KAAListPluginSheet, InterfaceFileConnectsTheOutlets)
