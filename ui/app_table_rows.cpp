@@ -5,7 +5,6 @@
 
 #include <algorithm>
 
-#include <QtCore/QElapsedTimer>
 #include <QtCore/QEvent>
 #include <QtWidgets/QApplication>
 #include <QtWidgets/QScrollBar>
@@ -20,8 +19,9 @@ namespace {
 
 constexpr int kHeightBeforeTheFirstRow = 48;
 
-// Rows of a table that is used meanwhile are made a few at a time: a quarter of a frame at 60 frames a second.
-constexpr int kIdleMilliseconds = 4;
+// Rows are made a few at a time: a quarter of a frame at 60 frames a second, which leaves the rest to the row that
+// takes longest (an icon is read) and to painting.
+constexpr int kMillisecondsAtATime = 4;
 
 QList<QWidget *> focusControls(const KAAppTableRow &row)
 {
@@ -41,7 +41,7 @@ AppTableRows::AppTableRows(QScrollArea *scrollView, QWidget *table, RowAt rowAt)
     scrollView->viewport()->setBackgroundRole(QPalette::Base);
     table->installEventFilter(this);
     scrollView->viewport()->installEventFilter(this);
-    connect(scrollView->verticalScrollBar(), &QScrollBar::valueChanged, this, &AppTableRows::showRowsInView);
+    connect(scrollView->verticalScrollBar(), &QScrollBar::valueChanged, this, &AppTableRows::showRowsNow);
     connect(&m_idleTime, &QTimer::timeout, this, &AppTableRows::showRowsInIdleTime);
     connect(qApp, &QApplication::focusChanged, this, [this](QWidget *, QWidget *now) { selectPlaceOf(now); });
 }
@@ -69,7 +69,7 @@ void AppTableRows::reload(int count)
     m_table->setMinimumHeight(count * m_rowHeight);
     m_idleTime.start(0);
     if (m_table->isVisible())
-        showRowsInView();
+        showRowsNow();
 }
 
 void AppTableRows::showRow(int row)
@@ -94,27 +94,38 @@ void AppTableRows::showRow(int row)
     chainFocus(row);
 }
 
-void AppTableRows::showRowsInView()
+bool AppTableRows::showRows(int first, int end, const QElapsedTimer &clock)
+{
+    for (int row = first; row < end; ++row) {
+        if (clock.elapsed() >= kMillisecondsAtATime)
+            return false;
+        showRow(row);
+    }
+    return true;
+}
+
+bool AppTableRows::showRowsInView(const QElapsedTimer &clock)
 {
     if (!m_table || !m_scrollView)
-        return;
+        return true;
     const int top = m_scrollView->verticalScrollBar()->value();
-    const int end = std::min((top + m_scrollView->viewport()->height()) / m_rowHeight + 1, int(m_slots.size()));
-    for (int row = top / m_rowHeight; row < end; ++row)
-        showRow(row);
+    const int end = (top + m_scrollView->viewport()->height()) / m_rowHeight + 1;
+    return showRows(top / m_rowHeight, std::min(end, int(m_slots.size())), clock);
+}
+
+void AppTableRows::showRowsNow()
+{
+    QElapsedTimer clock;
+    clock.start();
+    (void)showRowsInView(clock);  // what is missing, idle time brings
 }
 
 void AppTableRows::showRowsInIdleTime()
 {
     QElapsedTimer clock;
     clock.start();
-    showRowsInView();
-    for (size_t row = 0; m_table && row < m_slots.size(); ++row) {
-        if (clock.elapsed() >= kIdleMilliseconds)
-            return;
-        showRow(int(row));
-    }
-    m_idleTime.stop();
+    if (showRowsInView(clock) && (!m_table || showRows(0, int(m_slots.size()), clock)))
+        m_idleTime.stop();
 }
 
 void AppTableRows::adoptRowHeight(int height)
@@ -179,7 +190,7 @@ bool AppTableRows::eventFilter(QObject *watched, QEvent *event)
     if (event->type() == QEvent::Show || event->type() == QEvent::Resize) {
         if (watched == m_table)
             placeRows();
-        showRowsInView();
+        showRowsNow();
     }
     return QObject::eventFilter(watched, event);
 }

@@ -1,9 +1,10 @@
 // SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
-// Shows the rows of an application table below each other. It asks for a row when the row comes into view, and for all
-// others in idle time, so that a long table costs no long frame. A row belongs to its application: a table that goes, or
-// shows other applications, lets it go. Used by KAAppTableController, on the user-interface thread.
+// Shows the rows of an application table below each other. It asks for rows when they come into view, and for all others
+// in idle time, never for longer than part of a frame at once, so that a long table keeps nobody waiting. A row belongs
+// to its application: a table that goes, or shows other applications, lets it go. Used by KAAppTableController, on the
+// user-interface thread.
 
 #ifndef KAVELL_UI_APP_TABLE_ROWS_H
 #define KAVELL_UI_APP_TABLE_ROWS_H
@@ -12,6 +13,7 @@
 #include <memory>
 #include <vector>
 
+#include <QtCore/QElapsedTimer>
 #include <QtCore/QPointer>
 #include <QtCore/QTimer>
 #include <QtWidgets/QScrollArea>
@@ -36,8 +38,8 @@ public:
     /// Whether the selected row has a background of its own; true at first.
     void setHighlightsSelection(bool highlightsSelection);
 
-    /// Shows that many rows, all of them asked for anew: those in view at once in a table that is shown, and all others
-    /// when they come into view or the event loop is idle. A row that stays where it is keeps the focus.
+    /// Shows that many rows, all of them asked for anew: those in view at once in a table that is shown, as far as part
+    /// of a frame allows, and all others in the event loop's idle time. A row that stays where it is keeps the focus.
     void reload(int count);
 
 protected:
@@ -50,9 +52,11 @@ private:
     };
 
     void showRow(int row);
+    [[nodiscard]] bool showRows(int first, int end, const QElapsedTimer &clock);
+    [[nodiscard]] bool showRowsInView(const QElapsedTimer &clock);
     void adoptRowHeight(int height);
     [[nodiscard]] KAAppTableRow *rowInSlot(int row) const;
-    void showRowsInView();
+    void showRowsNow();
     void showRowsInIdleTime();
     void placeRows();
     void chainFocus(int row);

@@ -134,7 +134,8 @@ public:
     [[nodiscard]] std::shared_ptr<KAApplication> objectValueForRow(int row) const;
     [[nodiscard]] std::shared_ptr<KAAppTableRow> rowViewForRow(int row);
 
-    /// Shows the applications as they stand. Rows in view are made at once, all others in the event loop's idle time.
+    /// Shows the applications as they stand. Rows are made a few at a time, those in view first, and the rest in the
+    /// event loop's idle time.
     void reloadTable();
     /// @}
 

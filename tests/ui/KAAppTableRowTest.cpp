@@ -5,7 +5,10 @@
 
 #include <gmock/gmock.h>
 
+#include <QtCore/QDir>
 #include <QtCore/QPointer>
+#include <QtCore/QProcess>
+#include <QtCore/QTemporaryDir>
 #include <QtTest/QTest>
 #include <QtWidgets/QApplication>
 
@@ -366,6 +369,17 @@ TEST_F(KAAppTableRowTest, PicturesExistForThreeDensities)
         EXPECT_EQ(QImage(":/kavellaccounts/" + name + "@2x.png").size(), QSize(32, 32));
         EXPECT_EQ(QImage(":/kavellaccounts/" + name + "@3x.png").size(), QSize(48, 48));
     }
+}
+
+TEST_F(KAAppTableRowTest, PicturesAreThoseThatTheirScriptDraws)
+{
+    const QTemporaryDir drawnAgain;
+    const QString script = qEnvironmentVariable("KAVELL_SOURCE_DIR") + "/resources/make_info_buttons";
+    ASSERT_EQ(QProcess::execute(script, {drawnAgain.path()}), 0);
+    const QStringList files = QDir(drawnAgain.path()).entryList(QDir::Files);
+    EXPECT_EQ(files.size(), 6);
+    for (const QString &file : files)
+        EXPECT_EQ(QImage(":/kavellaccounts/" + file), QImage(drawnAgain.filePath(file))) << file.toStdString();
 }
 
 TEST_F(KAAppTableRowTest, ControlsHaveNamesForScreenReaders)

@@ -3,6 +3,7 @@
 //
 // The application table on the screen: clicks and keys, which rows stand in it, and how long rows live.
 
+#include <algorithm>
 #include <thread>
 
 #include <gmock/gmock.h>
@@ -51,6 +52,17 @@ protected:
         table->view()->resize(420, height);
         table->view()->show();
         ASSERT_TRUE(QTest::qWaitForWindowActive(table->view()));
+        ASSERT_TRUE(showsAllRows());
+    }
+
+    /// Waits for all rows, which are made a few at a time.
+    [[nodiscard]] bool showsAllRows() const
+    {
+        return QTest::qWaitFor([this] {
+            return std::ranges::all_of(table->apps(), [this](const Application &application) {
+                return keptRow(application) && isShown(*keptRow(application));
+            });
+        });
     }
 
     /// Shows that many applications which no plug-in knows.
@@ -207,12 +219,14 @@ TEST_F(KAAppTableViewTest, NoRowIsMadeBeforeTheTableIsShown)
     EXPECT_EQ(rowsMade(), 4);
 }
 
-TEST_F(KAAppTableViewTest, RowsInViewAreMadeAtOnceAndAllOthersInIdleTime)
+TEST_F(KAAppTableViewTest, RowsInViewAreMadeFirstAndAllOthersInIdleTime)
 {
     show();
     showMany(50);
-    EXPECT_EQ(rowsMade(), 5);
-    ASSERT_TRUE(QTest::qWaitFor([this] { return rowsMade() == 50; }));
+    EXPECT_THAT(rowsMade(), testing::AllOf(testing::Ge(1), testing::Le(5)));
+    ASSERT_TRUE(QTest::qWaitFor([this] { return keptRow(table->apps().at(5)) != nullptr; }));
+    EXPECT_GE(rowsMade(), 5);
+    ASSERT_TRUE(showsAllRows());
     EXPECT_EQ(scrollView()->verticalScrollBar()->maximum(), 50 * 48 - scrollView()->viewport()->height());
 }
 
@@ -221,8 +235,8 @@ TEST_F(KAAppTableViewTest, ScrollingMakesTheRowsThatComeIntoView)
     show();
     showMany(50);
     scrollView()->verticalScrollBar()->setValue(scrollView()->verticalScrollBar()->maximum());
-    EXPECT_TRUE(keptRow(table->apps().last()));
-    EXPECT_FALSE(keptRow(table->apps().at(20)));
+    ASSERT_TRUE(QTest::qWaitFor([this] { return keptRow(table->apps().last()) != nullptr; }));
+    EXPECT_FALSE(keptRow(table->apps().at(30)));
     EXPECT_TRUE(isShown(row(49)));
 }
 
@@ -233,6 +247,7 @@ TEST_F(KAAppTableViewTest, OtherApplicationsTakeTheRowsPlaces)
     table->setApps({former.at(3), former.at(0)});
     table->setPairedServices({kKAServiceIM, kKAServiceIMAP});
     table->reloadTable();
+    ASSERT_TRUE(showsAllRows());
     EXPECT_EQ(row(0).mapTo(scrollView()->widget(), QPoint()), QPoint(0, 0));
     EXPECT_EQ(row(1).mapTo(scrollView()->widget(), QPoint()), QPoint(0, 48));
     EXPECT_EQ(row(0).application(), former.at(3));
@@ -275,11 +290,11 @@ TEST_F(KAAppTableViewTest, ARowThatIsShownElsewhereMovesThere)
     other->view()->show();
     other->setApps({table->appAtRow(0)});
     other->reloadTable();
-    EXPECT_TRUE(other->view()->isAncestorOf(&row(0)));
+    ASSERT_TRUE(QTest::qWaitFor([&] { return other->view()->isAncestorOf(&row(0)); }));
     EXPECT_EQ(other->rowViewForRow(0).get(), &row(0));
     EXPECT_EQ(row(0).delegate(), table.get());
     table->reloadTable();
-    EXPECT_TRUE(isShown(row(0)));
+    EXPECT_TRUE(showsAllRows());
 }
 
 TEST_F(KAAppTableViewTest, ARowWhoseTableIsGoneAnswersToTheNext)
