@@ -59,9 +59,10 @@ ZorboPlugin::ZorboPlugin(std::shared_ptr<KABundle> bundle)
 ZorboPlugin::~ZorboPlugin()
 {
     m_worker.waitForDone();
-    // The pages go before the sheet that may show one of them.
-    if (_hostSheet)
-        _hostSheet->setContentView(nullptr);
+    if (!_hostSheet)
+        return;
+    _hostSheet->disconnect(this);
+    _hostSheet->setContentView(nullptr);  // the pages go before the sheet
 }
 
 /// The provider is known from here on; no widget is made yet, since this may not be the user-interface thread.
@@ -142,7 +143,6 @@ bool ZorboPlugin::makePages()
     m_signIn = std::make_unique<SignInPage>(signInPage, [this](const QString &address) {
         return address.indexOf(u'@') > 0 && supportsDomain(KAExtras::emailHostName(address));
     });
-    m_signIn->setBanner(bannerImage(), brandName());
     m_signIn->showPasswordField(shouldShowPasswordField());
     m_validationCancel = _validationView->findChild<QPushButton *>(QStringLiteral("validationCancel"));
     m_status = _validationView->findChild<QLabel *>(QStringLiteral("validationStatus"));
@@ -167,6 +167,7 @@ void ZorboPlugin::translate(QWidget *page) const
 void ZorboPlugin::beginSheet(QWidget *window)
 {
     ++m_attempt;
+    m_signIn->setBanner(bannerImage(), brandName());  // in the colours that windows have now
     showView(m_signIn->view(), false);
     _hostSheet->setWindowTitle(brandName());
     connect(_hostSheet.get(), &QDialog::finished, this, &ZorboPlugin::endAttempt, Qt::UniqueConnection);
@@ -192,6 +193,10 @@ void ZorboPlugin::endAttempt(int returnCode)
 /// presses and the keyboard where the user goes on.
 void ZorboPlugin::showView(QWidget *view, bool animate)
 {
+    if (!m_signIn || !view || !view->layout()) {
+        KAAListPlugin::showView(view, animate);
+        return;
+    }
     // A page that is not on the screen is not told of what became visible in it.
     view->layout()->invalidate();
     view->layout()->activate();
@@ -214,6 +219,13 @@ void ZorboPlugin::showView(QWidget *view, bool animate)
     view == m_signIn->view() ? m_signIn->firstField()->setFocus() : main->setFocus();
 }
 
+/// Whether the sheet shows the page. Its buttons' methods do nothing otherwise: not for a second press, while one page
+/// turns into the next.
+bool ZorboPlugin::isShown(const QWidget *page) const
+{
+    return page && _hostSheet && _hostSheet->isVisible() && _hostSheet->contentView() == page;
+}
+
 void ZorboPlugin::showStatus(const QString &sentence)
 {
     m_status->setText(sentence);
@@ -224,7 +236,7 @@ void ZorboPlugin::showStatus(const QString &sentence)
 
 void ZorboPlugin::continueButton(QObject *)
 {
-    if (!m_signIn || !m_signIn->isComplete())
+    if (!isShown(m_signIn ? m_signIn->view() : nullptr) || !m_signIn->isComplete())
         return;
     m_checker->check(m_signIn->address(), m_signIn->password());
     showStatus(text("STATUS_SIGNING_IN").arg(m_signIn->address()));
@@ -286,6 +298,8 @@ void ZorboPlugin::showApplications(const std::shared_ptr<KAAccount> &account)
 /// From the applications to what was typed: the validation is over, and there is nothing to see of it.
 void ZorboPlugin::back(QObject *)
 {
+    if (!isShown(_appSelectionView))
+        return;
     _provisionalAccount.reset();
     _appTableController.reset();
     showView(m_signIn->view(), true);
@@ -295,7 +309,7 @@ void ZorboPlugin::back(QObject *)
 /// password known. A host finds nothing left to commit.
 void ZorboPlugin::addAccount(QObject *)
 {
-    if (!_provisionalAccount)
+    if (!isShown(_appSelectionView) || !_provisionalAccount)
         return;
     doForAttempt<QString>(
         [account = _provisionalAccount, password = m_signIn->password(),

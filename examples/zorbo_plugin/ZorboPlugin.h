@@ -83,6 +83,7 @@ private:
     void translate(QWidget *page) const;
     void beginSheet(QWidget *window);
     void endAttempt(int returnCode);
+    [[nodiscard]] bool isShown(const QWidget *page) const;
     /// @}
 
     /// @name What happens in it, in this order

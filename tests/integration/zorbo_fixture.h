@@ -10,6 +10,7 @@
 #include <filesystem>
 #include <memory>
 
+#include <QtCore/QDeadlineTimer>
 #include <QtTest/QTest>
 #include <QtWidgets/QApplication>
 #include <QtWidgets/QCheckBox>
@@ -124,6 +125,13 @@ protected:
     [[nodiscard]] static bool reaches(const QString &name)
     {
         return runUntil([&] { return page() == name; });
+    }
+
+    /// Whether nothing changes the condition for longer than the service takes to answer.
+    template <typename Condition> [[nodiscard]] static bool staysTrue(const Condition &condition)
+    {
+        const QDeadlineTimer end(600);
+        return runUntil([&] { return !condition() || end.hasExpired(); }) && condition();
     }
 
     /// A control of the page that is shown.
