@@ -194,6 +194,9 @@ void KAAppTableRow::paintEvent(QPaintEvent *event)
 {
     if (m_textsAreStale)
         showTexts();
+    // The row may have come to a screen of another density.
+    if (!m_iconImage.isNull() && !qFuzzyCompare(_icon->pixmap().devicePixelRatio(), devicePixelRatioF()))
+        showIcon();
     QWidget::paintEvent(event);
 }
 

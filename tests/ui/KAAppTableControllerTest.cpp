@@ -269,6 +269,17 @@ TEST_F(KAAppTableControllerTest, AnApplicationHasOneRow)
     EXPECT_EQ(row->delegate(), table.get());
 }
 
+TEST_F(KAAppTableControllerTest, AnApplicationWithARowCanBeDescribed)
+{
+    const auto table = tableFor(accountFor({}));
+    (void)table->rowViewForRow(0);
+    KAFieldList list;
+    table->appAtRow(0)->describeFields(list);
+    EXPECT_EQ(list.fields().at(4).name, "_userInfo");
+    EXPECT_THAT(list.fields().at(4).value.toStdString(), testing::HasSubstr("rowView"));
+    EXPECT_FALSE(table->appAtRow(0)->description().isEmpty());
+}
+
 TEST_F(KAAppTableControllerTest, RowsAreMadeWithTheTablesSettings)
 {
     const auto table = tableFor(accountFor({}));
