@@ -348,6 +348,14 @@ TEST_F(KAAppTableControllerTest, AConflictingAccountLeavesOnlyChatUsable)
     EXPECT_THAT(bundleIDsOf(table->selectedApps()), ElementsAre(kKAParlexAppID));
 }
 
+TEST_F(KAAppTableControllerTest, ConflictingApplicationsAreOffBeforeTheirRowsAreMade)
+{
+    const auto table = tableFor(conflictingAccount({kKAMailPluginID, kKAChatPluginID}));
+    EXPECT_THAT(bundleIDsOf(table->selectedApps()), ElementsAre(kKAParlexAppID));
+    table->updateTable();
+    EXPECT_THAT(bundleIDsOf(table->selectedApps()), ElementsAre(kKAParlexAppID));
+}
+
 TEST_F(KAAppTableControllerTest, PickingAllLeavesConflictingApplicationsOff)
 {
     for (const bool rowsExist : {false, true}) {

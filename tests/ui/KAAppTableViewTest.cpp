@@ -182,6 +182,20 @@ TEST_F(KAAppTableViewTest, TabReachesRowsThatWereOutOfView)
     }
 }
 
+TEST_F(KAAppTableViewTest, TabWalksFromTopToBottomWhicheverRowWasMadeFirst)
+{
+    show();
+    showMany(50);
+    scrollView()->verticalScrollBar()->setValue(scrollView()->verticalScrollBar()->maximum());
+    ASSERT_TRUE(QTest::qWaitFor([this] { return isShown(row(49)); }));
+    ASSERT_TRUE(showsAllRows());
+    for (const int from : {4, 20, 44}) {
+        checkboxOf(row(from))->setFocus();
+        QTest::keyClick(QApplication::focusWidget(), Qt::Key_Tab);
+        EXPECT_EQ(QApplication::focusWidget(), checkboxOf(row(from + 1)));
+    }
+}
+
 TEST_F(KAAppTableViewTest, TheSpinnerKeepsTheFocusInItsRow)
 {
     row(0).setSpinOnSelection(true);
