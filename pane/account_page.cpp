@@ -1,0 +1,202 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+
+#include "pane/account_page.h"
+
+#include <QtCore/QLocale>
+#include <QtGui/QGuiApplication>
+#include <QtWidgets/QGroupBox>
+#include <QtWidgets/QHBoxLayout>
+#include <QtWidgets/QScrollBar>
+#include <QtWidgets/QStyle>
+#include <QtWidgets/QVBoxLayout>
+
+#include <kavellaccounts/KAAListPlugin.h>
+#include <kavellaccounts/KAAccount.h>
+#include <kavellaccounts/KAConstants.h>
+#include <kavellaccounts/KAProvider.h>
+
+#include "pane/application_section.h"
+#include "pane/password_section.h"
+#include "pane/provider_looks.h"
+#include "pane/undertakings.h"
+
+namespace kavell::pane {
+
+namespace {
+
+constexpr int kIconSide = 48;
+constexpr qreal kTitleScale = 1.4;  // of the text around it
+
+// The attribute that refers to the password's item in the credential store.
+const QString kPasswordReferenceKey = QStringLiteral("com.corvane.account.CofferelToken");
+
+QGroupBox *section(const QString &title, QWidget *content)
+{
+    auto *const box = new QGroupBox(title);
+    auto *const layout = new QVBoxLayout(box);
+    layout->addWidget(content);
+    return box;
+}
+
+QLabel *selectableLabel(const QString &text)
+{
+    auto *const label = new QLabel(text);
+    label->setTextFormat(Qt::PlainText);
+    label->setWordWrap(true);
+    // Selectable text is aligned by its own direction otherwise, which an address has from left to right.
+    label->setAlignment(QStyle::visualAlignment(QGuiApplication::layoutDirection(), Qt::AlignLeft | Qt::AlignVCenter) |
+                        Qt::AlignAbsolute);
+    label->setTextInteractionFlags(Qt::TextSelectableByMouse | Qt::TextSelectableByKeyboard);
+    return label;
+}
+
+QString textOf(const KAAccount &account, const QString &key)
+{
+    return account.providerAttributeForKey(key).toString();
+}
+
+}  // namespace
+
+AccountPage::AccountPage(Undertakings &undertakings, QWidget *parent)
+    : QScrollArea(parent), m_undertakings(undertakings), m_icon(new QLabel), m_title(selectableLabel(QString())),
+      m_subtitle(selectableLabel(QString())), m_enabled(new QCheckBox(qtTrId("ACCOUNT_ENABLED"))),
+      m_description(new QLineEdit), m_applications(new ApplicationSection),
+      m_password(new PasswordSection(undertakings)), m_details(new QFormLayout)
+{
+    setWidgetResizable(true);
+    setFrameShape(NoFrame);
+    auto *const content = new QWidget;
+    makeHeader(content);
+    setWidget(content);
+    connect(m_enabled, &QCheckBox::clicked, this, [this](bool isEnabled) {
+        change(isEnabled ? qtTrId("SWITCHING_ON") : qtTrId("SWITCHING_OFF"),
+               [isEnabled](KAAccount &account) { account.setAccountEnabled(isEnabled); });
+    });
+    connect(m_description, &QLineEdit::editingFinished, this, &AccountPage::saveDescription);
+    connect(m_applications, &ApplicationSection::failed, this, &AccountPage::failed);
+    connect(m_password, &PasswordSection::failed, this, &AccountPage::failed);
+}
+
+AccountPage::~AccountPage() = default;
+
+void AccountPage::makeHeader(QWidget *content)
+{
+    m_title->setObjectName(QStringLiteral("accountTitle"));
+    m_subtitle->setObjectName(QStringLiteral("accountSubtitle"));
+    m_enabled->setObjectName(QStringLiteral("accountEnabled"));
+    m_description->setObjectName(QStringLiteral("accountDescription"));
+    m_description->setAccessibleName(qtTrId("DESCRIPTION"));
+    QFont large = m_title->font();
+    large.setPointSizeF(large.pointSizeF() * kTitleScale);
+    m_title->setFont(large);
+    auto *const titles = new QVBoxLayout;
+    titles->addWidget(m_title);
+    titles->addWidget(m_subtitle);
+    auto *const header = new QHBoxLayout;
+    header->addWidget(m_icon, 0, Qt::AlignTop);
+    header->addLayout(titles, 1);
+    auto *const description = new QFormLayout;
+    description->addRow(qtTrId("DESCRIPTION_LABEL"), m_description);
+    auto *const details = new QWidget;
+    details->setLayout(m_details);
+    m_details->setContentsMargins({});
+
+    auto *const layout = new QVBoxLayout(content);
+    layout->addLayout(header);
+    layout->addWidget(m_enabled);
+    layout->addLayout(description);
+    layout->addWidget(section(qtTrId("APPLICATIONS"), m_applications));
+    layout->addWidget(section(qtTrId("PASSWORD"), m_password));
+    layout->addWidget(section(qtTrId("DETAILS"), details));
+    layout->addStretch();
+}
+
+void AccountPage::showAccount(const OpenAccount &account, KAAListPlugin *plugin)
+{
+    const bool isAnother = !m_account || m_account->loginName() != account.shown->loginName() ||
+                           m_account->provider() != account.shown->provider();
+    m_account = account.shown;
+    m_defaultDescription = plugin ? plugin->defaultAccountDescription() : QString();
+    if (isAnother) {
+        verticalScrollBar()->setValue(0);
+        m_description->setModified(false);
+    }
+    showHeader(plugin);
+    m_applications->showAccount(account.shown, account.forPlugin, plugin);
+    m_password->showAccount({m_account->provider(), m_account->loginName()},
+                            m_account->providerAttributeForKey(kPasswordReferenceKey));
+    showDetails(plugin);
+}
+
+void AccountPage::showHeader(KAAListPlugin *plugin)
+{
+    const QString description = textOf(*m_account, KAMailAccountDescriptionKey);
+    m_icon->setPixmap(accountIcon(plugin, m_account).pixmap(kIconSide));
+    m_title->setText(description.isEmpty() ? m_account->loginName() : description);
+    const QString provider = providerTitle(m_account->provider(), plugin);
+    m_subtitle->setText(qtTrId("ACCOUNT_SUBTITLE").arg(provider, m_account->loginName()));
+    m_enabled->setChecked(m_account->accountIsEnabled());
+    if (!m_description->isModified()) {
+        m_description->setText(description);
+        m_description->setPlaceholderText(m_defaultDescription);
+    }
+}
+
+void AccountPage::showDetails(KAAListPlugin *plugin)
+{
+    while (m_details->rowCount() > 0)
+        m_details->removeRow(0);
+    addDetail(qtTrId("LOGIN_NAME_LABEL"), m_account->loginName());
+    addDetail(qtTrId("FULL_NAME_LABEL"), m_account->fullName());
+    addDetail(qtTrId("EMAIL_ADDRESS_LABEL"), textOf(*m_account, KAMailEmailAddressKey));
+    addDetail(qtTrId("PROVIDER_LABEL"), providerTitle(m_account->provider(), plugin));
+    if (const std::shared_ptr<KAProvider> provider = plugin ? plugin->provider() : nullptr) {
+        QStringList services;
+        const QStringList types = provider->serviceTypesProvided();
+        for (const QString &type : types)
+            services += plugin->serviceDisplayNameForService(type);
+        services.removeAll(QString());
+        services.removeDuplicates();
+        addDetail(qtTrId("SERVICES_LABEL"), QLocale().createSeparatedList(services));
+    }
+    addDetail(qtTrId("UID_LABEL"), m_account->uid());
+}
+
+void AccountPage::addDetail(const QString &label, const QString &value)
+{
+    if (!value.isEmpty())
+        m_details->addRow(label, selectableLabel(value));
+}
+
+void AccountPage::saveDescription()
+{
+    if (!m_description->isModified() || !m_account)
+        return;
+    m_description->setModified(false);
+    const QString description = m_description->text().trimmed();
+    change(qtTrId("SAVING_DESCRIPTION"), [description](KAAccount &account) {
+        account.setProviderAttribute(description.isEmpty() ? QVariant() : description, KAMailAccountDescriptionKey);
+    });
+}
+
+void AccountPage::change(const QString &sentence, std::function<void(KAAccount &)> change)
+{
+    const AccountName name{m_account->provider(), m_account->loginName()};
+    m_undertakings.start<ChangeResult>(
+        sentence, this,
+        [name, change = std::move(change)](const CancelFlag &isCancelled) {
+            return changeAccount(name, change, isCancelled);
+        },
+        [this, name](std::optional<ChangeResult> result) {
+            if (result == ChangeResult::Saved)
+                return;  // the registry's notification shows it
+            if (result == ChangeResult::NotSaved)
+                emit failed(qtTrId("NOT_SAVED").arg(name.loginName));
+            else if (result == ChangeResult::NoAccount)
+                emit failed(qtTrId("ACCOUNT_GONE").arg(name.loginName));
+            m_enabled->setChecked(m_account->accountIsEnabled());
+        });
+}
+
+}  // namespace kavell::pane

@@ -1,0 +1,75 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+//
+// The right side of the pane: one account with its description, its applications, its password and its details.
+// User-interface thread only.
+
+#ifndef KAVELL_PANE_ACCOUNT_PAGE_H
+#define KAVELL_PANE_ACCOUNT_PAGE_H
+
+#include <functional>
+#include <memory>
+
+#include <QtWidgets/QCheckBox>
+#include <QtWidgets/QFormLayout>
+#include <QtWidgets/QLabel>
+#include <QtWidgets/QLineEdit>
+#include <QtWidgets/QScrollArea>
+
+#include "pane/account_records.h"
+
+namespace kavell::pane {
+
+class ApplicationSection;
+class PasswordSection;
+class Undertakings;
+
+/// An account that was opened for showing: one record for the pane to read, one for the plug-in to work on.
+struct OpenAccount {
+    std::shared_ptr<KAAccount> shown;
+    std::shared_ptr<KAAccount> forPlugin;
+};
+
+class AccountPage : public QScrollArea {
+    Q_OBJECT
+
+public:
+    explicit AccountPage(Undertakings &undertakings, QWidget *parent = nullptr);
+    ~AccountPage() override;
+
+    /// Shows an account, or the one that is shown as it is now. What the user is typing stays.
+    void showAccount(const OpenAccount &account, KAAListPlugin *plugin);
+
+    /// The account that is shown; null before the first.
+    [[nodiscard]] std::shared_ptr<KAAccount> account() const { return m_account; }
+
+    [[nodiscard]] ApplicationSection &applications() { return *m_applications; }
+
+signals:
+    /// Something went wrong: a sentence for the user.
+    void failed(const QString &sentence);
+
+private:
+    void makeHeader(QWidget *content);
+    void showHeader(KAAListPlugin *plugin);
+    void showDetails(KAAListPlugin *plugin);
+    void addDetail(const QString &label, const QString &value);
+    void saveDescription();
+    void change(const QString &sentence, std::function<void(KAAccount &)> change);
+
+    Undertakings &m_undertakings;
+    std::shared_ptr<KAAccount> m_account;
+    QString m_defaultDescription;
+    QLabel *m_icon;
+    QLabel *m_title;
+    QLabel *m_subtitle;
+    QCheckBox *m_enabled;
+    QLineEdit *m_description;
+    ApplicationSection *m_applications;
+    PasswordSection *m_password;
+    QFormLayout *m_details;
+};
+
+}  // namespace kavell::pane
+
+#endif
