@@ -20,7 +20,12 @@
 
 namespace {
 
+// A build for trying things out can stand in for a provider type that the library knows.
+#ifdef ZORBO_PROVIDER_TYPE
+const QString kProviderType = QStringLiteral(ZORBO_PROVIDER_TYPE);
+#else
 const QString kProviderType = QStringLiteral("com.example.account.zorbo");
+#endif
 
 constexpr qsizetype kLongestArgument = 254;
 
