@@ -453,50 +453,6 @@ TEST_F(KAAppTableControllerTest, ASharedDelegateIsRetainedAndAPlainOneIsNot)
     EXPECT_EQ(table->delegate(), nullptr);
 }
 
-TEST_F(KAAppTableControllerTest, SortingKeepsEqualApplicationsInTheirOrderWithTheirServices)
-{
-    const auto table = KAAppTableController::initWithNibName("AppTable", nullptr);
-    const auto app = [](const QString &bundleID) {
-        return KAApplication::initWithBundleID(bundleID);
-    };
-    table->setApps({app("z.one"), app(kKAParlexAppID), app("a.two"), app(kKAMailAppID), app("m.three")});
-    table->setPairedServices({"1", "chat", "2", "mail", "3"});
-    table->_sortApps();
-    EXPECT_THAT(bundleIDsOf(table->apps()), ElementsAre(kKAMailAppID, kKAParlexAppID, "z.one", "a.two", "m.three"));
-    EXPECT_THAT(table->pairedServices(), ElementsAre("mail", "chat", "1", "2", "3"));
-}
-
-TEST_F(KAAppTableControllerTest, EveryOrderOfFiveApplicationsIsSorted)
-{
-    const auto table = KAAppTableController::initWithNibName("AppTable", nullptr);
-    const QStringList sorted = {kKAMailAppID, kKACardellAppID, kKATidewellAppID, kKAParlexAppID, "other"};
-    QList<int> order = {0, 1, 2, 3, 4};
-    do {
-        QList<Application> apps;
-        QStringList services;
-        for (const int place : order) {
-            apps += KAApplication::initWithBundleID(sorted.at(place));
-            services += QString::number(place);
-        }
-        table->setApps(apps);
-        table->setPairedServices(services);
-        table->_sortApps();
-        ASSERT_EQ(bundleIDsOf(table->apps()), sorted);
-        ASSERT_THAT(table->pairedServices(), ElementsAre("0", "1", "2", "3", "4"));
-    } while (std::next_permutation(order.begin(), order.end()));
-}
-
-TEST_F(KAAppTableControllerTest, SortingNeedsNoServicesAndNoApplications)
-{
-    const auto table = KAAppTableController::initWithNibName("AppTable", nullptr);
-    table->_sortApps();
-    table->setApps({KAApplication::initWithBundleID("other"), KAApplication::initWithBundleID(kKAMailAppID)});
-    table->setPairedServices({"1"});
-    table->_sortApps();
-    EXPECT_THAT(bundleIDsOf(table->apps()), ElementsAre(kKAMailAppID, "other"));
-    EXPECT_THAT(table->pairedServices(), ElementsAre("1"));
-}
-
 TEST_F(KAAppTableControllerTest, PropertiesAreKept)
 {
     const auto table = KAAppTableController::initWithNibName("AppTable", nullptr);
