@@ -287,15 +287,8 @@ void ZorboPlugin::makeProvisionalAccount()
 void ZorboPlugin::showApplications(const std::shared_ptr<KAAccount> &account)
 {
     _provisionalAccount = account;
-    _appSelectionAccountName->setText(account->loginName());
-    _appTableController = KAAppTableController::initWithAccount(account, this);
-    // Nothing happens yet when a box is ticked; a host that shows the table of an account that is there lets it spin.
-    _appTableController->setSpinOnSelection(false);
-    _appTableController->setShowInfoButtons(false);
-    _appTableController->setDelegate(this);
-    _appTableController->reloadTable();
+    makeAppTable(account);
     _appTableController->selectAllApps();
-    _appTableContainer->layout()->addWidget(_appTableController->view());
     showProblem(m_appSelectionProblem, m_appSelectionProblemIcon, {});
     showAppSelectionPanel(true);
 }
