@@ -6,6 +6,7 @@
 
 #include <kavellaccounts/KAAccountCreator.h>
 
+#include <map>
 #include <thread>
 
 #include <QtCore/QCoreApplication>
@@ -65,6 +66,39 @@ void registerMessageTypes()
     qRegisterMetaType<KAError>();
 }
 
+/// Which plug-ins creators are at work with, and on which thread. A plug-in reports to its one delegate: were there two
+/// creators at a time, one would get the other's report, and the other none.
+class PluginsAtWork {
+public:
+    enum class Answer { Taken, Busy, BusyBelow };
+
+    /// Takes the plug-in unless it is at work, perhaps below the caller on its own thread, whose events it runs.
+    Answer take(const KADataPlugin *plugin)
+    {
+        const std::lock_guard lock(m_mutex);
+        const auto [entry, isNew] = m_threads.try_emplace(plugin, std::this_thread::get_id());
+        if (isNew)
+            return Answer::Taken;
+        return entry->second == std::this_thread::get_id() ? Answer::BusyBelow : Answer::Busy;
+    }
+
+    void giveBack(const KADataPlugin *plugin)
+    {
+        const std::lock_guard lock(m_mutex);
+        m_threads.erase(plugin);
+    }
+
+private:
+    std::mutex m_mutex;
+    std::map<const KADataPlugin *, std::thread::id> m_threads;
+};
+
+PluginsAtWork &pluginsAtWork()
+{
+    static PluginsAtWork sPlugins;
+    return sPlugins;
+}
+
 /// Gives the calling thread's place in the global thread pool, if it has one, to another task while it waits for a
 /// plug-in. Were it kept, a few creators could fill the pool, and a plug-in that works in the pool could never report.
 class PlaceInPoolForOthers {
@@ -86,6 +120,28 @@ private:
     const bool m_isInPool = QThreadPool::globalInstance()->contains(QThread::currentThread());
 };
 
+/// The events of the calling thread, for one that waits. Without sleeping between two looks, deliberately: a plug-in
+/// reports by events on this thread's loop, by calls from other threads, or by both, and no single thing could be slept
+/// on that wakes up for all of them.
+class EventsMeanwhile {
+public:
+    EventsMeanwhile()
+    {
+        if (QCoreApplication::instance())  // without which there must be no loop
+            m_loop.emplace();
+    }
+
+    void run()
+    {
+        if (m_loop)
+            m_loop->processEvents();
+        std::this_thread::yield();
+    }
+
+private:
+    std::optional<QEventLoop> m_loop;
+};
+
 }  // namespace
 
 std::shared_ptr<KAAccountCreator> KAAccountCreator::initWithSettings(const std::optional<QVariantMap> &settings,
@@ -102,9 +158,11 @@ KAAccountCreator::KAAccountCreator(const std::optional<QVariantMap> &settings, K
 
 KAAccountCreator::~KAAccountCreator()
 {
-    // To none, whoever the delegate is by now: a plug-in is not told of creators that came after one another.
-    if (_plugin)
-        _plugin->setDelegate(nullptr);
+    // To none, whoever the delegate is, but for another creator that is at work: it would wait for ever.
+    if (!_plugin || pluginsAtWork().take(_plugin) != PluginsAtWork::Answer::Taken)
+        return;
+    _plugin->setDelegate(nullptr);
+    pluginsAtWork().giveBack(_plugin);
 }
 
 std::shared_ptr<KAProvider> KAAccountCreator::provider() const
@@ -153,6 +211,10 @@ bool KAAccountCreator::create()
 
     const PlaceInPoolForOthers place;
     const std::shared_ptr<KAAccountSetupInput> input = _input();
+    const KADataPlugin *const plugin = _plugin;
+    if (!waitForTurn(plugin))
+        return false;
+    const auto turnIsOver = qScopeGuard([plugin] { pluginsAtWork().giveBack(plugin); });
     const std::shared_ptr<KAAccountSetupResult> result = discover(input);
     if (!result)
         return failed(QStringLiteral("The plug-in found nothing to make an account of."));
@@ -182,22 +244,30 @@ std::shared_ptr<KAAccountSetupResult> KAAccountCreator::discover(const std::shar
     return _plugin ? _result : nullptr;
 }
 
-/// Without sleeping between two looks, deliberately: the plug-in reports by events on this thread's loop, by calls from
-/// other threads, or by both, and no single thing could be slept on that wakes up for all of them.
+bool KAAccountCreator::waitForTurn(const KADataPlugin *plugin)
+{
+    EventsMeanwhile events;
+    while (_plugin && !QCoreApplication::closingDown()) {
+        const PluginsAtWork::Answer answer = pluginsAtWork().take(plugin);
+        if (answer == PluginsAtWork::Answer::Taken)
+            return true;
+        if (answer == PluginsAtWork::Answer::BusyBelow)
+            return failed(QStringLiteral("The plug-in is at work on another account, which this one would hold up."));
+        events.run();
+    }
+    return failed(QStringLiteral("The plug-in or the program ended while it was at work on another account."));
+}
+
 void KAAccountCreator::waitForReport()
 {
-    std::optional<QEventLoop> events;  // which a program without an application object must not make
-    if (QCoreApplication::instance())
-        events.emplace();
+    EventsMeanwhile events;
     while (_waiting) {
-        if (events)
-            events->processEvents();
+        events.run();
         if (!_plugin)
             endWait(QStringLiteral("The plug-in was destroyed while it looked for the account."));
         // Events come no more, and the end of the program waits for the threads of the pool.
         if (QCoreApplication::closingDown())
             endWait(QStringLiteral("The program ended while the plug-in looked for the account."));
-        std::this_thread::yield();
     }
 }
 

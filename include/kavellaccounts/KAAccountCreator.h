@@ -12,8 +12,8 @@
 //         qWarning() << creator->failureReason();
 //
 // A creator is made, given its provider and its name at the online service, asked to create once, and let go, all on one
-// thread, which may be any. It is the data plug-in's delegate while it works; since a plug-in has one delegate, it serves
-// one creator at a time. The plug-in may report on any thread.
+// thread, which may be any. It is the data plug-in's delegate while it works. A plug-in has one delegate, so that it serves
+// one creator at a time; creators on other threads wait for their turn. The plug-in may report on any thread.
 
 #ifndef KAVELLACCOUNTS_KAACCOUNTCREATOR_H
 #define KAVELLACCOUNTS_KAACCOUNTCREATOR_H
@@ -50,8 +50,8 @@ public:
     [[nodiscard]] static std::shared_ptr<KAAccountCreator> initWithSettings(const std::optional<QVariantMap> &settings,
                                                                             KADataPlugin *plugin);
 
-    /// Sets the plug-in's delegate to none, so that no late message reaches a creator that is gone; waits for one that
-    /// is under way on another thread.
+    /// Sets the plug-in's delegate to none, whoever that is except another creator at work, so that no late message
+    /// reaches a creator that is gone; waits for one that is under way on another thread.
     ~KAAccountCreator() override;
 
     /// @name The provider of the account that is copied, and the account's name at the maker's online service, where it
@@ -66,10 +66,11 @@ public:
     /// Makes the account. True when the plug-in made one, and true when the newer online service needs none because its
     /// calendars or contacts were switched on. False after a failure, which the log tells, and failureReason.
     ///
-    /// Blocks until the plug-in has reported, without a bound, and runs the events of the calling thread meanwhile, which
+    /// Blocks until the plug-in is free and has reported, without a bound, and runs the events of the calling thread meanwhile, which
     /// it asks for again and again without sleeping; a program without an application object has no events to run. Ends
-    /// early only when the plug-in is destroyed or the application object goes away. A thread of the global thread pool
-    /// gives its place there to others for that time. What the plug-in throws comes through.
+    /// early only when the plug-in is destroyed or the application object goes away. From an event that a creator of the
+    /// same plug-in runs while it waits, it fails. A thread of the global thread pool gives its place there to others for
+    /// that time. What the plug-in throws comes through.
     [[nodiscard]] bool create();
 
     /// @name What came of `create`. Any thread
@@ -138,6 +139,7 @@ private:
     [[nodiscard]] bool _warnAboutMigrationSyncIfNecessary() const;
     [[nodiscard]] bool _enableBrondelService();
     [[nodiscard]] std::shared_ptr<KAAccountSetupResult> discover(const std::shared_ptr<KAAccountSetupInput> &input);
+    [[nodiscard]] bool waitForTurn(const KADataPlugin *plugin);
     void waitForReport();
     void endWait(const QString &reason, const KAError &error = {});
     bool failed(const QString &reason, const KAError &error = {});

@@ -324,6 +324,61 @@ TEST_F(KAAccountCreatorTest, EventsOfTheMainThreadRunWhileItWaits)
     EXPECT_TRUE(ran);
 }
 
+TEST_F(KAAccountCreatorTest, CreatorsOfOnePluginTakeTurns)
+{
+    // Each discovery is reported from a thread of its own, with a result that names it.
+    std::mutex mutex;
+    std::vector<std::thread> reporters;
+    std::atomic<int> atWork = 0;
+    plugin().onStart = [&](const Input &input) {
+        EXPECT_EQ(atWork++, 0);
+        const std::lock_guard lock(mutex);
+        reporters.emplace_back([&, input] {
+            const auto found = std::make_shared<KAMailAccountSetupResult>();
+            found->setReceivingAccount(std::static_pointer_cast<KAMailAccountSetupInput>(input)->emailAddress());
+            plugin().accountSetupDidFinish(input, found);
+        });
+    };
+    plugin().onCreate = [&](const Input &, const Result &found, KAError *) {
+        EXPECT_EQ(atWork--, 1);
+        return std::static_pointer_cast<KAMailAccountSetupResult>(found)->receivingAccount().toString();
+    };
+    const auto create = [&](const QString &address) {
+        const auto creator = KAMailAccountCreator::initWithSettings(QVariantMap{{"emailAddress", address}}, &plugin());
+        return creator->create() && creator->createdAccountUID() == address;
+    };
+    const auto createMany = [&](const QString &user) {
+        int created = 0;
+        for (int round = 0; round < 50; ++round)
+            created += create(user + QString::number(round));
+        return created;
+    };
+    auto ada = std::async(std::launch::async, createMany, "ada");
+    auto bea = std::async(std::launch::async, createMany, "bea");
+    EXPECT_EQ(ada.get(), 50);
+    EXPECT_EQ(bea.get(), 50);
+    for (std::thread &reporter : reporters)
+        reporter.join();
+}
+
+TEST_F(KAAccountCreatorTest, ACreatorBelowWhichAnotherOfItsPluginWaitsFails)
+{
+    bool inner = true;
+    QString reason;
+    plugin().onStart = [&](const Input &input) {
+        lastInput = input;
+        QTimer::singleShot(0, qApp, [&] {
+            const auto creator = mailCreator(plugin());
+            inner = creator->create();
+            reason = creator->failureReason();
+        });
+        QTimer::singleShot(1, qApp, [&] { plugin().accountSetupDidFinish(lastInput, result); });
+    };
+    EXPECT_TRUE(mailCreator(plugin())->create());  // whose delegate the other left alone, coming and going
+    EXPECT_FALSE(inner);
+    EXPECT_EQ(reason, "The plug-in is at work on another account, which this one would hold up.");
+}
+
 /// A pool of one thread for as long as a test runs.
 class OneThread {
 public:
