@@ -122,7 +122,7 @@ private:
 
 /// The events of the calling thread, for one that waits. Without sleeping between two looks, deliberately: a plug-in
 /// reports by events on this thread's loop, by calls from other threads, or by both, and no single thing could be slept
-/// on that wakes up for all of them.
+/// on that wakes up for all of them. It gives way, though: on a busy machine whoever is to report would come to it later.
 class EventsMeanwhile {
 public:
     EventsMeanwhile()
