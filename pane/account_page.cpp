@@ -75,6 +75,7 @@ AccountPage::AccountPage(Undertakings &undertakings, QWidget *parent)
     });
     connect(m_description, &QLineEdit::editingFinished, this, &AccountPage::saveDescription);
     connect(m_applications, &ApplicationSection::failed, this, &AccountPage::failed);
+    connect(m_applications, &ApplicationSection::changed, this, &AccountPage::changed);
     connect(m_password, &PasswordSection::failed, this, &AccountPage::failed);
 }
 
@@ -188,12 +189,12 @@ void AccountPage::change(const QString &sentence, std::function<void(KAAccount &
         [name, change = std::move(change)](const CancelFlag &isCancelled) {
             return changeAccount(name, change, isCancelled);
         },
-        [this, name](std::optional<ChangeResult> result) {
-            if (result == ChangeResult::Saved)
+        [this, name](const ChangeResult *result) {
+            if (result && *result == ChangeResult::Saved)
                 return;  // the registry's notification shows it
-            if (result == ChangeResult::NotSaved)
+            if (result && *result == ChangeResult::NotSaved)
                 emit failed(qtTrId("NOT_SAVED").arg(name.loginName));
-            else if (result == ChangeResult::NoAccount)
+            else if (result && *result == ChangeResult::NoAccount)
                 emit failed(qtTrId("ACCOUNT_GONE").arg(name.loginName));
             m_enabled->setChecked(m_account->accountIsEnabled());
         });

@@ -49,6 +49,9 @@ signals:
     /// Something went wrong: a sentence for the user.
     void failed(const QString &sentence);
 
+    /// The account is to be read again.
+    void changed();
+
 private:
     void makeHeader(QWidget *content);
     void showHeader(KAAListPlugin *plugin);

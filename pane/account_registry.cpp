@@ -42,13 +42,13 @@ void AccountRegistry::reload()
     m_watch.watchDirectories();
     m_undertakings.start<QList<AccountGroup>>(
         qtTrId("READING_ACCOUNTS"), this, [](const CancelFlag &) { return readAccounts(); },
-        [this](std::optional<QList<AccountGroup>> groups) {
+        [this](const QList<AccountGroup> *groups) {
             m_isReading = false;
             if (!groups) {
                 emit notRead();
                 return;
             }
-            m_groups = std::move(*groups);
+            m_groups = *groups;
             emit read();
             if (m_hasChanged)
                 reload();

@@ -30,7 +30,7 @@ void Adding::begin()
 {
     m_undertakings.start<QList<KAAListPlugin *>>(
         qtTrId("LOOKING_FOR_PLUGINS"), this, [](const CancelFlag &) { return accountListPlugins(); },
-        [this](std::optional<QList<KAAListPlugin *>> plugins) {
+        [this](const QList<KAAListPlugin *> *plugins) {
             if (plugins)
                 chooseAmong(*plugins);
         });
@@ -74,8 +74,8 @@ void Adding::save(const std::shared_ptr<KAAccount> &account, AddedAccount added)
         [account](const CancelFlag &) {
             return account->hasPendingChanges() ? saveAccount(account) : ChangeResult::Saved;
         },
-        [this, added = std::move(added)](std::optional<ChangeResult> result) {
-            if (result == ChangeResult::Saved)
+        [this, added = std::move(added)](const ChangeResult *result) {
+            if (result && *result == ChangeResult::Saved)
                 emit this->added(added);
             else if (result)
                 emit failed(qtTrId("NOT_SAVED").arg(added.name.loginName));

@@ -7,12 +7,14 @@
 #include <exception>
 
 #include <QtCore/QDeadlineTimer>
+#include <QtWidgets/QApplication>
 #include <QtWidgets/QVBoxLayout>
 
 #include <kavellaccounts/KAAccount.h>
 #include <kavellaccounts/KAAppTableController.h>
 #include <kavellaccounts/KAAppTableRow.h>
 #include <kavellaccounts/KAApplication.h>
+#include <kavellaccounts/KAConstants.h>
 
 #include "pane/application_details.h"
 
@@ -36,6 +38,17 @@ ApplicationSection::ApplicationSection(QWidget *parent)
     m_layout->addWidget(m_explanation);
     m_deadline.setInterval(kLookAgain);
     connect(&m_deadline, &QTimer::timeout, this, &ApplicationSection::giveUp);
+    m_observation = KANotificationCenter::shared().addObserver(
+        KAChangedAccountsNotification, [section = QPointer<ApplicationSection>(this)](const KANotification &) {
+            // Posted on whichever thread the plug-in works.
+            QMetaObject::invokeMethod(
+                qApp,
+                [section] {
+                    if (section)
+                        section->pluginIsDone();
+                },
+                Qt::QueuedConnection);
+        });
 }
 
 ApplicationSection::~ApplicationSection()
@@ -101,7 +114,7 @@ bool ApplicationSection::setEnabled(bool enabled, const std::shared_ptr<KAApplic
         return false;
     }
     const auto deadline = QDeadlineTimer(kPluginsTime).deadline();
-    m_expected.insert(application->bundleID(), {application, enabled, deadline});
+    m_expected.insert(application->bundleID(), {application, enabled, deadline, false});
     m_deadline.start();
     if (m_table && enabled)
         m_table->startProgressForApp(application);
@@ -111,7 +124,7 @@ bool ApplicationSection::setEnabled(bool enabled, const std::shared_ptr<KAApplic
 void ApplicationSection::settle()
 {
     for (auto expected = m_expected.begin(); expected != m_expected.end();) {
-        if (m_account->enabledForApplication(expected.key()) != expected->isEnabled) {
+        if (!expected->isOver && m_account->enabledForApplication(expected.key()) != expected->isEnabled) {
             ++expected;
             continue;
         }
@@ -123,6 +136,15 @@ void ApplicationSection::settle()
         m_deadline.stop();
     if (m_table)
         m_table->updateTable();
+}
+
+void ApplicationSection::pluginIsDone()
+{
+    // Which of several it has done, it does not say; each of them shows in the account, or ends with its time.
+    if (m_expected.size() != 1)
+        return;
+    m_expected.begin()->isOver = true;
+    emit changed();
 }
 
 void ApplicationSection::giveUp()

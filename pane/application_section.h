@@ -16,6 +16,7 @@
 #include <QtWidgets/QWidget>
 
 #include <kavellaccounts/KAAListPlugin.h>
+#include <kavellaccounts/KANotificationCenter.h>
 
 class KAAccount;
 class KAAppTableController;
@@ -50,15 +51,20 @@ signals:
     /// Something went wrong: a sentence for the user.
     void failed(const QString &sentence);
 
+    /// The plug-in has done something to the account, which is to be read again.
+    void changed();
+
 private:
     void showTable();
     void settle();
     void giveUp();
+    void pluginIsDone();
 
     struct Expectation {
         std::shared_ptr<KAApplication> application;
         bool isEnabled;
         qint64 deadline;  // of the monotonic clock, in ms
+        bool isOver;      // the plug-in says that it is done, whatever came of it
     };
 
     std::shared_ptr<KAAccount> m_account;
@@ -69,6 +75,7 @@ private:
     QLabel *m_explanation;
     QHash<QString, Expectation> m_expected;  // what the plug-in was told to do, by bundle identifier
     QTimer m_deadline;
+    KANotificationCenter::Observation m_observation;
 };
 
 }  // namespace kavell::pane

@@ -65,6 +65,7 @@ PaneWindow::PaneWindow(QWidget *parent)
         m_notice->showNotice(sentence);
     };
     connect(m_accountPage, &AccountPage::failed, this, tell);
+    connect(m_accountPage, &AccountPage::changed, &m_registry, &AccountRegistry::reload);
     connect(m_adding, &Adding::failed, this, tell);
     connect(m_adding, &Adding::added, this, &PaneWindow::accountWasAdded);
     m_settling.setInterval(kSettling);
@@ -192,7 +193,7 @@ void PaneWindow::open(const AccountName &name)
         [name](const CancelFlag &) {
             return OpenAccount{openAccount(name), openAccount(name)};
         },
-        [this, name](std::optional<OpenAccount> account) {
+        [this, name](const OpenAccount *account) {
             // Another one may have been selected meanwhile, or this one removed.
             if (account && account->shown && account->forPlugin && m_list->selectedAccount() == name)
                 showOpened(name, *account);

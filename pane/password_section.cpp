@@ -83,9 +83,9 @@ void PasswordSection::askForStatus()
 {
     m_undertakings.start<CSKavellCofferelStatus>(
         qtTrId("ASKING_FOR_PASSWORD_STATE"), this, [name = m_name](const CancelFlag &) { return passwordStatus(name); },
-        [this, name = m_name](std::optional<CSKavellCofferelStatus> status) {
+        [this, name = m_name](const CSKavellCofferelStatus *status) {
             if (name == m_name)
-                showStatus(status.value_or(kCSKavellCofferelStatusUnreachable));
+                showStatus(status ? *status : kCSKavellCofferelStatusUnreachable);
         });
 }
 
@@ -115,8 +115,8 @@ void PasswordSection::store(const QString &password)
     m_undertakings.start<ChangeResult>(
         qtTrId("STORING_PASSWORD"), this,
         [name = m_name, password](const CancelFlag &isCancelled) { return storePassword(name, password, isCancelled); },
-        [this](std::optional<ChangeResult> result) {
-            if (result == ChangeResult::NotSaved)
+        [this](const ChangeResult *result) {
+            if (result && *result == ChangeResult::NotSaved)
                 emit failed(qtTrId("PASSWORD_NOT_STORED"));
             askForStatus();
         });
@@ -126,7 +126,7 @@ void PasswordSection::reveal()
 {
     m_undertakings.start<QString>(
         qtTrId("READING_PASSWORD"), this, [name = m_name](const CancelFlag &) { return readPassword(name); },
-        [this, name = m_name](std::optional<QString> password) {
+        [this, name = m_name](const QString *password) {
             if (!password || !(name == m_name))
                 return;
             if (password->isNull()) {

@@ -91,7 +91,7 @@ void Removal::look()
             const std::shared_ptr<KAAccount> account = openAccount(name);
             return account ? applicationsOf(*account) : QStringList();
         },
-        [this](std::optional<QStringList> left) {
+        [this](const QStringList *left) {
             if (!left)
                 deleteLater();  // the user stopped: the account stays
             else if (left->isEmpty())
@@ -116,10 +116,10 @@ void Removal::remove()
     m_undertakings.start<ChangeResult>(
         qtTrId("REMOVING_ACCOUNT").arg(m_name.loginName), this,
         [name = m_name](const CancelFlag &isCancelled) { return removeAccount(name, isCancelled); },
-        [this](std::optional<ChangeResult> result) {
-            if (result == ChangeResult::NotSaved)
+        [this](const ChangeResult *result) {
+            if (result && *result == ChangeResult::NotSaved)
                 emit failed(qtTrId("NOT_REMOVED").arg(m_name.loginName));
-            else if (result == ChangeResult::PasswordLeft)
+            else if (result && *result == ChangeResult::PasswordLeft)
                 emit failed(qtTrId("PASSWORD_LEFT").arg(m_name.loginName));
             deleteLater();
         });

@@ -10,7 +10,6 @@
 #include <atomic>
 #include <functional>
 #include <memory>
-#include <optional>
 #include <vector>
 
 #include <QtCore/QObject>
@@ -31,25 +30,25 @@ public:
     explicit Undertakings(QObject *parent = nullptr);
     ~Undertakings() override;
 
-    /// Runs `work` in the background and hands `done` its answer, or nothing when it was cancelled first; `done` is
-    /// called once, and not at all when the context has gone.
+    /// Runs `work` in the background and hands `done` its answer, or null when it was cancelled first; `done` is called
+    /// once, and not at all when the context has gone.
     template <typename Result>
     void start(const QString &sentence, QObject *context, std::function<Result(const CancelFlag &)> work,
-               std::function<void(std::optional<Result>)> done)
+               std::function<void(const Result *)> done)
     {
-        const auto answer = [context = QPointer<QObject>(context), done](std::optional<Result> result) {
+        const auto answer = [context = QPointer<QObject>(context), done = std::move(done)](const Result *result) {
             if (context)
-                done(std::move(result));
+                done(result);
         };
         const auto isCancelled = std::make_shared<std::atomic_bool>(false);
         add({sentence, isCancelled, [answer] {
-                 answer(std::nullopt);
+                 answer(nullptr);
              }});
         runInBackground(
             this, [work = std::move(work), isCancelled] { return work(isCancelled); },
-            [this, answer, isCancelled](Result result) {
+            [this, answer, isCancelled](const Result &result) {
                 if (remove(isCancelled))
-                    answer(std::move(result));
+                    answer(&result);
             });
     }
 
