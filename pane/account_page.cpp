@@ -56,6 +56,19 @@ QString textOf(const KAAccount &account, const QString &key)
     return account.providerAttributeForKey(key).toString();
 }
 
+/// What the plug-in's provider offers, in the user's words.
+QString namesOfServices(KAAListPlugin *plugin)
+{
+    const std::shared_ptr<KAProvider> provider = plugin ? plugin->provider() : nullptr;
+    QStringList names;
+    const QStringList types = provider ? provider->serviceTypesProvided() : QStringList();
+    for (const QString &type : types)
+        names += plugin->serviceDisplayNameForService(type);
+    names.removeAll(QString());
+    names.removeDuplicates();
+    return QLocale().createSeparatedList(names);
+}
+
 }  // namespace
 
 AccountPage::AccountPage(Undertakings &undertakings, QWidget *parent)
@@ -146,28 +159,20 @@ void AccountPage::showHeader(KAAListPlugin *plugin)
 
 void AccountPage::showDetails(KAAListPlugin *plugin)
 {
+    QList<Detail> details{{qtTrId("LOGIN_NAME_LABEL"), m_account->loginName()},
+                          {qtTrId("FULL_NAME_LABEL"), m_account->fullName()},
+                          {qtTrId("EMAIL_ADDRESS_LABEL"), textOf(*m_account, KAMailEmailAddressKey)},
+                          {qtTrId("PROVIDER_LABEL"), providerTitle(m_account->provider(), plugin)},
+                          {qtTrId("SERVICES_LABEL"), namesOfServices(plugin)},
+                          {qtTrId("UID_LABEL"), m_account->uid()}};
+    details.removeIf([](const Detail &detail) { return detail.value.isEmpty(); });
+    if (details == m_shownDetails)
+        return;  // new labels would be blank until the next layout
+    m_shownDetails = details;
     while (m_details->rowCount() > 0)
         m_details->removeRow(0);
-    addDetail(qtTrId("LOGIN_NAME_LABEL"), m_account->loginName());
-    addDetail(qtTrId("FULL_NAME_LABEL"), m_account->fullName());
-    addDetail(qtTrId("EMAIL_ADDRESS_LABEL"), textOf(*m_account, KAMailEmailAddressKey));
-    addDetail(qtTrId("PROVIDER_LABEL"), providerTitle(m_account->provider(), plugin));
-    if (const std::shared_ptr<KAProvider> provider = plugin ? plugin->provider() : nullptr) {
-        QStringList services;
-        const QStringList types = provider->serviceTypesProvided();
-        for (const QString &type : types)
-            services += plugin->serviceDisplayNameForService(type);
-        services.removeAll(QString());
-        services.removeDuplicates();
-        addDetail(qtTrId("SERVICES_LABEL"), QLocale().createSeparatedList(services));
-    }
-    addDetail(qtTrId("UID_LABEL"), m_account->uid());
-}
-
-void AccountPage::addDetail(const QString &label, const QString &value)
-{
-    if (!value.isEmpty())
-        m_details->addRow(label, selectableLabel(value));
+    for (const Detail &detail : std::as_const(details))
+        m_details->addRow(detail.label, selectableLabel(detail.value));
 }
 
 void AccountPage::saveDescription()

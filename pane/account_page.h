@@ -56,9 +56,14 @@ private:
     void makeHeader(QWidget *content);
     void showHeader(KAAListPlugin *plugin);
     void showDetails(KAAListPlugin *plugin);
-    void addDetail(const QString &label, const QString &value);
     void saveDescription();
     void change(const QString &sentence, std::function<void(KAAccount &)> change);
+
+    struct Detail {
+        QString label;
+        QString value;
+        bool operator==(const Detail &other) const = default;
+    };
 
     Undertakings &m_undertakings;
     std::shared_ptr<KAAccount> m_account;
@@ -71,6 +76,7 @@ private:
     ApplicationSection *m_applications;
     PasswordSection *m_password;
     QFormLayout *m_details;
+    QList<Detail> m_shownDetails;
 };
 
 }  // namespace kavell::pane
