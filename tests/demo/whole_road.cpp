@@ -35,68 +35,19 @@
 #include "pane/background.h"
 #include "pane/pane_window.h"
 #include "pane/texts.h"
+#include "tests/demo/screen.h"
 
 namespace {
 
+using namespace kavell::demo;
+
 const QString kAddress = QStringLiteral("carla@zorbo.example");
-constexpr int kBound = 20'000;  // ms, for any one step
 constexpr QSize kPictureSize{880, 720};
 
 void say(const QString &sentence)
 {
     std::printf("  %s\n", qPrintable(sentence));
     std::fflush(stdout);
-}
-
-void require(bool holds, const char *what)
-{
-    if (holds)
-        return;
-    std::fprintf(stderr, "whole_road: This did not happen: %s\n", what);
-    std::exit(EXIT_FAILURE);
-}
-
-void waitFor(const std::function<bool()> &condition, const char *what)
-{
-    require(QTest::qWaitFor(condition, kBound), what);
-}
-
-/// The widget of an object name that is on the screen; null when there is none.
-template <typename View> View *visible(const char *name)
-{
-    const QWidgetList windows = QApplication::topLevelWidgets();
-    for (const QWidget *window : windows) {
-        for (View *view : window->findChildren<View *>(QLatin1String(name))) {
-            if (view->isVisible())
-                return view;
-        }
-    }
-    return nullptr;
-}
-
-template <typename View = QPushButton> void click(const char *name)
-{
-    waitFor([name] { return visible<View>(name) && visible<View>(name)->isEnabled(); }, name);
-    QTest::mouseClick(visible<View>(name), Qt::LeftButton);
-}
-
-void type(const char *field, const QString &text)
-{
-    waitFor([field] { return visible<QLineEdit>(field) != nullptr; }, field);
-    visible<QLineEdit>(field)->clear();
-    QTest::keyClicks(visible<QLineEdit>(field), text);
-}
-
-/// The check box of an application's row in a table that is on the screen.
-QCheckBox *checkBoxOf(const QString &bundleID)
-{
-    const QWidgetList widgets = QApplication::allWidgets();
-    for (QWidget *widget : widgets) {
-        auto *const row = qobject_cast<KAAppTableRow *>(widget);
-        if (row && row->isVisible() && row->application() && row->application()->bundleID() == bundleID)
-            return row->findChild<QCheckBox *>();
-    }
-    return nullptr;
 }
 
 std::shared_ptr<KAAccount> storedAccount()
