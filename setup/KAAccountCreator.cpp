@@ -158,11 +158,18 @@ KAAccountCreator::KAAccountCreator(const std::optional<QVariantMap> &settings, K
 
 KAAccountCreator::~KAAccountCreator()
 {
-    // To none, whoever the delegate is, but for another creator that is at work: it would wait for ever.
-    if (!_plugin || pluginsAtWork().take(_plugin) != PluginsAtWork::Answer::Taken)
-        return;
-    _plugin->setDelegate(nullptr);
-    pluginsAtWork().giveBack(_plugin);
+    // To none, whoever the delegate is, but for another creator that is at work: it would wait for ever. One whose turn
+    // has only just begun has yet to take this creator's place, to which messages come until it has.
+    while (_plugin) {
+        if (pluginsAtWork().take(_plugin) == PluginsAtWork::Answer::Taken) {
+            _plugin->setDelegate(nullptr);
+            pluginsAtWork().giveBack(_plugin);
+            return;
+        }
+        if (_plugin->delegate() != this)
+            return;
+        std::this_thread::yield();
+    }
 }
 
 std::shared_ptr<KAProvider> KAAccountCreator::provider() const
@@ -234,6 +241,7 @@ std::shared_ptr<KAAccountSetupResult> KAAccountCreator::discover(const std::shar
         const std::lock_guard lock(m_mutex);
         _result.reset();
         m_failureReason = QString();
+        m_failureError = {};
     }
     _waiting = true;
     const auto waitIsOver = qScopeGuard([this] { _waiting = false; });

@@ -66,11 +66,11 @@ public:
     /// Makes the account. True when the plug-in made one, and true when the newer online service needs none because its
     /// calendars or contacts were switched on. False after a failure, which the log tells, and failureReason.
     ///
-    /// Blocks until the plug-in is free and has reported, without a bound, and runs the events of the calling thread meanwhile, which
-    /// it asks for again and again without sleeping; a program without an application object has no events to run. Ends
-    /// early only when the plug-in is destroyed or the application object goes away. From an event that a creator of the
-    /// same plug-in runs while it waits, it fails. A thread of the global thread pool gives its place there to others for
-    /// that time. What the plug-in throws comes through.
+    /// Blocks until the plug-in is free and has reported, without a bound, and runs the events of the calling thread
+    /// meanwhile, which it asks for again and again without sleeping; a program without an application object has no
+    /// events to run. Ends early only when the plug-in is destroyed or the application object goes away. From an event
+    /// that a creator of the same plug-in runs while it waits, it fails. A thread of the global thread pool gives its
+    /// place there to others for that time. What the plug-in throws comes through.
     [[nodiscard]] bool create();
 
     /// @name What came of `create`. Any thread

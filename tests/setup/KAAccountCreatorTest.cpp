@@ -29,6 +29,17 @@ KAError someError()
     return {kKAErrorDomain, 17};
 }
 
+QString fieldOf(const KAAccountCreator &creator, const QString &name)
+{
+    KAFieldList list;
+    creator.describeFields(list);
+    for (const KAField &field : list.fields()) {
+        if (field.name == name)
+            return field.value;
+    }
+    return {};
+}
+
 TEST_F(KAAccountCreatorTest, ADiscoveredAccountIsCreated)
 {
     const auto creator = mailCreator(plugin());
@@ -101,6 +112,99 @@ TEST_F(KAAccountCreatorTest, MessagesFromAnotherThreadNeverReachADestroyedCreato
     EXPECT_EQ(plugin().delegate(), nullptr);
     stop = true;
     sender.join();
+}
+
+/// Keeps whoever sends it news.
+class KeepingCreator : public KAAccountCreator {
+    Q_OBJECT
+
+public:
+    struct Meeting {
+        std::promise<void> begun;
+        std::promise<void> ended;
+    };
+
+    KeepingCreator(KADataPlugin *plugin, Meeting &meeting) : KAAccountCreator(kSettings, plugin), m_meeting(meeting) {}
+
+    Q_INVOKABLE void pluginAccountSetupUpdate(KADataPlugin *, const std::shared_ptr<KAAccountSetupInput> &,
+                                              const QVariant &)
+    {
+        Meeting &meeting = m_meeting;
+        meeting.begun.set_value();
+        meeting.ended.get_future().wait();
+    }
+
+private:
+    Meeting &m_meeting;
+};
+
+TEST_F(KAAccountCreatorTest, ADestroyedCreatorWaitsForItsLastMessageThoughAnotherIsAboutToTakeItsPlace)
+{
+    KeepingCreator::Meeting meeting;
+    ScriptedDataPlugin &sending = plugin();
+    auto former = std::make_unique<KeepingCreator>(&sending, meeting);
+    EXPECT_TRUE(former->create());
+    auto sent = std::async(std::launch::async, [&] { sending.accountSetupUpdate(nullptr, 1); });
+    meeting.begun.get_future().wait();
+
+    const auto next = mailCreator(sending);
+    auto created = std::async(std::launch::async, [&] { return next->create(); });
+    // From then on it is its turn, and it waits to become the delegate.
+    ASSERT_TRUE(QTest::qWaitFor([&] { return fieldOf(*next, "_waiting") == "true"; }, 10000));
+    auto destroyed = std::async(std::launch::async, [&] { former.reset(); });
+    EXPECT_EQ(destroyed.wait_for(std::chrono::milliseconds(100)), std::future_status::timeout);
+    meeting.ended.set_value();
+    destroyed.get();
+    EXPECT_TRUE(created.get());
+}
+
+TEST_F(KAAccountCreatorTest, ReportsBeforeTheDiscoveryDoNotCount)
+{
+    const auto successful = mailCreator(plugin());
+    plugin().setDelegate(successful.get());
+    plugin().accountSetupDidFail(nullptr, someError());
+    EXPECT_TRUE(successful->create());
+    EXPECT_TRUE(successful->failureReason().isNull());
+    EXPECT_TRUE(successful->failureError().isNull());
+
+    plugin().onStart = [&](const Input &input) {
+        plugin().accountSetupDidFail(input, someError());
+    };
+    const auto failing = mailCreator(plugin());
+    plugin().setDelegate(failing.get());
+    plugin().accountSetupDidFinish(nullptr, result);
+    EXPECT_FALSE(failing->create());
+    EXPECT_EQ(creations, 1);
+}
+
+/// Tells when it has made its input, after which it waits for its turn.
+class TellingCreator : public KAAccountCreator {
+public:
+    explicit TellingCreator(KADataPlugin *plugin) : KAAccountCreator(kSettings, plugin) {}
+
+    mutable std::promise<void> madeInput;
+
+protected:
+    [[nodiscard]] std::shared_ptr<KAAccountSetupInput> _input() const override
+    {
+        madeInput.set_value();
+        return nullptr;
+    }
+};
+
+TEST_F(KAAccountCreatorTest, ACreatorWhosePluginIsDestroyedBeforeItsTurnFails)
+{
+    TellingCreator second(&plugin());
+    std::future<bool> created;
+    plugin().onStart = [&](const Input &) {
+        created = std::async(std::launch::async, [&] { return second.create(); });
+        second.madeInput.get_future().wait();
+        QTimer::singleShot(0, qApp, [&] { destroyPlugin(); });
+    };
+    const auto first = mailCreator(plugin());
+    EXPECT_FALSE(first->create());
+    EXPECT_FALSE(created.get());
+    EXPECT_EQ(second.failureReason(), "The plug-in or the program ended while it was at work on another account.");
 }
 
 TEST_F(KAAccountCreatorTest, AReportedFailureCreatesNothing)
@@ -444,10 +548,8 @@ TEST_F(KAAccountCreatorTest, TheWaitAndTheResultAreSeenInTheFields)
     QStringList results;
     std::shared_ptr<KAAccountCreator> creator = mailCreator(plugin());
     const auto look = [&] {
-        KAFieldList list;
-        creator->describeFields(list);
-        waiting += list.fields()[5].value;
-        results += list.fields()[2].value;
+        waiting += fieldOf(*creator, "_waiting");
+        results += fieldOf(*creator, "_result");
     };
     plugin().onStart = [&](const Input &input) {
         look();
@@ -473,3 +575,5 @@ TEST_F(KAAccountCreatorTest, ProviderAndNameAreThoseThatWereSet)
 }
 
 }  // namespace
+
+#include "KAAccountCreatorTest.moc"
