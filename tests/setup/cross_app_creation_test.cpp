@@ -311,7 +311,7 @@ TEST_F(CrossAppCreation, ADelegateWithoutTheMethodIsNeverCalledWhateverTheSelect
     const auto other = std::make_shared<OtherDelegate>();
     const auto controller = fromMail();
     controller->createAccountsWithDelegate(other, "didCreate", nullptr);
-    // The next creation's answer comes after this one's would have.
+    // By then its turn on the main thread would have come.
     QThreadPool::globalInstance()->waitForDone();
     QCoreApplication::processEvents();
     EXPECT_EQ(other->calls, 0);

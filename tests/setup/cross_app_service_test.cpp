@@ -6,6 +6,8 @@
 
 #include <kavellaccounts/KACrossAppSetupViewController.h>
 
+#include <functional>
+
 #include "tests/setup/cross_app_fixture.h"
 #include "tests/setup/online_service_calls.h"
 
@@ -155,6 +157,29 @@ TEST_F(CrossAppWithOnlineService, TickedApplicationsAreSwitchedOnAndMailIsMadeWi
     EXPECT_EQ(outcomes[0].accountUID, "new-com.corvane.mail.kaplugin");
     EXPECT_EQ(outcomes[1].state, Controller::ApplicationOutcome::State::Done);
     EXPECT_TRUE(outcomes[1].accountUID.isNull());
+}
+
+using MailWithOnlineService = CrossAppTest;
+
+TEST_F(MailWithOnlineService, ANameThatIsTakenFromTheSettingsMeanwhileIsLoggedAndNothingIsFilledIn)
+{
+    addListPlugin({.identifier = kKAQuillanePluginID,
+                   .providerType = kKAProviderQuillane,
+                   .serviceTypes = {"kKAServiceIMAP"},
+                   .domains = {"nimbrel.example"}});
+    const QVariantMap nameless{{"KAChatLoginName", "ada@nimbrel.example"}};  // an identifier, but no name
+    const auto controller = Controller::initWithSettings(kBrondel, kKATidewellAppID);
+    auto &onAccountType = onlineServiceVariable<std::function<void()>>("testOnAccountType");
+    onAccountType = [&] {
+        controller->setSettings(nameless);
+    };
+    takeOnlineServiceCalls();
+    const LogCapture log;
+    EXPECT_EQ(controller->numberOfAppsNeedingSetup(), 1);
+    onAccountType = nullptr;
+    EXPECT_EQ(log.messages(), QStringList{"*** Couldn't determine Corvane ID"});
+    EXPECT_EQ(controller->settings(), nameless);
+    EXPECT_EQ(takeOnlineServiceCalls(), QStringList{});
 }
 
 using ChatWithOnlineService = CrossAppTest;

@@ -5,6 +5,7 @@
 // newer kind; the account "absent" has no kind, and accounts with "nomail" in their name have no address. What was called
 // is counted, and noted line by line.
 
+#include <functional>
 #include <string>
 
 #include <kavellaccounts/CSKavellBoolean.h>
@@ -23,6 +24,10 @@ int testCallCount = 0;
 /// The calls about the session and about services, each on a line with its arguments. For one thread at a time.
 EXPORTED std::string testCalls;
 std::string testCalls;
+
+/// What else is to happen when the kind of an account is asked for.
+EXPORTED std::function<void()> testOnAccountType;
+std::function<void()> testOnAccountType;
 
 EXPORTED bool testServiceEnabled;
 bool testServiceEnabled = false;
@@ -98,6 +103,8 @@ EXPORTED CSKavellStringRef NBCopyAccountIDFromMailAlias(CSKavellStringRef alias)
 EXPORTED CSKavellTypeRef NBCopyAccountType(CSKavellStringRef account)
 {
     ++testCallCount;
+    if (testOnAccountType)
+        testOnAccountType();
     const std::string name = toStdString(account);
     if (name == "absent")
         return nullptr;
