@@ -362,10 +362,10 @@ bool KAAccountCreator::_warnAboutMigrationSyncIfNecessary() const
     const OnlineService *const service = onlineServiceOf(pluginIdentifier());
     if (!listPlugin || !service)
         return true;
-    bool goOn = true;
+    bool goOn = false;  // also when the program ends before the user could be asked
     kavell::runOnMainThread([&] {
-        if (listPlugin->shouldShowMigrationSyncAlertForService(service->serviceType))
-            goOn = listPlugin->showMigrationSyncAlertForService(service->serviceType);
+        goOn = !listPlugin->shouldShowMigrationSyncAlertForService(service->serviceType) ||
+               listPlugin->showMigrationSyncAlertForService(service->serviceType);
     });
     return goOn;
 }

@@ -21,7 +21,7 @@ class QSslSocket;
 /// for the user, without a bound; from another thread than the main one, for the main event loop, too. True when the
 /// user chose to continue: the chain is then accepted for the host. False, with a line in the log, for an error without
 /// URL or chain, a URL without host, a chain that is empty or has an entry that is no certificate, or in a program
-/// without a QApplication.
+/// without a QApplication. False, too, when the program ends before the main event loop came to it.
 [[nodiscard]] KAVELL_ACCOUNTS_EXPORT bool KAShowCertificatePanelForError(const KAError &error, const QString &title);
 
 /// The chains that were accepted, and the connections that are to honour them.

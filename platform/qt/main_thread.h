@@ -12,7 +12,8 @@ namespace kavell {
 
 /// Runs the work on the main thread and returns when it is done; what it throws comes through. On the main thread
 /// itself, and in a program without an application object, it runs on the calling thread. Another thread waits for the
-/// main event loop to come to it, without a bound.
+/// main event loop to come to it, without a bound; work that it has not come to when the application object goes is not
+/// done.
 void runOnMainThread(const std::function<void()> &work);
 
 }  // namespace kavell
