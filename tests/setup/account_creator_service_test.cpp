@@ -147,6 +147,17 @@ TEST_F(CreatorWithOnlineService, TheNameThatWasSetComesFirst)
     EXPECT_EQ(creator->corvaneID(), "anna");
 }
 
+TEST_F(CreatorWithOnlineService, AnEmptyNameIsAName)
+{
+    const auto creator = creatorFor(kKACalendarPluginID, QVariantMap{{"emailAddress", "berta@x.example"}});
+    creator->setCorvaneID("");
+    EXPECT_TRUE(creator->create());
+    EXPECT_EQ(takeOnlineServiceCalls(), QStringList({"isLoggedIn ", "enable  calendars"}));
+    const auto emptyAddress = creatorFor(kKACalendarPluginID, QVariantMap{{"emailAddress", ""}, {"userName", "carla"}});
+    EXPECT_TRUE(emptyAddress->create());
+    EXPECT_EQ(takeOnlineServiceCalls(), QStringList({"isLoggedIn ", "enable  calendars"}));
+}
+
 TEST_F(CreatorWithOnlineService, WithoutAnyNameItFails)
 {
     const LogCapture log;
