@@ -58,9 +58,22 @@ QString libraryText(const char *key)
 
 }  // namespace
 
+QString KAAppTableRow::nameToShow() const
+{
+    const std::shared_ptr<KAApplication> shown = application();
+    return _appDisplayName.isEmpty() && shown ? shown->displayNameForData() : _appDisplayName;
+}
+
+QString KAAppTableRow::labelFor(const QString &name) const
+{
+    return _serviceDisplayName.isEmpty() ? name : libraryText("APP_ROW_LABEL_FORMAT").arg(name, _serviceDisplayName);
+}
+
 void KAAppTableRow::textsChanged()
 {
     m_textsAreStale = true;
+    // Screen readers ask for rows that were never drawn, too.
+    showAccessibleTexts();
     if (isVisible())
         showTexts();
 }
@@ -68,31 +81,28 @@ void KAAppTableRow::textsChanged()
 void KAAppTableRow::showTexts()
 {
     m_textsAreStale = false;
-    const std::shared_ptr<KAApplication> shown = application();
-    if (_appDisplayName.isEmpty() && shown)
-        _appDisplayName = shown->displayNameForData();
-    const QString name = _serviceDisplayName.isEmpty()
-                             ? _appDisplayName
-                             : libraryText("APP_ROW_LABEL_FORMAT").arg(_appDisplayName, _serviceDisplayName);
+    _appDisplayName = nameToShow();
+    const QString label = labelFor(_appDisplayName);
     // From right to left the name's end need not be where the service is.
     if (_serviceDisplayName.isEmpty() || layoutDirection() == Qt::RightToLeft)
-        _appNameField->setOneToneText(name);
+        _appNameField->setOneToneText(label);
     else
-        _appNameField->setTwoToneText(name, _appDisplayName.size(), kServiceColour);
+        _appNameField->setTwoToneText(label, _appDisplayName.size(), kServiceColour);
     _secondaryTextField->setText(_secondaryText.isNull() ? QStringLiteral("") : _secondaryText);
-    showAccessibleTexts();
 }
 
 void KAAppTableRow::showAccessibleTexts()
 {
     const std::shared_ptr<KAApplication> shown = application();
+    QString label = labelFor(nameToShow());
     // What cannot be seen by its icon still has a name to be read out.
-    const QString name = _appNameField->text().isEmpty() && shown ? shown->displayName() : _appNameField->text();
-    setAccessibleName(name);
-    _checkbox->setAccessibleName(name);
+    if (label.isEmpty() && shown)
+        label = shown->displayName();
+    setAccessibleName(label);
+    _checkbox->setAccessibleName(label);
     _checkbox->setAccessibleDescription(_secondaryText);
-    _spinner->setAccessibleName(libraryText("APP_ROW_PROGRESS").arg(name));
-    _infoButton->setAccessibleName(libraryText("APP_ROW_INFO").arg(name));
+    _spinner->setAccessibleName(libraryText("APP_ROW_PROGRESS").arg(label));
+    _infoButton->setAccessibleName(libraryText("APP_ROW_INFO").arg(label));
 }
 
 void KAAppTableRow::showIcon()

@@ -124,6 +124,8 @@ private:
     void placeControls();
     [[nodiscard]] int heightOf(const QLabel *field) const;
     void place(QWidget *control, const QRect &leftToRight) const;
+    [[nodiscard]] QString nameToShow() const;
+    [[nodiscard]] QString labelFor(const QString &name) const;
     void textsChanged();
     void showTexts();
     void showAccessibleTexts();

@@ -305,6 +305,31 @@ TEST_F(KAAppTableControllerTest, ThePluginNamesApplicationAndService)
     EXPECT_EQ(table->rowViewForRow(3)->appDisplayName(), "Messages");
 }
 
+TEST_F(KAAppTableControllerTest, ARowThatIsMadeHasNamesForScreenReaders)
+{
+    const auto table = tableFor(conflictingAccount());
+    const QCheckBox *const box = checkboxOf(*table->rowViewForRow(0));
+    EXPECT_EQ(box->accessibleName(), "Letters (Zorbo Mail)");
+    EXPECT_EQ(box->accessibleDescription(), "Not available with your online-service account");
+}
+
+TEST_F(KAAppTableControllerTest, APluginThatHasGoneOffersAndNamesNothing)
+{
+    auto gone = std::make_unique<OfferingPlugin>(QStringList{kKAServiceIMAP});
+    const auto table = KAAppTableController::initWithAccount(accountFor({kKAMailPluginID}), gone.get());
+    table->setDelegate(gone.get());
+    ASSERT_EQ(table->numberOfRows(), 1);
+    gone.reset();
+    EXPECT_EQ(table->delegate(), nullptr);
+    const auto row = table->rowViewForRow(0);
+    EXPECT_EQ(row->appDisplayName(), "");
+    EXPECT_EQ(row->serviceDisplayName(), "");
+    checkboxOf(*row)->click();
+    EXPECT_TRUE(checkboxOf(*row)->isChecked());
+    table->updateTable();
+    EXPECT_THAT(bundleIDsOf(table->selectedApps()), ElementsAre(kKAMailAppID));
+}
+
 TEST_F(KAAppTableControllerTest, WithoutAPluginNamesAreEmpty)
 {
     const auto table = KAAppTableController::initWithAccount(accountFor({}), nullptr);

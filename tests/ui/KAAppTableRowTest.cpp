@@ -394,6 +394,22 @@ TEST_F(KAAppTableRowTest, ControlsHaveNamesForScreenReaders)
     EXPECT_EQ(spinnerOf(*row)->accessibleName(), "Setting up Letters (Zorbo Mail)");
 }
 
+TEST_F(KAAppTableRowTest, ScreenReadersFindTheNamesBeforeTheRowIsDrawn)
+{
+    row->setApplication(mail);
+    EXPECT_EQ(checkboxOf(*row)->accessibleName(), "Mail");
+    EXPECT_TRUE(row->appDisplayName().isNull());
+    row->setServiceDisplayName("Zorbo Mail");
+    EXPECT_EQ(checkboxOf(*row)->accessibleName(), "Mail (Zorbo Mail)");
+    row->setAppDisplayName("Letters");
+    row->setSecondaryText("Why not");
+    EXPECT_EQ(row->accessibleName(), "Letters (Zorbo Mail)");
+    EXPECT_EQ(checkboxOf(*row)->accessibleName(), "Letters (Zorbo Mail)");
+    EXPECT_EQ(checkboxOf(*row)->accessibleDescription(), "Why not");
+    EXPECT_EQ(infoButtonOf(*row)->accessibleName(), "Information about Letters (Zorbo Mail)");
+    EXPECT_EQ(spinnerOf(*row)->accessibleName(), "Setting up Letters (Zorbo Mail)");
+}
+
 TEST_F(KAAppTableRowTest, AnApplicationNobodyHasAWordForIsReadOutByItsName)
 {
     const Application other = KAApplication::initWithBundleID("com.example.other");

@@ -353,6 +353,15 @@ TEST_F(KAAppTableViewTest, AViewThatIsDeletedFirstDoesNotHurt)
     EXPECT_TRUE(checkboxOf(*view)->isChecked());
 }
 
+TEST_F(KAAppTableViewTest, ScreenReadersFindRowsThatWereNeverInView)
+{
+    show();
+    showMany(50);
+    ASSERT_TRUE(showsAllRows());
+    ASSERT_TRUE(row(49).visibleRegion().isEmpty());
+    EXPECT_EQ(QAccessible::queryAccessibleInterface(checkboxOf(row(49)))->text(QAccessible::Name), "Application 49");
+}
+
 TEST_F(KAAppTableViewTest, ScreenReadersFindTheTableAndItsControls)
 {
     show();
