@@ -8,6 +8,7 @@
 #include <QtCore/QTimerEvent>
 #include <QtGui/QPainter>
 #include <QtWidgets/QStyle>
+#include <QtWidgets/QStyleOptionFocusRect>
 
 namespace kavell {
 
@@ -69,6 +70,11 @@ void ProgressSpinner::timerEvent(QTimerEvent *event)
 void ProgressSpinner::paintEvent(QPaintEvent *)
 {
     QPainter painter(this);
+    if (hasFocus()) {
+        QStyleOptionFocusRect focus;
+        focus.initFrom(this);
+        style()->drawPrimitive(QStyle::PE_FrameFocusRect, &focus, &painter, this);
+    }
     painter.setRenderHint(QPainter::Antialiasing);
     const qreal radius = std::min(width(), height()) / 2.0 - 1;
     painter.translate(QRectF(rect()).center());

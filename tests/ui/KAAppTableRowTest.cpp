@@ -5,12 +5,15 @@
 
 #include <gmock/gmock.h>
 
+#include <QtCore/QAbstractEventDispatcher>
 #include <QtCore/QDir>
 #include <QtCore/QPointer>
 #include <QtCore/QProcess>
 #include <QtCore/QTemporaryDir>
+#include <QtGui/QHelpEvent>
 #include <QtTest/QTest>
 #include <QtWidgets/QApplication>
+#include <QtWidgets/QToolTip>
 
 #include <kavellaccounts/KAAppTableRowLoader.h>
 #include <kavellaccounts/KABundle.h>
@@ -231,6 +234,36 @@ TEST_F(KAAppTableRowTest, TheSpinnerTakesTheCheckBoxsPlace)
     EXPECT_FALSE(row->isSpinning());
     EXPECT_FALSE(checkboxOf(*row)->isHidden());
     EXPECT_FALSE(controlOf<kavell::ProgressSpinner>(*row, "spinner")->isAnimating());
+}
+
+TEST_F(KAAppTableRowTest, TheSpinnerTurnsOnlyWhileItIsSeen)
+{
+    const auto isTurning = [this] {
+        return !QAbstractEventDispatcher::instance()->registeredTimers(spinnerOf(*row)).isEmpty();
+    };
+    row->startSpinner();
+    EXPECT_FALSE(isTurning());
+    row->show();
+    EXPECT_TRUE(isTurning());
+    const QImage before = spinnerOf(*row)->grab().toImage();
+    EXPECT_TRUE(QTest::qWaitFor([&] { return spinnerOf(*row)->grab().toImage() != before; }));
+    row->hide();
+    EXPECT_FALSE(isTurning());
+    row->show();
+    row->stopSpinner();
+    EXPECT_FALSE(isTurning());
+}
+
+TEST_F(KAAppTableRowTest, ASpinnerWithTheFocusShowsIt)
+{
+    row->show();
+    row->startSpinner();
+    ASSERT_TRUE(QTest::qWaitForWindowActive(row.get()));
+    controlOf<kavell::ProgressSpinner>(*row, "spinner")->stopAnimation();
+    const QImage before = spinnerOf(*row)->grab().toImage();
+    QTest::keyClick(row.get(), Qt::Key_Tab);
+    ASSERT_TRUE(spinnerOf(*row)->hasFocus());
+    EXPECT_NE(spinnerOf(*row)->grab().toImage(), before);
 }
 
 TEST_F(KAAppTableRowTest, TheInformationButtonIsForAnEnabledApplicationThatDoesNotSpin)

@@ -207,6 +207,21 @@ TEST_F(KAAppTableViewTest, TheSpinnerKeepsTheFocusInItsRow)
     EXPECT_EQ(QApplication::focusWidget(), checkboxOf(row(0)));
 }
 
+TEST_F(KAAppTableViewTest, TabWalksOnFromASpinningRowAndBackToIt)
+{
+    row(1).setSpinOnSelection(true);
+    show();
+    checkboxOf(row(1))->setFocus();
+    QTest::keyClick(checkboxOf(row(1)), Qt::Key_Space);
+    ASSERT_TRUE(row(1).isSpinning());
+    QTest::keyClick(QApplication::focusWidget(), Qt::Key_Tab);
+    EXPECT_EQ(QApplication::focusWidget(), checkboxOf(row(2)));
+    QTest::keyClick(QApplication::focusWidget(), Qt::Key_Backtab, Qt::ShiftModifier);
+    EXPECT_EQ(QApplication::focusWidget(), spinnerOf(row(1)));
+    QTest::keyClick(QApplication::focusWidget(), Qt::Key_Backtab, Qt::ShiftModifier);
+    EXPECT_EQ(QApplication::focusWidget(), checkboxOf(row(0)));
+}
+
 TEST_F(KAAppTableViewTest, ReloadingKeepsTheFocus)
 {
     show();
