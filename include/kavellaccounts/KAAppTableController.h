@@ -79,7 +79,7 @@ public:
     void setDelegate(std::shared_ptr<QObject> delegate);  ///< retained
     void setDelegate(QObject *delegate);                  ///< whose owner is elsewhere, as a registered plug-in's
 
-    /// Given to each row when it is made; false without an account.
+    /// Given to each row when it is made; false after initWithNibName, true after initWithAccount.
     [[nodiscard]] bool showInfoButtons() const;
     void setShowInfoButtons(bool showInfoButtons);
     [[nodiscard]] bool spinOnSelection() const;
@@ -151,14 +151,13 @@ protected:
 private:
     void loadTable(const QString &name, const std::shared_ptr<KABundle> &bundle);
     void fetchAppsForServices(const QStringList &services);
-    void setAppsAndServices(const QList<std::shared_ptr<KAApplication>> &apps, const QStringList &services);
     void synchronizeWithAccount(const std::shared_ptr<KAApplication> &application);
     [[nodiscard]] QStringList servicesOffered() const;
     [[nodiscard]] QString serviceForApp(const std::shared_ptr<KAApplication> &application) const;
     [[nodiscard]] bool isConflicting(const KAApplication &application) const;
     void nameRow(KAAppTableRow &row, const std::shared_ptr<KAApplication> &application) const;
 
-    mutable std::mutex m_mutex;  // of the first five fields
+    mutable std::mutex m_mutex;  // of the properties that any thread may read
     std::shared_ptr<KAAccount> _account;
     QList<std::shared_ptr<KAApplication>> _apps;
     QStringList _pairedServices;
