@@ -16,6 +16,7 @@
 #include <kavellaccounts/KAApplication.h>
 #include <kavellaccounts/KABundle.h>
 #include <kavellaccounts/KAConstants.h>
+#include <kavellaccounts/KAFieldList.h>
 #include <kavellaccounts/KANotificationCenter.h>
 #include <kavellaccounts/KAProvider.h>
 #include <kavellaccounts/KASheetMorpher.h>
@@ -67,6 +68,14 @@ public:
     OpenPlugin plugin{KABundle::bundleWithPath(QStringLiteral(KAVELL_TEST_BUNDLES "/good/ExampleList.kaplugin"))};
     bool isLoaded = false;
 };
+
+/// Whether the sheet's content was ever changed with an animation: the morpher makes a view for the first.
+bool wasAnimated(const KASheetMorpher &morpher)
+{
+    KAFieldList list;
+    morpher.describeFields(list);
+    return list.fields().at(1).pointer != nullptr;
+}
 
 std::shared_ptr<KABundle> exampleBundle()
 {
@@ -145,6 +154,35 @@ TEST(KAAListPluginSheet, GoingBackShowsTheValidationViewAgain)
     ASSERT_EQ(plugin._hostSheet->contentView(), &selection);
     plugin.back(nullptr);
     EXPECT_EQ(plugin._hostSheet->contentView(), &validation);
+    plugin._hostSheet->setContentView(nullptr);
+}
+
+TEST(KAAListPluginSheet, GoingBackIsAnimatedAndPanelsAreWhenAsked)
+{
+    for (const bool goesBack : {false, true}) {
+        OpenPlugin plugin(nullptr);
+        QWidget validation;
+        QWidget selection;
+        plugin._validationView = &validation;
+        plugin._appSelectionView = &selection;
+        plugin.showValidationPanel(false);
+        plugin.showAppSelectionPanel(false);
+        EXPECT_FALSE(wasAnimated(*plugin._sheetMorpher));
+        goesBack ? plugin.back(nullptr) : plugin.showValidationPanel(true);
+        EXPECT_TRUE(wasAnimated(*plugin._sheetMorpher));
+        EXPECT_EQ(plugin._hostSheet->contentView(), &validation);
+        plugin._hostSheet->setContentView(nullptr);
+    }
+}
+
+TEST(KAAListPluginSheet, TheApplicationsAreAnimatedWhenAsked)
+{
+    OpenPlugin plugin(nullptr);
+    QWidget view;
+    plugin._appSelectionView = &view;
+    plugin.showAppSelectionPanel(true);
+    EXPECT_TRUE(wasAnimated(*plugin._sheetMorpher));
+    EXPECT_EQ(plugin._hostSheet->contentView(), &view);
     plugin._hostSheet->setContentView(nullptr);
 }
 
@@ -247,6 +285,17 @@ TEST(KAAListPluginSheet, OKTellsTheApplicationsThatAreOnInTheTablesOrder)
     ASSERT_EQ(chosen.size(), 2);
     EXPECT_EQ(chosen.at(0)->bundleID(), kKAMailAppID);
     EXPECT_EQ(chosen.at(1)->bundleID(), kKAParlexAppID);
+}
+
+TEST(KAAListPluginSheet, APluginAndItsTableCanBeDescribed)
+{
+    AppSelection selection;
+    KAFieldList plugin, table;
+    selection.plugin.describeFields(plugin);
+    selection.table().describeFields(table);
+    EXPECT_FALSE(plugin.fields().front().value.isEmpty());
+    EXPECT_EQ(table.fields().at(4).name, "_delegate");
+    EXPECT_EQ(table.fields().at(4).pointer, static_cast<const QObject *>(&selection.plugin));
 }
 
 TEST(KAAListPluginSheet, AnotherAccountsTableTakesThePlaceOfTheFormer)

@@ -295,6 +295,21 @@ TEST_F(KAAppTableRowTest, DisablingGreysTheRowOut)
     EXPECT_EQ(nameOf(*row)->palette().color(nameOf(*row)->foregroundRole()), QColor(Qt::gray));
 }
 
+TEST_F(KAAppTableRowTest, TheCheckBoxIsOutlinedLightlyInADarkTheme)
+{
+    const auto outline = [this] {
+        return checkboxOf(*row)->palette().color(QPalette::Window);
+    };
+    const QColor light = outline();
+    EXPECT_EQ(light, row->palette().color(QPalette::Window));
+    QPalette dark = row->palette();
+    dark.setColor(QPalette::Base, QColor(30, 30, 30));
+    dark.setColor(QPalette::Window, QColor(40, 40, 40));
+    dark.setColor(QPalette::Text, QColor(240, 240, 240));
+    row->setPalette(dark);
+    EXPECT_GT(outline().lightness(), 120);
+}
+
 TEST_F(KAAppTableRowTest, GreyingOutHappensOnceAndIsNeverUndone)
 {
     row->setApplication(mail);
@@ -351,6 +366,42 @@ TEST_F(KAAppTableRowTest, FromRightToLeftTheControlsAreMirrored)
     EXPECT_EQ(controlOf<QLabel>(*row, "icon")->geometry().right(), row->width() - 1 - icon.left());
     EXPECT_GT(checkboxOf(*row)->x(), nameOf(*row)->x());
     EXPECT_LT(infoButtonOf(*row)->x(), nameOf(*row)->geometry().right());
+}
+
+TEST_F(KAAppTableRowTest, TheNameStandsWhereReadingBegins)
+{
+    row->setAppDisplayName(QString(2, QChar(0x2588)));  // full blocks
+    row->resize(600, 48);
+    const auto inked = [this](int x) {
+        const QImage picture = nameOf(*row)->grab().toImage();
+        const QPoint middle = picture.rect().center();
+        return picture.pixelColor(x, middle.y()) != picture.pixelColor(middle);
+    };
+    (void)drawn();
+    const int width = nameOf(*row)->width();
+    EXPECT_TRUE(inked(5));
+    EXPECT_FALSE(inked(width - 5));
+    qApp->setLayoutDirection(Qt::RightToLeft);
+    (void)drawn();
+    EXPECT_FALSE(inked(5));
+    EXPECT_TRUE(inked(width - 5));
+}
+
+TEST_F(KAAppTableRowTest, ANameThatDoesNotFitIsToldByItsToolTip)
+{
+    const auto toolTip = [this] {
+        QToolTip::hideText();
+        QHelpEvent asked(QEvent::ToolTip, {}, nameOf(*row)->mapToGlobal(QPoint()));
+        QApplication::sendEvent(nameOf(*row), &asked);
+        return QToolTip::text();
+    };
+    row->setAppDisplayName("<b>Letters</b>");
+    (void)drawn();
+    EXPECT_EQ(toolTip(), "");
+    row->setAppDisplayName("<b>Letters</b>" + QString(100, u'x'));
+    (void)drawn();
+    EXPECT_EQ(toolTip(), "<p>&lt;b&gt;Letters&lt;/b&gt;" + QString(100, u'x') + "</p>");
+    QToolTip::hideText();
 }
 
 TEST_F(KAAppTableRowTest, WithoutAServiceTheNameIsPlain)

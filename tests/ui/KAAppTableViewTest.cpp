@@ -311,6 +311,21 @@ TEST_F(KAAppTableViewTest, ARowOutlivesTheTableThatShowedIt)
     EXPECT_THAT(delegate.toggled, IsEmpty());
 }
 
+TEST_F(KAAppTableViewTest, ARowSpinsOnWhenItsTableIsClosedAndCanBeStopped)
+{
+    row(0).setSpinOnSelection(true);
+    show();
+    const Application mail = table->appAtRow(0);
+    QTest::mouseClick(checkboxOf(row(0)), Qt::LeftButton);
+    table.reset();
+    const std::shared_ptr<KAAppTableRow> view = keptRow(mail);
+    EXPECT_TRUE(view->isSpinning());
+    view->stopSpinner();
+    EXPECT_FALSE(view->isSpinning());
+    EXPECT_FALSE(checkboxOf(*view)->isHidden());
+    EXPECT_TRUE(checkboxOf(*view)->isChecked());
+}
+
 TEST_F(KAAppTableViewTest, ARowThatIsShownElsewhereMovesThere)
 {
     show();
