@@ -3,6 +3,7 @@
 
 #include "ui/app_table_place.h"
 
+#include <QtCore/QEvent>
 #include <QtGui/QPainter>
 
 namespace kavell {
@@ -47,6 +48,14 @@ void AppTablePlace::setSelected(bool selected)
         return;
     held->setSelected(selected);
     update();
+}
+
+bool AppTablePlace::event(QEvent *event)
+{
+    const KAAppTableRow *const held = row();
+    if (event->type() == QEvent::LayoutRequest && held)
+        emit rowHeightChanged(held->sizeHint().height());
+    return QWidget::event(event);
 }
 
 void AppTablePlace::mousePressEvent(QMouseEvent *)

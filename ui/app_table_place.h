@@ -35,8 +35,10 @@ public:
 
 signals:
     void clicked();
+    void rowHeightChanged(int wanted);  ///< perhaps: the row was given another font, or another place
 
 protected:
+    bool event(QEvent *event) override;
     void mousePressEvent(QMouseEvent *event) override;
     void mouseReleaseEvent(QMouseEvent *event) override;
     void paintEvent(QPaintEvent *event) override;

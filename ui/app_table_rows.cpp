@@ -85,11 +85,12 @@ void AppTableRows::showRow(int row)
     auto *const place = new AppTablePlace(m_table, m_highlightsSelection);
     slot.place = place;
     connect(place, &AppTablePlace::clicked, this, [this, place] { selectPlaceOf(place); });
-    if (view)
+    connect(place, &AppTablePlace::rowHeightChanged, this, &AppTableRows::adoptRowHeight);
+    if (view) {
+        place->hold(view);  // with the table's font, which its height depends on
         adoptRowHeight(view->sizeHint().height());
+    }
     place->setGeometry(0, row * m_rowHeight, m_table->width(), m_rowHeight);
-    if (view)
-        place->hold(view);
     place->show();
     chainFocus(row);
 }

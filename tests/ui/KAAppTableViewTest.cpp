@@ -72,6 +72,13 @@ protected:
         table->reloadTable();
     }
 
+    void useFontOfSize(int points)
+    {
+        QFont font = table->view()->font();
+        font.setPointSize(points);
+        table->view()->setFont(font);
+    }
+
     [[nodiscard]] int rowsMade() const
     {
         int made = 0;
@@ -239,6 +246,29 @@ TEST_F(KAAppTableViewTest, RowsStandBelowEachOtherInTheOrderOfTheApplications)
     }
     table->view()->resize(600, 240);
     EXPECT_EQ(row(3).width(), scrollView()->viewport()->width());
+}
+
+TEST_F(KAAppTableViewTest, RowsAreAsHighAsTheTablesFontNeeds)
+{
+    useFontOfSize(40);
+    show();
+    const int height = row(0).sizeHint().height();
+    ASSERT_GT(height, 48);
+    for (int index = 0; index < 4; ++index) {
+        EXPECT_EQ(row(index).mapTo(scrollView()->widget(), QPoint()), QPoint(0, height * index));
+        EXPECT_EQ(row(index).height(), height);
+    }
+    EXPECT_GE(scrollView()->widget()->height(), 4 * height);
+}
+
+TEST_F(KAAppTableViewTest, RowsGrowWithTheFontOfATableThatIsShown)
+{
+    show();
+    useFontOfSize(40);
+    const int height = row(0).sizeHint().height();
+    ASSERT_GT(height, 48);
+    EXPECT_TRUE(QTest::qWaitFor([this, height] { return row(3).height() == height; }));
+    EXPECT_EQ(row(3).mapTo(scrollView()->widget(), QPoint()), QPoint(0, height * 3));
 }
 
 TEST_F(KAAppTableViewTest, NoRowIsMadeBeforeTheTableIsShown)
