@@ -206,6 +206,8 @@ TEST(KAAListPluginSheet, AddingAnAccountEndsTheSheetAndTellsOfTheAccount)
     plugin.showView(&view, false);
     plugin._hostSheet->beginSheet(nullptr);
     plugin._provisionalAccount = KAAccount::initWithProviderType("com.corvane.account.mail", "anna");
+    int timesFinished = 0;
+    QObject::connect(plugin._hostSheet.get(), &QDialog::finished, [&timesFinished] { ++timesFinished; });
     QVariant object;
     bool wasVisible = true;
     const auto observation = KANotificationCenter::shared().addObserver(KACreatedAccountsNotification,
@@ -217,6 +219,7 @@ TEST(KAAListPluginSheet, AddingAnAccountEndsTheSheetAndTellsOfTheAccount)
     const auto accounts = object.value<QList<std::shared_ptr<KAAccount>>>();
     EXPECT_THAT(accounts, testing::ElementsAre(plugin._provisionalAccount));
     EXPECT_FALSE(wasVisible);
+    EXPECT_EQ(timesFinished, 1);
     plugin._hostSheet->setContentView(nullptr);
 }
 

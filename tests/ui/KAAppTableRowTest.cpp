@@ -128,6 +128,19 @@ TEST_F(KAAppTableRowTest, TheIconShowsTheApplicationsImage)
     EXPECT_EQ(shown.toImage().convertToFormat(QImage::Format_ARGB32), expected.convertToFormat(QImage::Format_ARGB32));
 }
 
+TEST_F(KAAppTableRowTest, AnIconMadeForAScreenOfAnotherDensityIsMadeAnew)
+{
+    row->setApplication(mail);
+    auto *const icon = controlOf<QLabel>(*row, "icon");
+    const QImage expected = icon->pixmap().toImage();
+    QPixmap otherScreens(64, 64);
+    otherScreens.fill(Qt::red);
+    otherScreens.setDevicePixelRatio(2 * row->devicePixelRatioF());
+    icon->setPixmap(otherScreens);
+    (void)drawn();
+    EXPECT_EQ(icon->pixmap().toImage(), expected);
+}
+
 TEST_F(KAAppTableRowTest, ADisabledRowsIconIsWashedOut)
 {
     row->setApplication(mail);

@@ -9,6 +9,7 @@
 #include <gmock/gmock.h>
 
 #include <QtCore/QPointer>
+#include <QtCore/QThread>
 #include <QtGui/QAccessible>
 #include <QtTest/QTest>
 #include <QtWidgets/QApplication>
@@ -384,10 +385,13 @@ TEST_F(KAAppTableViewTest, TheLastReferenceMayGoOnAnotherThread)
 {
     show();
     const QPointer<KAAppTableRow> view = &row(0);
+    const QThread *deletedOn = nullptr;
+    QObject::connect(view, &QObject::destroyed, [&deletedOn] { deletedOn = QThread::currentThread(); });
     Application mail = table->appAtRow(0);
     table->setApps({});
     std::thread([&mail] { mail.reset(); }).join();
     ASSERT_TRUE(QTest::qWaitFor([&view] { return view.isNull(); }));
+    EXPECT_EQ(deletedOn, qApp->thread());
 }
 
 TEST_F(KAAppTableViewTest, TheApplicationsMayGoWhileTheDelegateIsAsked)
