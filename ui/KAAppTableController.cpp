@@ -12,7 +12,6 @@
 #include <kavellaccounts/KAAccount.h>
 #include <kavellaccounts/KAAppTableRow.h>
 #include <kavellaccounts/KAApplication.h>
-#include <kavellaccounts/KABundle.h>
 #include <kavellaccounts/KAConstants.h>
 #include <kavellaccounts/KAFieldList.h>
 #include <kavellaccounts/KAPluginManager.h>
@@ -21,6 +20,7 @@
 #include "model/configuration.h"
 #include "model/settings_reading.h"
 #include "ui/app_table_rows.h"
+#include "ui/library_text.h"
 
 namespace {
 
@@ -31,11 +31,6 @@ const QString kRowKey = QStringLiteral("rowView");  // of an application's user 
 
 // Provider attribute: the account cannot be used together with the maker's newest online service.
 const QString kConflictsWithAerwynKey = QStringLiteral("KAConflictsWithAerwyn");
-
-QString libraryText(const char *key)
-{
-    return KABundle::libraryBundle()->localizedString(QString::fromLatin1(key));
-}
 
 /// The row that an application has already; null when it has none.
 std::shared_ptr<KAAppTableRow> existingRow(const Application &application)
@@ -97,7 +92,7 @@ void KAAppTableController::loadTable(const QString &name, const std::shared_ptr<
         _appTable = outlet<QWidget>(QStringLiteral("appsTable"));
     }
     if (_appTable)
-        _appTable->setAccessibleName(libraryText("APP_TABLE"));
+        _appTable->setAccessibleName(kavell::libraryText("APP_TABLE"));
     m_rows =
         std::make_unique<kavell::AppTableRows>(_scrollView, _appTable, [this](int row) { return rowViewForRow(row); });
     if (_scrollView) {
@@ -301,7 +296,7 @@ std::shared_ptr<KAAppTableRow> KAAppTableController::rowViewForApp(const Applica
     nameRow(*row, application);
     const bool isConflicting = this->isConflicting(*application);
     row->setDisableControls(isConflicting);
-    row->setSecondaryText(isConflicting ? libraryText("CONFLICTS_WITH_AERWYN") : QStringLiteral(""));
+    row->setSecondaryText(isConflicting ? kavell::libraryText("CONFLICTS_WITH_AERWYN") : QStringLiteral(""));
     return row;
 }
 

@@ -15,6 +15,7 @@
 #include <kavellaccounts/KAApplication.h>
 #include <kavellaccounts/KABundle.h>
 
+#include "ui/library_text.h"
 #include "ui/progress_spinner.h"
 #include "ui/row_label.h"
 
@@ -51,11 +52,6 @@ const InfoButtonImages &infoButtonImages()
     return *images;
 }
 
-QString libraryText(const char *key)
-{
-    return KABundle::libraryBundle()->localizedString(QString::fromLatin1(key));
-}
-
 }  // namespace
 
 QString KAAppTableRow::nameToShow() const
@@ -66,7 +62,8 @@ QString KAAppTableRow::nameToShow() const
 
 QString KAAppTableRow::labelFor(const QString &name) const
 {
-    return _serviceDisplayName.isEmpty() ? name : libraryText("APP_ROW_LABEL_FORMAT").arg(name, _serviceDisplayName);
+    return _serviceDisplayName.isEmpty() ? name
+                                         : kavell::libraryText("APP_ROW_LABEL_FORMAT").arg(name, _serviceDisplayName);
 }
 
 void KAAppTableRow::textsChanged()
@@ -101,8 +98,8 @@ void KAAppTableRow::showAccessibleTexts()
     setAccessibleName(label);
     _checkbox->setAccessibleName(label);
     _checkbox->setAccessibleDescription(_secondaryText);
-    _spinner->setAccessibleName(libraryText("APP_ROW_PROGRESS").arg(label));
-    _infoButton->setAccessibleName(libraryText("APP_ROW_INFO").arg(label));
+    _spinner->setAccessibleName(kavell::libraryText("APP_ROW_PROGRESS").arg(label));
+    _infoButton->setAccessibleName(kavell::libraryText("APP_ROW_INFO").arg(label));
 }
 
 void KAAppTableRow::showIcon()
