@@ -76,21 +76,40 @@ public:
     Answer take(const KADataPlugin *plugin)
     {
         const std::lock_guard lock(m_mutex);
-        const auto [entry, isNew] = m_threads.try_emplace(plugin, std::this_thread::get_id());
+        const auto [entry, isNew] = m_turns.try_emplace(plugin, Turn{std::this_thread::get_id()});
         if (isNew)
             return Answer::Taken;
-        return entry->second == std::this_thread::get_id() ? Answer::BusyBelow : Answer::Busy;
+        return entry->second.thread == std::this_thread::get_id() ? Answer::BusyBelow : Answer::Busy;
+    }
+
+    /// The creator that took it has become its delegate: no message is under way to another one any more.
+    void noteDelegate(const KADataPlugin *plugin)
+    {
+        const std::lock_guard lock(m_mutex);
+        m_turns.at(plugin).isDelegate = true;
+    }
+
+    [[nodiscard]] bool servesItsDelegate(const KADataPlugin *plugin)
+    {
+        const std::lock_guard lock(m_mutex);
+        const auto entry = m_turns.find(plugin);
+        return entry != m_turns.end() && entry->second.isDelegate;
     }
 
     void giveBack(const KADataPlugin *plugin)
     {
         const std::lock_guard lock(m_mutex);
-        m_threads.erase(plugin);
+        m_turns.erase(plugin);
     }
 
 private:
+    struct Turn {
+        std::thread::id thread;
+        bool isDelegate = false;
+    };
+
     std::mutex m_mutex;
-    std::map<const KADataPlugin *, std::thread::id> m_threads;
+    std::map<const KADataPlugin *, Turn> m_turns;
 };
 
 PluginsAtWork &pluginsAtWork()
@@ -166,7 +185,8 @@ KAAccountCreator::~KAAccountCreator()
             pluginsAtWork().giveBack(_plugin);
             return;
         }
-        if (_plugin->delegate() != this)
+        // The plug-in itself is not asked: it may be in the midst of a question to the user.
+        if (pluginsAtWork().servesItsDelegate(_plugin))
             return;
         std::this_thread::yield();
     }
@@ -246,6 +266,7 @@ std::shared_ptr<KAAccountSetupResult> KAAccountCreator::discover(const std::shar
     _waiting = true;
     const auto waitIsOver = qScopeGuard([this] { _waiting = false; });
     _plugin->setDelegate(this);
+    pluginsAtWork().noteDelegate(_plugin);
     _plugin->startAccountSetupWithInput(input);
     waitForReport();
     const std::lock_guard lock(m_mutex);

@@ -3,6 +3,7 @@
 //
 // Creators whose plug-in meets a server that the user must be asked about, with the real panel.
 
+#include <functional>
 #include <future>
 #include <thread>
 
@@ -40,6 +41,8 @@ protected:
             QWidget *const panel = QApplication::activeModalWidget();
             if (!panel)
                 return pressWhenShown(button);
+            if (beforePress)
+                beforePress();
             message = panel->findChild<QLabel *>("message")->text();
             QTest::mouseClick(panel->findChild<QPushButton *>(button), Qt::LeftButton);
         });
@@ -56,6 +59,7 @@ protected:
 
     bool answer = false;
     QString message;
+    std::function<void()> beforePress;
 };
 
 TEST_F(CreatorWithCertificate, ARefusalEndsTheWaitWithoutAnAccount)
@@ -108,6 +112,23 @@ TEST_F(CreatorWithCertificate, AWorkersQuestionIsAskedOnTheMainThread)
 {
     plugin().onStart = [&](const Input &input) {
         ask(input);
+    };
+    pressWhenShown("continue");
+    auto created = std::async(std::launch::async,
+                              [&] { return KAMailAccountCreator::initWithSettings(kSettings, &plugin())->create(); });
+    ASSERT_TRUE(
+        QTest::qWaitFor([&] { return created.wait_for(std::chrono::seconds(0)) == std::future_status::ready; }, 10000));
+    EXPECT_TRUE(created.get());
+}
+
+TEST_F(CreatorWithCertificate, ACreatorMayGoWhileAnothersQuestionIsUp)
+{
+    plugin().onStart = [&](const Input &input) {
+        ask(input);
+    };
+    auto other = KAMailAccountCreator::initWithSettings(kSettings, &plugin());
+    beforePress = [&] {
+        other.reset();
     };
     pressWhenShown("continue");
     auto created = std::async(std::launch::async,
