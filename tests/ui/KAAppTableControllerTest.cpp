@@ -47,15 +47,7 @@ private:
     QTemporaryDir m_directory;
 };
 
-class KAAppTableControllerTest : public testing::Test {
-protected:
-    std::shared_ptr<KAAppTableController> tableFor(const std::shared_ptr<KAAccount> &account)
-    {
-        return KAAppTableController::initWithAccount(account, &plugin);
-    }
-
-    OfferingPlugin plugin{allServices()};
-};
+class KAAppTableControllerTest : public AppTableTest {};
 
 TEST_F(KAAppTableControllerTest, AMissingInterfaceIsLoggedAndLeavesNoView)
 {
@@ -399,83 +391,6 @@ TEST_F(KAAppTableControllerTest, OnlyATrueAttributeConflicts)
     const auto account = accountFor({});
     account->setProviderAttribute(false, "KAConflictsWithAerwyn");
     EXPECT_FALSE(tableFor(account)->rowViewForRow(0)->disableControls());
-}
-
-TEST_F(KAAppTableControllerTest, AnAcceptedToggleStays)
-{
-    RecordingDelegate delegate;
-    const auto table = tableFor(accountFor({}));
-    table->setDelegate(&delegate);
-    QCheckBox box;
-    box.setChecked(true);
-    table->checkboxClickedForApp(&box, table->appAtRow(0));
-    EXPECT_TRUE(box.isChecked());
-    EXPECT_TRUE(table->appAtRow(0)->enabled());
-    EXPECT_THAT(delegate.toggled, ElementsAre(table->appAtRow(0)));
-    EXPECT_THAT(delegate.enabledWhenAsked, ElementsAre(true));
-}
-
-TEST_F(KAAppTableControllerTest, ARefusedToggleShowsTheFormerStateButKeepsTheFlag)
-{
-    RecordingDelegate delegate;
-    delegate.accepts = false;
-    const auto table = tableFor(accountFor({}));
-    table->setDelegate(&delegate);
-    QCheckBox box;
-    box.setChecked(true);
-    table->checkboxClickedForApp(&box, table->appAtRow(0));
-    EXPECT_FALSE(box.isChecked());
-    EXPECT_TRUE(table->appAtRow(0)->enabled());
-    table->checkboxClickedForApp(&box, table->appAtRow(0));
-    EXPECT_TRUE(box.isChecked());
-    EXPECT_FALSE(table->appAtRow(0)->enabled());
-}
-
-TEST_F(KAAppTableControllerTest, AToggleThatNobodyAnswersIsRefused)
-{
-    const auto table = tableFor(accountFor({}));
-    QObject mute;
-    for (QObject *delegate : {static_cast<QObject *>(nullptr), &mute}) {
-        table->setDelegate(delegate);
-        QCheckBox box;
-        box.setChecked(true);
-        table->checkboxClickedForApp(&box, table->appAtRow(0));
-        EXPECT_FALSE(box.isChecked());
-        EXPECT_TRUE(table->appAtRow(0)->enabled());
-    }
-    table->checkboxClickedForApp(nullptr, table->appAtRow(0));
-    QCheckBox box;
-    table->checkboxClickedForApp(&box, nullptr);
-}
-
-TEST_F(KAAppTableControllerTest, TheDelegateShowsInformation)
-{
-    RecordingDelegate delegate;
-    QObject mute;
-    const auto table = tableFor(accountFor({}));
-    table->infoButtonClickedForApp(table->appAtRow(1));
-    table->setDelegate(&mute);
-    table->infoButtonClickedForApp(table->appAtRow(1));
-    table->setDelegate(&delegate);
-    table->infoButtonClickedForApp(table->appAtRow(1));
-    EXPECT_THAT(delegate.shown, ElementsAre(table->appAtRow(1)));
-}
-
-TEST_F(KAAppTableControllerTest, ASharedDelegateIsRetainedAndAPlainOneIsNot)
-{
-    const auto table = tableFor(accountFor({}));
-    auto shared = std::make_shared<RecordingDelegate>();
-    const std::weak_ptr<QObject> seen = shared;
-    table->setDelegate(shared);
-    shared.reset();
-    EXPECT_EQ(table->delegate(), seen.lock().get());
-    {
-        QObject plain;
-        table->setDelegate(&plain);
-        EXPECT_TRUE(seen.expired());
-        EXPECT_EQ(table->delegate(), &plain);
-    }
-    EXPECT_EQ(table->delegate(), nullptr);
 }
 
 TEST_F(KAAppTableControllerTest, PropertiesAreKept)

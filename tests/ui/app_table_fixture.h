@@ -2,14 +2,17 @@
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
 // What the tests of the application table share: an account-list plug-in that offers services, delegates that answer,
-// and the controls of a row by their object names.
+// the controls of a row by their object names, and fixtures with a row and with tables.
 
 #ifndef KAVELL_TESTS_UI_APP_TABLE_FIXTURE_H
 #define KAVELL_TESTS_UI_APP_TABLE_FIXTURE_H
 
 #include <functional>
 
+#include <gtest/gtest.h>
+
 #include <QtWidgets/QAbstractButton>
+#include <QtWidgets/QApplication>
 #include <QtWidgets/QCheckBox>
 #include <QtWidgets/QLabel>
 
@@ -20,6 +23,8 @@
 #include <kavellaccounts/KAApplication.h>
 #include <kavellaccounts/KAConstants.h>
 #include <kavellaccounts/KAProvider.h>
+
+#include "ui/row_label.h"
 
 namespace kavell::test {
 
@@ -124,6 +129,32 @@ inline QWidget *spinnerOf(const KAAppTableRow &row)
     return controlOf<QWidget>(row, "spinner");
 }
 /// @}
+
+/// A row without a table.
+class AppTableRowTest : public testing::Test {
+protected:
+    ~AppTableRowTest() override { qApp->setLayoutDirection(Qt::LeftToRight); }
+
+    [[nodiscard]] RowLabel *nameField() const { return controlOf<RowLabel>(*row, "appNameField"); }
+    [[nodiscard]] bool hasInfoButton() const { return !infoButtonOf(*row)->isHidden(); }
+
+    /// What of the row is painted when it is drawn.
+    QImage drawn() const { return row->grab().toImage(); }
+
+    std::shared_ptr<KAAppTableRow> row = KAAppTableRow::createFromNib();
+    Application mail = KAApplication::initWithBundleID(kKAMailAppID);
+};
+
+/// Tables of accounts of one plug-in, which are not shown.
+class AppTableTest : public testing::Test {
+protected:
+    std::shared_ptr<KAAppTableController> tableFor(const std::shared_ptr<KAAccount> &account)
+    {
+        return KAAppTableController::initWithAccount(account, &plugin);
+    }
+
+    OfferingPlugin plugin{allServices()};
+};
 
 }  // namespace kavell::test
 
