@@ -16,6 +16,8 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <QtCore/QEventLoop>
+#include <QtCore/QTimer>
 #include <QtTest/QTest>
 #include <QtWidgets/QApplication>
 #include <QtWidgets/QLabel>
@@ -134,13 +136,20 @@ const Changer *changer = nullptr;
 /// Notes when a label has painted the text that is waited for.
 class PaintWatch : public QObject {
 public:
-    explicit PaintWatch(QLabel *label) : m_label(label) { label->installEventFilter(this); }
+    explicit PaintWatch(QLabel *label) : m_label(label)
+    {
+        label->installEventFilter(this);
+        connect(&m_patience, &QTimer::timeout, &m_loop, &QEventLoop::quit);
+    }
 
+    /// The time of the painting; 0 when it does not come.
     int64_t waitFor(const QString &text)
     {
         m_painted = 0;
         m_text = text;
-        (void)QTest::qWaitFor([this] { return m_painted != 0; }, kBound);
+        m_patience.start(kBound);
+        m_loop.exec();
+        m_patience.stop();
         return m_painted;
     }
 
@@ -149,12 +158,20 @@ protected:
     {
         if (event->type() == QEvent::Paint && m_label->text() == m_text)
             QMetaObject::invokeMethod(
-                this, [this] { m_painted = Changer::now(); }, Qt::QueuedConnection);
+                this, [this] { notePainting(); }, Qt::QueuedConnection);
         return QObject::eventFilter(watched, event);
     }
 
 private:
+    void notePainting()
+    {
+        m_painted = Changer::now();
+        m_loop.quit();
+    }
+
     QLabel *const m_label;
+    QEventLoop m_loop;
+    QTimer m_patience;
     QString m_text;
     int64_t m_painted = 0;
 };
