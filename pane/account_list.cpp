@@ -4,6 +4,7 @@
 #include "pane/account_list.h"
 
 #include <QtGui/QPainter>
+#include <QtGui/QTextDocument>
 #include <QtWidgets/QApplication>
 #include <QtWidgets/QStyledItemDelegate>
 
@@ -93,7 +94,8 @@ void describe(QStandardItem &item, const AccountSummary &account)
     item.setData(subtitle, kSubtitleRole);
     item.setData(subtitle.isEmpty() ? title : qtTrId("ACCESSIBLE_ACCOUNT").arg(title, subtitle),
                  Qt::AccessibleTextRole);
-    item.setToolTip(subtitle.isEmpty() ? title : title + u'\n' + subtitle);
+    // What the user typed must not be taken for markup.
+    item.setToolTip(Qt::convertFromPlainText(subtitle.isEmpty() ? title : title + u'\n' + subtitle));
     item.setData(QVariant::fromValue(account), kSummaryRole);
 }
 
@@ -130,8 +132,8 @@ void AccountList::showAccounts(const QList<AccountGroup> &groups)
                }))
             root->removeRow(row);
         if (row >= root->rowCount() || root->child(row)->data(kNameRole).toString() != group.providerType) {
-            const QString title = providerTitle(group.providerType, group.plugin);
-            auto *const item = new QStandardItem(brandIcon(group.plugin), title);
+            auto *const item =
+                new QStandardItem(brandIcon(group.plugin), providerTitle(group.providerType, group.plugin));
             item->setData(group.providerType, kNameRole);
             item->setFlags(Qt::ItemIsEnabled);
             QFont font = item->font();

@@ -4,11 +4,9 @@
 #include "pane/account_page.h"
 
 #include <QtCore/QLocale>
-#include <QtGui/QGuiApplication>
 #include <QtWidgets/QGroupBox>
 #include <QtWidgets/QHBoxLayout>
 #include <QtWidgets/QScrollBar>
-#include <QtWidgets/QStyle>
 #include <QtWidgets/QVBoxLayout>
 
 #include <kavellaccounts/KAAListPlugin.h>
@@ -19,6 +17,7 @@
 #include "pane/application_section.h"
 #include "pane/password_section.h"
 #include "pane/provider_looks.h"
+#include "pane/text_label.h"
 #include "pane/undertakings.h"
 
 namespace kavell::pane {
@@ -37,18 +36,6 @@ QGroupBox *section(const QString &title, QWidget *content)
     auto *const layout = new QVBoxLayout(box);
     layout->addWidget(content);
     return box;
-}
-
-QLabel *selectableLabel(const QString &text)
-{
-    auto *const label = new QLabel(text);
-    label->setTextFormat(Qt::PlainText);
-    label->setWordWrap(true);
-    // Selectable text is aligned by its own direction otherwise, which an address has from left to right.
-    label->setAlignment(QStyle::visualAlignment(QGuiApplication::layoutDirection(), Qt::AlignLeft | Qt::AlignVCenter) |
-                        Qt::AlignAbsolute);
-    label->setTextInteractionFlags(Qt::TextSelectableByMouse | Qt::TextSelectableByKeyboard);
-    return label;
 }
 
 QString textOf(const KAAccount &account, const QString &key)
@@ -72,10 +59,9 @@ QString namesOfServices(KAAListPlugin *plugin)
 }  // namespace
 
 AccountPage::AccountPage(Undertakings &undertakings, QWidget *parent)
-    : QScrollArea(parent), m_undertakings(undertakings), m_icon(new QLabel), m_title(selectableLabel(QString())),
-      m_subtitle(selectableLabel(QString())), m_enabled(new QCheckBox(qtTrId("ACCOUNT_ENABLED"))),
-      m_description(new QLineEdit), m_applications(new ApplicationSection),
-      m_password(new PasswordSection(undertakings)), m_details(new QFormLayout)
+    : QScrollArea(parent), m_undertakings(undertakings), m_icon(new QLabel), m_title(new TextLabel),
+      m_subtitle(new TextLabel), m_enabled(new QCheckBox(qtTrId("ACCOUNT_ENABLED"))), m_description(new QLineEdit),
+      m_applications(new ApplicationSection), m_password(new PasswordSection(undertakings)), m_details(new QFormLayout)
 {
     setWidgetResizable(true);
     setFrameShape(NoFrame);
@@ -83,8 +69,11 @@ AccountPage::AccountPage(Undertakings &undertakings, QWidget *parent)
     makeHeader(content);
     setWidget(content);
     connect(m_enabled, &QCheckBox::clicked, this, [this](bool isEnabled) {
-        change(isEnabled ? qtTrId("SWITCHING_ON") : qtTrId("SWITCHING_OFF"),
-               [isEnabled](KAAccount &account) { account.setAccountEnabled(isEnabled); });
+        makeChange({nameOf(*m_account), isEnabled ? qtTrId("SWITCHING_ON") : qtTrId("SWITCHING_OFF"),
+                    [isEnabled](KAAccount &account) { account.setAccountEnabled(isEnabled); },
+                    [this] {
+                        m_enabled->setChecked(m_account->accountIsEnabled());
+                    }});
     });
     connect(m_description, &QLineEdit::editingFinished, this, &AccountPage::saveDescription);
     connect(m_applications, &ApplicationSection::failed, this, &AccountPage::failed);
@@ -128,19 +117,35 @@ void AccountPage::makeHeader(QWidget *content)
 
 void AccountPage::showAccount(const OpenAccount &account, KAAListPlugin *plugin)
 {
-    const bool isAnother = !m_account || m_account->loginName() != account.shown->loginName() ||
-                           m_account->provider() != account.shown->provider();
+    const bool isAnother = !isShown(nameOf(*account.shown));
+    if (isAnother)
+        saveDescription();
     m_account = account.shown;
     m_defaultDescription = plugin ? plugin->defaultAccountDescription() : QString();
     if (isAnother) {
         verticalScrollBar()->setValue(0);
-        m_description->setModified(false);
     }
     showHeader(plugin);
     m_applications->showAccount(account.shown, account.forPlugin, plugin);
-    m_password->showAccount({m_account->provider(), m_account->loginName()},
-                            m_account->providerAttributeForKey(kPasswordReferenceKey));
+    if (isAnother)
+        putApplicationsIntoFocusChain();
+    m_password->showAccount(nameOf(*m_account), m_account->providerAttributeForKey(kPasswordReferenceKey));
     showDetails(plugin);
+}
+
+void AccountPage::putApplicationsIntoFocusChain()
+{
+    // Their table is made for each account, and so comes last of all by itself.
+    QWidgetList inside;
+    for (QWidget *next = m_applications->nextInFocusChain(); next != m_applications; next = next->nextInFocusChain()) {
+        if (m_applications->isAncestorOf(next) && next->focusPolicy() != Qt::NoFocus)
+            inside += next;
+    }
+    QWidget *previous = m_description;
+    for (QWidget *widget : std::as_const(inside)) {
+        setTabOrder(previous, widget);
+        previous = widget;
+    }
 }
 
 void AccountPage::showHeader(KAAListPlugin *plugin)
@@ -172,7 +177,7 @@ void AccountPage::showDetails(KAAListPlugin *plugin)
     while (m_details->rowCount() > 0)
         m_details->removeRow(0);
     for (const Detail &detail : std::as_const(details))
-        m_details->addRow(detail.label, selectableLabel(detail.value));
+        m_details->addRow(detail.label, new TextLabel(detail.value));
 }
 
 void AccountPage::saveDescription()
@@ -181,28 +186,66 @@ void AccountPage::saveDescription()
         return;
     m_description->setModified(false);
     const QString description = m_description->text().trimmed();
-    change(qtTrId("SAVING_DESCRIPTION"), [description](KAAccount &account) {
+    const auto change = [description](KAAccount &account) {
         account.setProviderAttribute(description.isEmpty() ? QVariant() : description, KAMailAccountDescriptionKey);
-    });
+    };
+    // What was not saved stays in the field, and is tried again when the user leaves it the next time.
+    makeChange({nameOf(*m_account), qtTrId("SAVING_DESCRIPTION"), change, [this] {
+                    m_description->setModified(true);
+                }});
 }
 
-void AccountPage::change(const QString &sentence, std::function<void(KAAccount &)> change)
+bool AccountPage::isShown(const AccountName &name) const
 {
-    const AccountName name{m_account->provider(), m_account->loginName()};
+    return m_account && nameOf(*m_account) == name;
+}
+
+void AccountPage::makeChange(Change change)
+{
+    m_waiting.push_back(std::move(change));
+    startChanges();
+}
+
+void AccountPage::startChanges()
+{
+    for (auto next = m_waiting.begin(); next != m_waiting.end();) {
+        if (m_changing.contains(next->name)) {
+            ++next;
+            continue;
+        }
+        start(*next);
+        next = m_waiting.erase(next);
+    }
+}
+
+void AccountPage::start(const Change &change)
+{
+    m_changing += change.name;
     m_undertakings.start<ChangeResult>(
-        sentence, this,
-        [name, change = std::move(change)](const CancelFlag &isCancelled) {
-            return changeAccount(name, change, isCancelled);
+        change.sentence, this,
+        [name = change.name, apply = change.apply](const CancelFlag &isCancelled) {
+            return changeAccount(name, apply, isCancelled);
         },
-        [this, name](const ChangeResult *result) {
-            if (result && *result == ChangeResult::Saved)
-                return;  // the registry's notification shows it
-            if (result && *result == ChangeResult::NotSaved)
-                emit failed(qtTrId("NOT_SAVED").arg(name.loginName));
-            else if (result && *result == ChangeResult::NoAccount)
-                emit failed(qtTrId("ACCOUNT_GONE").arg(name.loginName));
-            m_enabled->setChecked(m_account->accountIsEnabled());
+        [this, name = change.name, takeBack = change.takeBack](const ChangeResult *result) {
+            m_changing.removeOne(name);
+            if (!result)
+                std::erase_if(m_waiting, [&](const Change &waiting) { return waiting.name == name; });
+            changeIsOver(name, result, takeBack);
+            startChanges();
         });
+}
+
+void AccountPage::changeIsOver(const AccountName &name, const ChangeResult *result,
+                               const std::function<void()> &takeBack)
+{
+    if (result && *result == ChangeResult::Saved)
+        return;  // the registry's notification shows it
+    if (result && *result == ChangeResult::NotSaved)
+        emit failed(qtTrId("NOT_SAVED").arg(name.loginName));
+    else if (result && *result == ChangeResult::NoAccount)
+        emit failed(qtTrId("ACCOUNT_GONE").arg(name.loginName));
+    if (isShown(name))
+        takeBack();
 }
 
 }  // namespace kavell::pane

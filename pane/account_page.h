@@ -9,6 +9,7 @@
 
 #include <functional>
 #include <memory>
+#include <vector>
 
 #include <QtWidgets/QCheckBox>
 #include <QtWidgets/QFormLayout>
@@ -43,7 +44,12 @@ public:
     /// The account that is shown; null before the first.
     [[nodiscard]] std::shared_ptr<KAAccount> account() const { return m_account; }
 
+    [[nodiscard]] bool isShown(const AccountName &name) const;
+
     [[nodiscard]] ApplicationSection &applications() { return *m_applications; }
+
+    /// Saves what has been typed as the account's description, if anything has.
+    void saveDescription();
 
 signals:
     /// Something went wrong: a sentence for the user.
@@ -54,10 +60,20 @@ signals:
 
 private:
     void makeHeader(QWidget *content);
+    void putApplicationsIntoFocusChain();
     void showHeader(KAAListPlugin *plugin);
     void showDetails(KAAListPlugin *plugin);
-    void saveDescription();
-    void change(const QString &sentence, std::function<void(KAAccount &)> change);
+
+    struct Change {
+        AccountName name;
+        QString sentence;
+        std::function<void(KAAccount &)> apply;  // in the background
+        std::function<void()> takeBack;          // on the page, when it came to nothing and the account is shown
+    };
+    void makeChange(Change change);
+    void startChanges();
+    void start(const Change &change);
+    void changeIsOver(const AccountName &name, const ChangeResult *result, const std::function<void()> &takeBack);
 
     struct Detail {
         QString label;
@@ -77,6 +93,9 @@ private:
     PasswordSection *m_password;
     QFormLayout *m_details;
     QList<Detail> m_shownDetails;
+    // Of one account, one change at a time: of two at once, the earlier could be the last to be written.
+    std::vector<Change> m_waiting;
+    QList<AccountName> m_changing;
 };
 
 }  // namespace kavell::pane

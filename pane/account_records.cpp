@@ -21,6 +21,8 @@ namespace kavell::pane {
 
 namespace {
 
+constexpr qsizetype kLongestName = 249;  // in bytes, which leaves room for ".plist" in a file's name
+
 QList<AccountSummary> summariesOf(const QString &providerType)
 {
     QList<AccountSummary> summaries;
@@ -49,6 +51,15 @@ QSet<QString> providerTypesOfApplications()
     return types;
 }
 
+bool canBeFileName(const QString &name)
+{
+    const auto isImpossible = [](QChar letter) {
+        return letter == u'/' || letter.category() == QChar::Other_Control;
+    };
+    return !name.isEmpty() && name != QLatin1String(".") && name != QLatin1String("..") && name.isValidUtf16() &&
+           std::none_of(name.begin(), name.end(), isImpossible) && name.toUtf8().size() <= kLongestName;
+}
+
 bool isSameText(const QString &first, const QString &second)
 {
     return !first.isEmpty() && first.compare(second, Qt::CaseInsensitive) == 0;
@@ -64,18 +75,25 @@ bool areLikelyTheSame(const AccountSummary &first, const AccountSummary &second)
 
 }  // namespace
 
+bool canBeStored(const AccountName &name)
+{
+    return canBeFileName(name.providerType) && canBeFileName(name.loginName);
+}
+
 QString accountsDirectory()
 {
     return QDir::homePath() + QStringLiteral("/Library/Kavell Accounts/V1");
 }
 
+AccountName nameOf(const KAAccount &account)
+{
+    return {account.provider(), account.loginName()};
+}
+
 AccountSummary summaryOf(const KAAccount &account)
 {
-    return {{account.provider(), account.loginName()},
-            account.uid(),
-            account.providerAttributeForKey(KAMailAccountDescriptionKey).toString(),
-            account.providerAttributeForKey(KAMailEmailAddressKey).toString(),
-            account.accountIsEnabled()};
+    return {nameOf(account), account.uid(), account.providerAttributeForKey(KAMailAccountDescriptionKey).toString(),
+            account.providerAttributeForKey(KAMailEmailAddressKey).toString(), account.accountIsEnabled()};
 }
 
 QList<KAAListPlugin *> accountListPlugins()

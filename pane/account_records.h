@@ -32,6 +32,9 @@ struct AccountName {
     bool operator==(const AccountName &other) const = default;
 };
 
+/// Whether an account can have such a name. It becomes the name of a file, in a directory named after the type.
+[[nodiscard]] bool canBeStored(const AccountName &name);
+
 /// What the list shows of an account.
 struct AccountSummary {
     AccountName name;
@@ -94,6 +97,9 @@ enum class ChangeResult {
 /// Existing accounts that are probably the same as this one, under another name: the same address in whatever case of
 /// letters, at whichever provider, or what the plug-in rules take for one identity.
 [[nodiscard]] QList<AccountSummary> likelyDuplicates(const AccountSummary &account, const QList<AccountGroup> &groups);
+
+/// The name of an open account. Does not block.
+[[nodiscard]] AccountName nameOf(const KAAccount &account);
 
 /// The summary of an open account. Does not block.
 [[nodiscard]] AccountSummary summaryOf(const KAAccount &account);

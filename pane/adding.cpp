@@ -6,6 +6,8 @@
 #include <algorithm>
 #include <exception>
 
+#include <QtCore/QCoreApplication>
+
 #include <kavellaccounts/KAAListPlugin.h>
 #include <kavellaccounts/KAAccount.h>
 #include <kavellaccounts/KAConstants.h>
@@ -17,14 +19,35 @@
 
 namespace kavell::pane {
 
+namespace {
+
+constexpr int kLongestShown = 60;  // characters of a name that cannot be an account's
+
+QString shortened(const QString &name)
+{
+    return name.size() > kLongestShown ? name.left(kLongestShown) + QChar(0x2026) : name;
+}
+
+}  // namespace
+
 Adding::Adding(AccountRegistry &registry, Undertakings &undertakings, QWidget *window)
     : QObject(window), m_registry(registry), m_undertakings(undertakings), m_window(window),
-      m_observation(KANotificationCenter::shared().addObserver(
-          KACreatedAccountsNotification, [this](const KANotification &notification) { receive(notification); }))
+      m_observation(KANotificationCenter::shared().addObserver(KACreatedAccountsNotification, forward()))
 {
 }
 
 Adding::~Adding() = default;
+
+KANotificationCenter::Observer Adding::forward()
+{
+    // A plug-in may post on a thread of its own, and while this object goes.
+    return [adding = QPointer<Adding>(this)](const KANotification &notification) {
+        QMetaObject::invokeMethod(QCoreApplication::instance(), [adding, notification] {
+            if (adding)
+                adding->receive(notification);
+        });
+    };
+}
 
 void Adding::begin()
 {
@@ -62,6 +85,10 @@ void Adding::receive(const KANotification &notification)
         if (!account)
             continue;
         const AccountSummary summary = summaryOf(*account);
+        if (!canBeStored(summary.name)) {
+            emit failed(qtTrId("NAME_NOT_POSSIBLE").arg(shortened(summary.name.loginName)));
+            continue;
+        }
         save(account, {summary.name, plugin, applications, m_registry.summaryOf(summary.name) != nullptr,
                        likelyDuplicates(summary, m_registry.groups())});
     }
@@ -71,14 +98,18 @@ void Adding::save(const std::shared_ptr<KAAccount> &account, AddedAccount added)
 {
     m_undertakings.start<ChangeResult>(
         qtTrId("SAVING_ACCOUNT").arg(added.name.loginName), this,
-        [account](const CancelFlag &) {
-            return account->hasPendingChanges() ? saveAccount(account) : ChangeResult::Saved;
+        [account](const CancelFlag &isCancelled) {
+            if (!account->hasPendingChanges())
+                return ChangeResult::Saved;
+            return *isCancelled ? ChangeResult::Cancelled : saveAccount(account);
         },
         [this, added = std::move(added)](const ChangeResult *result) {
             if (result && *result == ChangeResult::Saved)
                 emit this->added(added);
             else if (result)
                 emit failed(qtTrId("NOT_SAVED").arg(added.name.loginName));
+            else
+                emit failed(qtTrId("NOT_ADDED").arg(added.name.loginName));
         });
 }
 

@@ -54,6 +54,7 @@ signals:
 private:
     void chooseAmong(const QList<KAAListPlugin *> &plugins);
     void showSheet(KAAListPlugin *plugin);
+    [[nodiscard]] KANotificationCenter::Observer forward();
     void receive(const KANotification &notification);
     void save(const std::shared_ptr<KAAccount> &account, AddedAccount added);
 

@@ -13,6 +13,16 @@
 
 namespace kavell::pane {
 
+namespace {
+
+QStringList without(QStringList paths, const QStringList &others)
+{
+    paths.removeIf([&](const QString &path) { return others.contains(path); });
+    return paths;
+}
+
+}  // namespace
+
 ChangeWatch::ChangeWatch(QObject *parent) : QObject(parent)
 {
     observe(kCSKavellAccountNotificationSender);
@@ -41,9 +51,13 @@ void ChangeWatch::watchDirectories()
     for (const QString &type : types)
         wanted += top + u'/' + type;
     const QStringList watched = m_directories.directories();
-    wanted.removeIf([&](const QString &path) { return watched.contains(path); });
-    if (!wanted.isEmpty())
-        m_directories.addPaths(wanted);
+    const QStringList missing = without(wanted, watched);
+    if (!missing.isEmpty())
+        m_directories.addPaths(missing);
+    // A directory farther up has done its duty; in the home directory things change all the time.
+    const QStringList superfluous = without(watched, wanted);
+    if (!superfluous.isEmpty())
+        m_directories.removePaths(superfluous);
 }
 
 void ChangeWatch::observe(CSKavellStringRef name)

@@ -12,7 +12,6 @@
 
 #include <kavellaccounts/KAPluginManager.h>
 
-#include "pane/background.h"
 #include "pane/pane_window.h"
 #include "pane/texts.h"
 
@@ -62,18 +61,13 @@ int main(int argc, char *argv[])
     parser.process(application);
 
     (void)KAPluginManager::shared();  // before any other thread asks for it
-    int status = EXIT_SUCCESS;
-    {
-        kavell::pane::PaneWindow window;
-        if (parser.isSet(account))
-            window.selectWhenRead(parser.value(account));
-        if (parser.isSet(picture)) {
-            QObject::connect(&window, &kavell::pane::PaneWindow::settled, &application,
-                             [&] { savePicture(window, parser.value(picture)); });
-        }
-        window.show();
-        status = QApplication::exec();
+    kavell::pane::PaneWindow window;
+    if (parser.isSet(account))
+        window.selectWhenRead(parser.value(account));
+    if (parser.isSet(picture)) {
+        QObject::connect(&window, &kavell::pane::PaneWindow::settled, &application,
+                         [&] { savePicture(window, parser.value(picture)); });
     }
-    kavell::pane::letBackgroundWorkFinish();
-    return status;
+    window.show();
+    return QApplication::exec();
 }

@@ -3,6 +3,7 @@
 
 #include "pane/pane_window.h"
 
+#include <algorithm>
 #include <chrono>
 
 #include <QtGui/QShortcut>
@@ -17,8 +18,8 @@
 
 #include "pane/account_list.h"
 #include "pane/account_page.h"
-#include "pane/adding.h"
 #include "pane/application_section.h"
+#include "pane/background.h"
 #include "pane/notice_bar.h"
 #include "pane/progress_strip.h"
 #include "pane/provider_looks.h"
@@ -33,6 +34,8 @@ constexpr int kListWidth = 280;
 constexpr qreal kTitleScale = 1.4;  // of the text around it
 // Longer than anything that the event loop does for layout.
 constexpr std::chrono::milliseconds kSettling{100};
+// How long a page stays while another account is being opened. Opening seldom takes that long.
+constexpr std::chrono::milliseconds kPageStays{300};
 constexpr int kEmptyPageWidth = 420;
 
 }  // namespace
@@ -82,6 +85,8 @@ PaneWindow::PaneWindow(QWidget *parent)
 
 PaneWindow::~PaneWindow()
 {
+    // Before this object's undertakings go, which cancels what has not been done by then.
+    letBackgroundWorkFinish();
     // Children tell this window and its members on their way out.
     delete m_adding;
     delete takeCentralWidget();
@@ -100,7 +105,8 @@ QWidget *PaneWindow::makeLeftSide()
     buttons->addWidget(m_remove);
     auto *const side = new QWidget;
     auto *const layout = new QVBoxLayout(side);
-    layout->setContentsMargins({});
+    // From right to left, a splitter lays its first side out one pixel too far to the right, and cuts that off.
+    layout->setContentsMargins(1, 0, 1, 0);
     layout->addWidget(m_list, 1);
     layout->addLayout(buttons);
     return side;
@@ -129,17 +135,22 @@ QWidget *PaneWindow::makeEmptyPage()
     auto *const explanation = new QLabel(qtTrId("EMPTY_EXPLANATION"));
     explanation->setWordWrap(true);
     explanation->setAlignment(Qt::AlignCenter);
-    explanation->setMaximumWidth(kEmptyPageWidth);
     auto *const add = new QPushButton(qtTrId("ADD_FIRST_ACCOUNT"));
     add->setObjectName(QStringLiteral("addFirstAccount"));
     connect(add, &QPushButton::clicked, this, [this] { m_adding->begin(); });
+    // A label that wraps has its height by its width only where the layout does not shrink it.
+    auto *const column = new QWidget;
+    column->setMaximumWidth(kEmptyPageWidth);
+    auto *const texts = new QVBoxLayout(column);
+    texts->addStretch();
+    texts->addWidget(title);
+    texts->addWidget(explanation);
+    texts->addWidget(add, 0, Qt::AlignHCenter);
+    texts->addStretch();
     auto *const page = new QWidget;
-    auto *const layout = new QVBoxLayout(page);
-    layout->addStretch();
-    for (QWidget *widget :
-         {static_cast<QWidget *>(title), static_cast<QWidget *>(explanation), static_cast<QWidget *>(add)})
-        layout->addWidget(widget, 0, Qt::AlignHCenter);
-    layout->addStretch();
+    auto *const layout = new QHBoxLayout(page);
+    layout->addWidget(column);
+    page->setFocusProxy(add);
     return page;
 }
 
@@ -153,6 +164,12 @@ void PaneWindow::makeShortcuts()
     connect(remove, &QShortcut::activated, this, &PaneWindow::removeSelected);
 }
 
+void PaneWindow::closeEvent(QCloseEvent *event)
+{
+    m_accountPage->saveDescription();
+    QMainWindow::closeEvent(event);
+}
+
 void PaneWindow::selectWhenRead(const QString &loginName)
 {
     m_wanted = loginName;
@@ -160,14 +177,14 @@ void PaneWindow::selectWhenRead(const QString &loginName)
 
 void PaneWindow::accountsWereRead()
 {
+    const bool removeHadFocus = focusWidget() == m_remove;
     m_list->showAccounts(m_registry.groups());
     if (m_registry.groups().isEmpty()) {
-        m_pages->setCurrentWidget(m_emptyPage);
-        emit shown();
+        showEmptyPage();
         return;
     }
-    if (!m_selectAfterAdding.isNull() && m_list->selectAccount(m_selectAfterAdding))
-        m_selectAfterAdding = {};
+    if (!m_selectAfterAdding.isNull())
+        selectAdded(m_selectAfterAdding);
     for (const AccountGroup &group : m_registry.groups()) {
         if (!m_wanted.isNull() && m_list->selectAccount({group.providerType, m_wanted}))
             m_wanted = QString();
@@ -176,6 +193,17 @@ void PaneWindow::accountsWereRead()
         m_list->selectFirst();
     else
         open(m_list->selectedAccount());  // again, since it may have changed
+    if (removeHadFocus)
+        m_remove->setFocus();  // lost while no account was selected
+}
+
+void PaneWindow::showEmptyPage()
+{
+    if (m_pages->currentWidget() != m_emptyPage) {
+        m_pages->setCurrentWidget(m_emptyPage);
+        m_emptyPage->setFocus();
+    }
+    emit shown();
 }
 
 void PaneWindow::accountsWereNotRead()
@@ -188,29 +216,43 @@ void PaneWindow::open(const AccountName &name)
     m_remove->setEnabled(!name.isNull());
     if (name.isNull())
         return;
+    // Not for long under another account's name in the list.
+    QTimer::singleShot(kPageStays, this, [this, name] {
+        if (m_list->selectedAccount() == name && !m_accountPage->isShown(name))
+            m_pages->setCurrentWidget(m_blankPage);
+    });
     m_undertakings.start<OpenAccount>(
         qtTrId("OPENING_ACCOUNT").arg(name.loginName), this,
         [name](const CancelFlag &) {
             return OpenAccount{openAccount(name), openAccount(name)};
         },
         [this, name](const OpenAccount *account) {
-            // Another one may have been selected meanwhile, or this one removed.
-            if (account && account->shown && account->forPlugin && m_list->selectedAccount() == name)
+            if (!(m_list->selectedAccount() == name))
+                return;  // another one has been selected meanwhile
+            if (!account)
+                wasNotOpened(name);
+            else if (account->shown && account->forPlugin)  // and not removed meanwhile
                 showOpened(name, *account);
         });
+}
+
+void PaneWindow::wasNotOpened(const AccountName &name)
+{
+    if (!m_accountPage->isShown(name))
+        m_pages->setCurrentWidget(m_blankPage);
+    m_notice->showNotice(qtTrId("ACCOUNT_NOT_OPENED").arg(name.loginName), qtTrId("TRY_AGAIN"),
+                         [this] { open(m_list->selectedAccount()); });
 }
 
 void PaneWindow::showOpened(const AccountName &name, const OpenAccount &account)
 {
     const AccountGroup *const group = m_registry.groupOf(name);
     KAAListPlugin *const plugin = group ? group->plugin : nullptr;
-    const bool isAnother = !m_accountPage->account() || !account.shown->isEqual(*m_accountPage->account());
-    if (plugin && isAnother)
+    if (plugin && !m_accountPage->isShown(name))
         plugin->willSelectAccount(account.shown);
     m_accountPage->showAccount(account, plugin);
     m_pages->setCurrentWidget(m_accountPage);
-    if (m_added && m_added->name == name)
-        switchPickedApplicationsOn();
+    switchPickedApplicationsOn(name);
     emit shown();
 }
 
@@ -218,7 +260,7 @@ void PaneWindow::removeSelected()
 {
     const std::shared_ptr<KAAccount> account = m_accountPage->account();
     const AccountName name = m_list->selectedAccount();
-    if (!account || name.isNull() || account->loginName() != name.loginName || account->provider() != name.providerType)
+    if (name.isNull() || !m_accountPage->isShown(name))
         return;
     const AccountGroup *const group = m_registry.groupOf(name);
     auto *const removal = new Removal(account, group ? group->plugin : nullptr, m_undertakings, this);
@@ -228,8 +270,9 @@ void PaneWindow::removeSelected()
 
 void PaneWindow::accountWasAdded(const AddedAccount &account)
 {
-    m_added = std::make_unique<AddedAccount>(account);
-    m_selectAfterAdding = account.name;
+    m_added += account;
+    if (m_selectAfterAdding.isNull())
+        m_selectAfterAdding = account.name;
     if (account.wasThere) {
         m_notice->showNotice(qtTrId("ACCOUNT_WAS_THERE").arg(account.name.loginName));
     } else if (!account.duplicates.isEmpty()) {
@@ -243,11 +286,28 @@ void PaneWindow::accountWasAdded(const AddedAccount &account)
     m_registry.reload();
 }
 
-void PaneWindow::switchPickedApplicationsOn()
+void PaneWindow::selectAdded(const AccountName &name)
 {
-    const std::unique_ptr<AddedAccount> added = std::move(m_added);
-    for (const std::shared_ptr<KAApplication> &application : added->applications)
+    m_selectAfterAdding = name;
+    if (!m_list->selectAccount(name))
+        return;
+    m_selectAfterAdding = {};
+    m_list->setFocus();
+}
+
+void PaneWindow::switchPickedApplicationsOn(const AccountName &name)
+{
+    const auto found = std::find_if(m_added.cbegin(), m_added.cend(),
+                                    [&](const AddedAccount &account) { return account.name == name; });
+    if (found == m_added.cend())
+        return;
+    const AddedAccount added = *found;
+    m_added.erase(found);
+    for (const std::shared_ptr<KAApplication> &application : added.applications)
         m_accountPage->applications().setEnabled(true, application);
+    // A plug-in can make several accounts at once.
+    if (!m_added.isEmpty())
+        selectAdded(m_added.constFirst().name);
 }
 
 }  // namespace kavell::pane

@@ -12,15 +12,14 @@
 #include <QtWidgets/QStackedWidget>
 
 #include "pane/account_registry.h"
+#include "pane/adding.h"
 #include "pane/undertakings.h"
 
 namespace kavell::pane {
 
 class AccountList;
 class AccountPage;
-class Adding;
 class NoticeBar;
-struct AddedAccount;
 struct OpenAccount;
 
 class PaneWindow : public QMainWindow {
@@ -37,6 +36,10 @@ public:
     /// The registry that is shown.
     [[nodiscard]] AccountRegistry &registry() { return m_registry; }
 
+protected:
+    /// Saves what is being typed.
+    void closeEvent(QCloseEvent *event) override;
+
 signals:
     /// What the window shows is complete for now: an account, or that there is none.
     void shown();
@@ -51,11 +54,14 @@ private:
     void makeShortcuts();
     void accountsWereRead();
     void accountsWereNotRead();
+    void showEmptyPage();
     void open(const AccountName &name);
+    void wasNotOpened(const AccountName &name);
     void showOpened(const AccountName &name, const OpenAccount &account);
     void removeSelected();
     void accountWasAdded(const AddedAccount &account);
-    void switchPickedApplicationsOn();
+    void switchPickedApplicationsOn(const AccountName &name);
+    void selectAdded(const AccountName &name);
 
     Undertakings m_undertakings;
     AccountRegistry m_registry;
@@ -71,7 +77,7 @@ private:
     QTimer m_settling;                // runs while the window comes to rest
     QString m_wanted;                 // a login name to select
     AccountName m_selectAfterAdding;  // once the registry knows it
-    std::unique_ptr<AddedAccount> m_added;
+    QList<AddedAccount> m_added;      // whose applications are still to be switched on
 };
 
 }  // namespace kavell::pane

@@ -83,8 +83,9 @@ void PasswordSection::askForStatus()
 {
     m_undertakings.start<CSKavellCofferelStatus>(
         qtTrId("ASKING_FOR_PASSWORD_STATE"), this, [name = m_name](const CancelFlag &) { return passwordStatus(name); },
-        [this, name = m_name](const CSKavellCofferelStatus *status) {
-            if (name == m_name)
+        [this, question = ++m_lastQuestion](const CSKavellCofferelStatus *status) {
+            // The store may answer a later question first.
+            if (question == m_lastQuestion)
                 showStatus(status ? *status : kCSKavellCofferelStatusUnreachable);
         });
 }
@@ -106,18 +107,21 @@ void PasswordSection::askForNewPassword()
 {
     conceal();
     auto *const dialog = new PasswordDialog(m_name.loginName, window());
-    connect(dialog, &QDialog::accepted, this, [this, dialog] { store(dialog->password()); });
+    // Another account may be shown by the time of the answer, when this one is removed meanwhile.
+    connect(dialog, &QDialog::accepted, this, [this, dialog, name = m_name] { store(name, dialog->password()); });
     dialog->open();
 }
 
-void PasswordSection::store(const QString &password)
+void PasswordSection::store(const AccountName &name, const QString &password)
 {
     m_undertakings.start<ChangeResult>(
         qtTrId("STORING_PASSWORD"), this,
-        [name = m_name, password](const CancelFlag &isCancelled) { return storePassword(name, password, isCancelled); },
-        [this](const ChangeResult *result) {
+        [name, password](const CancelFlag &isCancelled) { return storePassword(name, password, isCancelled); },
+        [this, name](const ChangeResult *result) {
             if (result && *result == ChangeResult::NotSaved)
                 emit failed(qtTrId("PASSWORD_NOT_STORED"));
+            else if (result && *result == ChangeResult::NoAccount)
+                emit failed(qtTrId("ACCOUNT_GONE").arg(name.loginName));
             askForStatus();
         });
 }
@@ -150,7 +154,7 @@ void PasswordSection::conceal()
 void PasswordSection::askToRemove()
 {
     ask(window(), qtTrId("REMOVE_PASSWORD_QUESTION").arg(m_name.loginName), qtTrId("REMOVE_PASSWORD_DETAILS"),
-        qtTrId("REMOVE_PASSWORD_NOW"), this, [this] { store(QString()); });
+        qtTrId("REMOVE_PASSWORD_NOW"), this, [this, name = m_name] { store(name, QString()); });
 }
 
 }  // namespace kavell::pane

@@ -38,7 +38,7 @@ private:
     void askForStatus();
     void showStatus(CSKavellCofferelStatus status);
     void askForNewPassword();
-    void store(const QString &password);
+    void store(const AccountName &name, const QString &password);
     void reveal();
     void conceal();
     void askToRemove();
@@ -46,6 +46,7 @@ private:
     Undertakings &m_undertakings;
     AccountName m_name;
     QVariant m_reference;
+    int m_lastQuestion = 0;  // that was put to the store for the state
     QLabel *m_state;
     QLineEdit *m_revealed;
     QPushButton *m_set;

@@ -34,7 +34,9 @@ ProgressStrip::ProgressStrip(Undertakings &undertakings, QWidget *parent)
     auto *const cancel = new QPushButton(qtTrId("STOP_WAITING"));
     cancel->setObjectName(QStringLiteral("stopWaiting"));
     connect(cancel, &QPushButton::clicked, &m_undertakings, &Undertakings::cancelAll);
+    m_sentence->setObjectName(QStringLiteral("progressSentence"));
     m_sentence->setWordWrap(true);
+    m_sentence->setTextFormat(Qt::PlainText);  // it can hold a login name
     auto *const layout = new QHBoxLayout(this);
     layout->addWidget(bar);
     layout->addWidget(m_sentence, 1);

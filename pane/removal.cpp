@@ -42,7 +42,7 @@ QString namesOf(const QStringList &bundleIDs)
 Removal::Removal(const std::shared_ptr<KAAccount> &account, KAAListPlugin *plugin, Undertakings &undertakings,
                  QWidget *window)
     : QObject(window), m_account(account), m_plugin(plugin), m_undertakings(undertakings), m_window(window),
-      m_name{account->provider(), account->loginName()}
+      m_name(nameOf(*account))
 {
     m_again.setInterval(kBetweenLooks);
     connect(&m_again, &QTimer::timeout, this, &Removal::look);
@@ -57,12 +57,26 @@ void Removal::begin()
                                                    : qtTrId("REMOVE_DETAILS_APPLICATIONS").arg(namesOf(applications));
     ask(
         m_window, qtTrId("REMOVE_QUESTION").arg(m_name.loginName), details, qtTrId("REMOVE_NOW"), this,
-        [this] { switchApplicationsOff(); }, [this] { deleteLater(); });
+        [this] { openForPlugin(); }, [this] { deleteLater(); });
 }
 
-void Removal::switchApplicationsOff()
+void Removal::openForPlugin()
 {
-    const QStringList applications = applicationsOf(*m_account);
+    // Opened anew: the answer may have taken long, and the plug-in works on a record that nobody reads meanwhile.
+    m_undertakings.start<std::shared_ptr<KAAccount>>(
+        qtTrId("REMOVING_ACCOUNT").arg(m_name.loginName), this,
+        [name = m_name](const CancelFlag &) { return openAccount(name); },
+        [this](const std::shared_ptr<KAAccount> *account) {
+            if (account && *account)
+                switchApplicationsOff(*account);
+            else
+                deleteLater();  // the user stopped, or another program was faster
+        });
+}
+
+void Removal::switchApplicationsOff(const std::shared_ptr<KAAccount> &account)
+{
+    const QStringList applications = applicationsOf(*account);
     if (!m_plugin || applications.isEmpty()) {
         remove();
         return;
@@ -72,8 +86,8 @@ void Removal::switchApplicationsOff()
         if (!application)
             continue;
         try {
-            m_plugin->setAccount(m_account);
-            m_plugin->setEnabled(false, application, m_account, m_window);
+            m_plugin->setAccount(account);
+            m_plugin->setEnabled(false, application, account, m_window);
         } catch (const std::exception &) {
             // The application keeps the account; the question below says so.
         }

@@ -39,7 +39,8 @@ signals:
     void failed(const QString &sentence);
 
 private:
-    void switchApplicationsOff();
+    void openForPlugin();
+    void switchApplicationsOff(const std::shared_ptr<KAAccount> &account);
     void look();
     void askWhetherToGoOn(const QStringList &left);
     void remove();

@@ -22,6 +22,7 @@
     <message id="ADD_FIRST_ACCOUNT"><source></source><translation>‏‮Add‬‏ ‏‮an‬‏ ‏‮Account…‬‏</translation></message>
     <message id="READING_ACCOUNTS"><source></source><translation>‏‮Reading‬‏ ‏‮the‬‏ ‏‮accounts…‬‏</translation></message>
     <message id="OPENING_ACCOUNT"><source></source><translation>‏‮Opening‬‏ ‏‮the‬‏ ‏‮account‬‏ %1…</translation></message>
+    <message id="ACCOUNT_NOT_OPENED"><source></source><translation>‏‮The‬‏ ‏‮account‬‏ %1 ‏‮was‬‏ ‏‮not‬‏ ‏‮opened,‬‏ ‏‮because‬‏ ‏‮you‬‏ ‏‮stopped‬‏ ‏‮waiting‬‏ ‏‮for‬‏ ‏‮it.‬‏</translation></message>
     <message id="LOOKING_FOR_PLUGINS"><source></source><translation>‏‮Looking‬‏ ‏‮for‬‏ ‏‮the‬‏ ‏‮kinds‬‏ ‏‮of‬‏ ‏‮account‬‏ ‏‮that‬‏ ‏‮are‬‏ ‏‮installed…‬‏</translation></message>
     <message id="PROGRESS"><source></source><translation>‏‮Progress‬‏</translation></message>
     <message id="STOP_WAITING"><source></source><translation>‏‮Stop‬‏ ‏‮Waiting‬‏</translation></message>
@@ -87,6 +88,8 @@
     <message id="KINDS_OF_ACCOUNT"><source></source><translation>‏‮Kinds‬‏ ‏‮of‬‏ ‏‮account‬‏</translation></message>
     <message id="NO_KINDS_OF_ACCOUNT"><source></source><translation>‏‮No‬‏ ‏‮kind‬‏ ‏‮of‬‏ ‏‮account‬‏ ‏‮is‬‏ ‏‮installed.‬‏ ‏‮Each‬‏ ‏‮provider‬‏ ‏‮comes‬‏ ‏‮as‬‏ ‏‮a‬‏ ‏‮plug-in:‬‏ ‏‮install‬‏ ‏‮the‬‏ ‏‮plug-in‬‏ ‏‮of‬‏ ‏‮your‬‏ ‏‮provider,‬‏ ‏‮then‬‏ ‏‮add‬‏ ‏‮your‬‏ ‏‮account‬‏ ‏‮here.‬‏ ‏‮“kavell-accounts‬‏ ‏‮plugins”‬‏ ‏‮says‬‏ ‏‮where‬‏ ‏‮plug-ins‬‏ ‏‮are‬‏ ‏‮looked‬‏ ‏‮for.‬‏</translation></message>
     <message id="SAVING_ACCOUNT"><source></source><translation>‏‮Saving‬‏ ‏‮the‬‏ ‏‮account‬‏ %1…</translation></message>
+    <message id="NOT_ADDED"><source></source><translation>‏‮The‬‏ ‏‮account‬‏ %1 ‏‮was‬‏ ‏‮not‬‏ ‏‮saved,‬‏ ‏‮because‬‏ ‏‮you‬‏ ‏‮stopped‬‏ ‏‮waiting‬‏ ‏‮for‬‏ ‏‮it.‬‏ ‏‮You‬‏ ‏‮can‬‏ ‏‮add‬‏ ‏‮it‬‏ ‏‮again.‬‏</translation></message>
+    <message id="NAME_NOT_POSSIBLE"><source></source><translation>‏‮The‬‏ ‏‮account‬‏ ‏‮was‬‏ ‏‮not‬‏ ‏‮saved,‬‏ ‏‮because‬‏ ‏‮no‬‏ ‏‮account‬‏ ‏‮can‬‏ ‏‮have‬‏ ‏‮the‬‏ ‏‮login‬‏ ‏‮name‬‏ %1 ‏‮on‬‏ ‏‮this‬‏ ‏‮computer.‬‏ ‏‮A‬‏ ‏‮name‬‏ ‏‮is‬‏ ‏‮not‬‏ ‏‮empty,‬‏ ‏‮“.”‬‏ ‏‮or‬‏ ‏‮“..”,‬‏ ‏‮has‬‏ ‏‮no‬‏ ‏‮“/”‬‏ ‏‮and‬‏ ‏‮no‬‏ ‏‮control‬‏ ‏‮character,‬‏ ‏‮and‬‏ ‏‮at‬‏ ‏‮most‬‏ ‏‮249‬‏ ‏‮bytes.‬‏ ‏‮Add‬‏ ‏‮the‬‏ ‏‮account‬‏ ‏‮under‬‏ ‏‮another‬‏ ‏‮name.‬‏</translation></message>
     <message id="ACCOUNT_WAS_THERE"><source></source><translation>‏‮You‬‏ ‏‮already‬‏ ‏‮had‬‏ ‏‮the‬‏ ‏‮account‬‏ %1. ‏‮It‬‏ ‏‮has‬‏ ‏‮been‬‏ ‏‮brought‬‏ ‏‮up‬‏ ‏‮to‬‏ ‏‮date.‬‏</translation></message>
     <message id="LIKELY_DUPLICATE"><source></source><translation>%1 ‏‮looks‬‏ ‏‮like‬‏ ‏‮the‬‏ ‏‮account‬‏ %2 ‏‮at‬‏ %3, ‏‮which‬‏ ‏‮you‬‏ ‏‮already‬‏ ‏‮have.‬‏ ‏‮Keep‬‏ ‏‮both,‬‏ ‏‮or‬‏ ‏‮remove‬‏ ‏‮the‬‏ ‏‮one‬‏ ‏‮that‬‏ ‏‮you‬‏ ‏‮do‬‏ ‏‮not‬‏ ‏‮need.‬‏</translation></message>
     <message id="SHOW_OTHER_ACCOUNT"><source></source><translation>‏‮Show‬‏ ‏‮the‬‏ ‏‮Other‬‏ ‏‮Account‬‏</translation></message>

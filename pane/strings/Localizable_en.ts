@@ -85,6 +85,11 @@
         <extracomment>Progress; %1 is the login name</extracomment>
         <translation>Opening the account %1…</translation>
     </message>
+    <message id="ACCOUNT_NOT_OPENED">
+        <source></source>
+        <extracomment>Notice; %1 is the login name</extracomment>
+        <translation>The account %1 was not opened, because you stopped waiting for it.</translation>
+    </message>
     <message id="LOOKING_FOR_PLUGINS">
         <source></source>
         <extracomment>Progress</extracomment>
@@ -409,6 +414,16 @@
         <source></source>
         <extracomment>Progress</extracomment>
         <translation>Saving the account %1…</translation>
+    </message>
+    <message id="NOT_ADDED">
+        <source></source>
+        <extracomment>Notice</extracomment>
+        <translation>The account %1 was not saved, because you stopped waiting for it. You can add it again.</translation>
+    </message>
+    <message id="NAME_NOT_POSSIBLE">
+        <source></source>
+        <extracomment>Notice; %1 is the login name</extracomment>
+        <translation>The account was not saved, because no account can have the login name %1 on this computer. A name is not empty, “.” or “..”, has no “/” and no control character, and at most 249 bytes. Add the account under another name.</translation>
     </message>
     <message id="ACCOUNT_WAS_THERE">
         <source></source>

@@ -17,6 +17,7 @@
 #include <QtWidgets/QLabel>
 #include <QtWidgets/QLineEdit>
 #include <QtWidgets/QPushButton>
+#include <QtWidgets/QToolButton>
 
 #include <gmock/gmock.h>
 #include <kavellaccounts/KAAListPlugin.h>
@@ -55,15 +56,27 @@ protected:
         ASSERT_TRUE(QTest::qWaitFor(condition, static_cast<int>(kBound.count()))) << "waited in vain: " << what;
     }
 
+    void openPaneWithoutWaiting()
+    {
+        m_window = std::make_unique<pane::PaneWindow>();
+        m_window->show();
+    }
+
     /// Shows the pane and waits until it shows what there is.
     void openPane()
     {
         bool isShown = false;
-        m_window = std::make_unique<pane::PaneWindow>();
+        openPaneWithoutWaiting();
         const auto connection = QObject::connect(m_window.get(), &pane::PaneWindow::shown, [&] { isShown = true; });
-        m_window->show();
         waitFor([&] { return isShown; }, "the pane's contents");
         QObject::disconnect(connection);
+    }
+
+    /// Closes the pane as its user does, and lets the program have no window any more.
+    void closePane()
+    {
+        m_window->close();
+        m_window.reset();
     }
 
     [[nodiscard]] pane::PaneWindow &window() { return *m_window; }
@@ -75,6 +88,12 @@ protected:
         account->setProviderAttribute(loginName, KAMailEmailAddressKey);
         commit(account);
         return account;
+    }
+
+    /// Another process removes an account of the tests' kind.
+    static void removeElsewhere(const std::string &loginName)
+    {
+        runClient({"remove", kKindType.toStdString(), loginName, "--yes"});
     }
 
     /// Runs the command-line client, which is another process.
