@@ -207,7 +207,7 @@ void KAAppTableRow::startSpinner()
 {
     _spinner->show();
     _spinner->startAnimation();
-    // The focus stays in the row; a hidden control would hand it to the next row's.
+    // The focus stays in the row; a hidden control hands it to whatever the Tab key finds next.
     if (_checkbox->hasFocus())
         _spinner->setFocus();
     _checkbox->hide();

@@ -315,6 +315,16 @@ TEST_F(KAAppTableViewTest, OtherApplicationsTakeTheRowsPlaces)
     EXPECT_FALSE(keptRow(former.at(2))->isVisible());
 }
 
+TEST_F(KAAppTableViewTest, PickingAllShowsTheApplicationsThatStandInTheTableNow)
+{
+    show();
+    table->setApps(manyApplications(3));
+    table->selectAllApps();
+    ASSERT_TRUE(showsAllRows());
+    for (int index = 0; index < 3; ++index)
+        EXPECT_TRUE(checkboxOf(row(index))->isChecked());
+}
+
 TEST_F(KAAppTableViewTest, ARowDiesWithItsApplication)
 {
     show();
