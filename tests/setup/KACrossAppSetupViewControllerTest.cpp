@@ -227,6 +227,18 @@ TEST_F(KACrossAppSetupViewControllerTest, EmptySettingsOfAnAccountAreLoggedAndPa
     EXPECT_EQ(log.messages(), QStringList{"*** Settings for uid-1 were empty"});
 }
 
+TEST_F(KACrossAppSetupViewControllerTest, AMatchOfAPluginWithoutAnApplicationIsNobodys)
+{
+    addProvider();
+    m_plugins.setSettings(&addDataPlugin("org.zorbo.notes.kaplugin"), "uid-1", kAda);
+    const auto controller = fromMail();
+    EXPECT_EQ(controller->numberOfAppsNeedingSetup(), 3);
+    KAFieldList list;
+    controller->describeFields(list);
+    EXPECT_EQ(list.fields()[6].name, "_existingAccounts");
+    EXPECT_EQ(list.fields()[6].value, "{}");
+}
+
 TEST_F(KACrossAppSetupViewControllerTest, TheSourcesOwnPluginIsNotSearched)
 {
     addProvider();

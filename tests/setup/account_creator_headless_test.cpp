@@ -8,6 +8,7 @@
 
 #include <atomic>
 #include <cstdlib>
+#include <future>
 #include <thread>
 
 #include <QtCore/QCoreApplication>
@@ -85,6 +86,35 @@ bool createInConsoleProgram()
     std::_Exit(!created && ended ? 0 : 1);
 }
 
+/// The plug-in is kept busy on behalf of another creator until the application object is gone.
+[[noreturn]] void endWhileACreatorWaitsForItsTurn()
+{
+    ScriptedDataPlugin plugin(nullptr);
+    std::promise<void> busy;
+    std::promise<void> ended;
+    plugin.onStart = [&](const ScriptedDataPlugin::Input &) {
+        busy.set_value();
+        ended.get_future().wait();
+    };
+    const auto first = KAMailAccountCreator::initWithSettings(kSettings, &plugin);
+    const auto second = KAMailAccountCreator::initWithSettings(kSettings, &plugin);
+    bool created = true;
+    std::thread worker;
+    {
+        int count = 1;
+        char name[] = "console";
+        char *arguments[] = {name, nullptr};
+        const QCoreApplication application(count, arguments);
+        worker = std::thread([&] { static_cast<void>(first->create()); });
+        busy.get_future().wait();
+        QThreadPool::globalInstance()->start([&] { created = second->create(); });
+    }
+    ended.set_value();
+    worker.join();
+    const QString reason = "The plug-in or the program ended while it was at work on another account.";
+    std::_Exit(!created && second->failureReason() == reason ? 0 : 1);
+}
+
 TEST(AccountCreatorDeathTest, WithoutAnApplicationObjectTheReportIsWaitedForWithoutAnyWarning)
 {
     EXPECT_EXIT(createAndExit(), testing::ExitedWithCode(0), "");
@@ -93,6 +123,11 @@ TEST(AccountCreatorDeathTest, WithoutAnApplicationObjectTheReportIsWaitedForWith
 TEST(AccountCreatorDeathTest, AnEndingProgramDoesNotWaitForAPluginThatNeverReports)
 {
     EXPECT_EXIT(endWhileACreatorWaits(), testing::ExitedWithCode(0), "");
+}
+
+TEST(AccountCreatorDeathTest, AnEndingProgramDoesNotWaitForACreatorsTurn)
+{
+    EXPECT_EXIT(endWhileACreatorWaitsForItsTurn(), testing::ExitedWithCode(0), "");
 }
 
 }  // namespace

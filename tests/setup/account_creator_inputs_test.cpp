@@ -120,6 +120,16 @@ TEST_F(CreatorInputs, AMailAddressIsMadeOfTheUserNameAndTheProvidersDomain)
     EXPECT_EQ(log.messages(), QStringList{});
 }
 
+TEST_F(CreatorInputs, AMailAddressIsMadeOfWhatIsThereEvenIfItIsEmpty)
+{
+    KAPlugin *const listPlugin = addListPluginWithDomain("corp.example");
+    const LogCapture log;
+    EXPECT_EQ(mailInput({{"userName", ""}}, kKAProviderExchange)->emailAddress(), "@corp.example");
+    listPlugin->setProperty("autodiscoverDomain", "");
+    EXPECT_EQ(mailInput({{"userName", "ada"}}, kKAProviderExchange)->emailAddress(), "ada@");
+    EXPECT_EQ(log.messages(), QStringList{});
+}
+
 TEST_F(CreatorInputs, AnAddressInTheSettingsIsNotReplaced)
 {
     addListPluginWithDomain("corp.example");
