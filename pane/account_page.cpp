@@ -25,6 +25,7 @@ namespace kavell::pane {
 namespace {
 
 constexpr int kIconSide = 48;
+constexpr int kSmallestHeight = 240;
 constexpr qreal kTitleScale = 1.4;  // of the text around it
 
 // The attribute that refers to the password's item in the credential store.
@@ -115,6 +116,18 @@ void AccountPage::makeHeader(QWidget *content)
     layout->addStretch();
 }
 
+QSize AccountPage::minimumSizeHint() const
+{
+    // So narrow that nothing would have to be scrolled sideways.
+    return {widget()->minimumSizeHint().width() + verticalScrollBar()->sizeHint().width(), kSmallestHeight};
+}
+
+void AccountPage::askAgain()
+{
+    if (m_account)
+        m_password->askForStatus();
+}
+
 void AccountPage::showAccount(const OpenAccount &account, KAAListPlugin *plugin)
 {
     const bool isAnother = !isShown(nameOf(*account.shown));
@@ -190,9 +203,13 @@ void AccountPage::saveDescription()
         account.setProviderAttribute(description.isEmpty() ? QVariant() : description, KAMailAccountDescriptionKey);
     };
     // What was not saved stays in the field, and is tried again when the user leaves it the next time.
-    makeChange({nameOf(*m_account), qtTrId("SAVING_DESCRIPTION"), change, [this] {
-                    m_description->setModified(true);
-                }});
+    const auto takeBack = [this, typed = m_description->text()] {
+        if (m_description->isModified())
+            return;
+        m_description->setText(typed);
+        m_description->setModified(true);
+    };
+    makeChange({nameOf(*m_account), qtTrId("SAVING_DESCRIPTION"), change, takeBack});
 }
 
 bool AccountPage::isShown(const AccountName &name) const

@@ -41,6 +41,11 @@ public:
     /// Shows an account, or the one that is shown as it is now. What the user is typing stays.
     void showAccount(const OpenAccount &account, KAAListPlugin *plugin);
 
+    [[nodiscard]] QSize minimumSizeHint() const override;
+
+    /// Asks what can change without anybody telling: the credential store's state.
+    void askAgain();
+
     /// The account that is shown; null before the first.
     [[nodiscard]] std::shared_ptr<KAAccount> account() const { return m_account; }
 

@@ -157,7 +157,9 @@ QWidget *PaneWindow::makeEmptyPage()
 void PaneWindow::makeShortcuts()
 {
     connect(new QShortcut(QKeySequence::New, this), &QShortcut::activated, m_adding, &Adding::begin);
-    connect(new QShortcut(QKeySequence::Refresh, this), &QShortcut::activated, &m_registry, &AccountRegistry::reload);
+    auto *const refresh = new QShortcut(QKeySequence::Refresh, this);
+    connect(refresh, &QShortcut::activated, &m_registry, &AccountRegistry::reload);
+    connect(refresh, &QShortcut::activated, m_accountPage, &AccountPage::askAgain);
     connect(new QShortcut(QKeySequence::Quit, this), &QShortcut::activated, this, &QWidget::close);
     auto *const remove = new QShortcut(QKeySequence::Delete, m_list);
     remove->setContext(Qt::WidgetShortcut);

@@ -30,12 +30,14 @@ public:
     /// another than before.
     void showAccount(const AccountName &name, const QVariant &reference);
 
+    /// Asks the store for the state again, which may have been unlocked since.
+    void askForStatus();
+
 signals:
     /// Something went wrong: a sentence for the user.
     void failed(const QString &sentence);
 
 private:
-    void askForStatus();
     void showStatus(CSKavellCofferelStatus status);
     void askForNewPassword();
     void store(const AccountName &name, const QString &password);

@@ -265,6 +265,25 @@ TEST_F(Pane, PasswordIsSetShownAndRemoved)
     EXPECT_EQ(newAccount("ada", kKindType)->password(), QString());
 }
 
+TEST_F(Pane, RefreshAsksTheCredentialStoreAgain)
+{
+    const auto account = storedAccount("ada");
+    ASSERT_TRUE(account->setPassword("secret"));
+    commit(account);
+    openPane();
+    waitForPage("ada");
+    const auto state = [] {
+        return visible<QLabel>("passwordState")->text();
+    };
+    waitFor([&] { return state() == "A password is stored."; }, "the password's state");
+    // The store's own tools take it away, which the account does not tell.
+    const auto item = adopt(account->cofferelItem());
+    ASSERT_EQ(CSKavellCofferelItemDelete(item.get()), kCSKavellCofferelStatusStored);
+    QApplication::setActiveWindow(&window());
+    QTest::keyClick(&window(), Qt::Key_F5);
+    waitFor([&] { return state() == "No password is stored."; }, "the new state");
+}
+
 TEST_F(Pane, EveryControlHasANameForScreenReaders)
 {
     storedAccount("ada");
