@@ -49,8 +49,7 @@ TEST_F(PaneLooks, NamesAreNeverTakenForMarkup)
         EXPECT_EQ(label->textFormat(), Qt::PlainText);
     }
     const QModelIndex group = list().model()->index(0, 0);
-    EXPECT_EQ(list().model()->index(0, 0, group).data(Qt::ToolTipRole).toString(),
-              Qt::convertFromPlainText("<b>ada"));
+    EXPECT_EQ(list().model()->index(0, 0, group).data(Qt::ToolTipRole).toString(), Qt::convertFromPlainText("<b>ada"));
 }
 
 }  // namespace
