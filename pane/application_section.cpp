@@ -3,6 +3,7 @@
 
 #include "pane/application_section.h"
 
+#include <algorithm>
 #include <chrono>
 #include <exception>
 
@@ -16,6 +17,7 @@
 #include <kavellaccounts/KAApplication.h>
 #include <kavellaccounts/KAConstants.h>
 
+#include "pane/account_records.h"
 #include "pane/application_details.h"
 
 namespace kavell::pane {
@@ -25,7 +27,7 @@ namespace {
 // A plug-in that asks a server and the user takes its time; one that takes longer is stuck.
 constexpr std::chrono::seconds kPluginsTime{60};
 constexpr std::chrono::seconds kLookAgain{1};
-constexpr int kFrame = 4;  // around the rows
+constexpr int kFrame = 2;  // around the rows
 
 }  // namespace
 
@@ -39,13 +41,15 @@ ApplicationSection::ApplicationSection(QWidget *parent)
     m_deadline.setInterval(kLookAgain);
     connect(&m_deadline, &QTimer::timeout, this, &ApplicationSection::giveUp);
     m_observation = KANotificationCenter::shared().addObserver(
-        KAChangedAccountsNotification, [section = QPointer<ApplicationSection>(this)](const KANotification &) {
+        KAChangedAccountsNotification,
+        [section = QPointer<ApplicationSection>(this)](const KANotification &notification) {
             // Posted on whichever thread the plug-in works.
+            const auto changed = notification.object.value<QList<std::shared_ptr<KAAccount>>>();
             QMetaObject::invokeMethod(
                 qApp,
-                [section] {
+                [section, changed] {
                     if (section)
-                        section->pluginIsDone();
+                        section->pluginIsDone(changed);
                 },
                 Qt::QueuedConnection);
         });
@@ -60,7 +64,8 @@ ApplicationSection::~ApplicationSection()
 void ApplicationSection::showAccount(const std::shared_ptr<KAAccount> &account,
                                      const std::shared_ptr<KAAccount> &pluginsAccount, KAAListPlugin *plugin)
 {
-    const bool isAnother = !m_account || !account->isEqual(*m_account) || m_plugin != plugin;
+    // Not KAAccount::isEqual, for which one user's accounts at the maker's two mail domains are the same.
+    const bool isAnother = !m_account || !(nameOf(*account) == nameOf(*m_account)) || m_plugin != plugin;
     if (isAnother) {
         m_expected.clear();
         m_deadline.stop();
@@ -138,10 +143,13 @@ void ApplicationSection::settle()
         m_table->updateTable();
 }
 
-void ApplicationSection::pluginIsDone()
+void ApplicationSection::pluginIsDone(const QList<std::shared_ptr<KAAccount>> &accounts)
 {
+    const bool isThisOne = m_account && std::any_of(accounts.begin(), accounts.end(), [this](const auto &account) {
+                               return account && nameOf(*account) == nameOf(*m_account);
+                           });
     // Which of several it has done, it does not say; each of them shows in the account, or ends with its time.
-    if (m_expected.size() != 1)
+    if (!isThisOne || m_expected.size() != 1)
         return;
     m_expected.begin()->isOver = true;
     emit changed();

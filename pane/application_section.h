@@ -58,7 +58,7 @@ private:
     void showTable();
     void settle();
     void giveUp();
-    void pluginIsDone();
+    void pluginIsDone(const QList<std::shared_ptr<KAAccount>> &accounts);
 
     struct Expectation {
         std::shared_ptr<KAApplication> application;

@@ -6,6 +6,7 @@
 #include "pane/pane_window.h"
 
 #include <kavellaccounts/KAApplication.h>
+#include <kavellaccounts/KANotificationCenter.h>
 #include <kavellaccounts/KAProvider.h>
 
 #include "tests/pane/pane_fixture.h"
@@ -145,6 +146,30 @@ TEST_F(Pane, SlowApplicationSpinsUntilTheAccountSaysSo)
     EXPECT_FALSE(applicationCheckBox(kKAMailAppID)->isVisible());
     waitFor([&] { return applicationCheckBox(kKAMailAppID)->isVisible(); }, "the spinner's end");
     EXPECT_TRUE(applicationCheckBox(kKAMailAppID)->isChecked());
+}
+
+/// As a plug-in posts it when it is done with an order that came to nothing.
+void postChanged(const std::shared_ptr<KAAccount> &account)
+{
+    KANotificationCenter::shared().post(KAChangedAccountsNotification,
+                                        QVariant::fromValue(QList<std::shared_ptr<KAAccount>>{account}));
+}
+
+TEST_F(Pane, SpinnerEndsWhenThePluginSaysThatItIsDoneWithThisAccount)
+{
+    const auto ada = storedAccount("ada");
+    const auto bob = storedAccount("bob");
+    openPane();
+    waitForPage("ada");
+    waitFor([&] { return applicationCheckBox(kKAMailAppID) != nullptr; }, "the table");
+    kind().setProperty("switching", "never");
+    QTest::mouseClick(applicationCheckBox(kKAMailAppID), Qt::LeftButton);
+    postChanged(bob);
+    QCoreApplication::sendPostedEvents();
+    EXPECT_FALSE(applicationCheckBox(kKAMailAppID)->isVisible());
+    postChanged(ada);
+    waitFor([&] { return applicationCheckBox(kKAMailAppID)->isVisible(); }, "the spinner's end");
+    EXPECT_FALSE(applicationCheckBox(kKAMailAppID)->isChecked());
 }
 
 TEST_F(Pane, FailingPluginIsNamedAndTheCheckBoxGoesBack)
