@@ -53,7 +53,7 @@ function(kavell_register_test name)
     # The thread sanitizer's own exits: forked children of threaded tests may start threads, and no test waits a second to end.
     add_test(NAME ${name} COMMAND "${PROJECT_SOURCE_DIR}/tests/support/run_isolated" ${ARG_COMMAND})
     set_tests_properties(${name} PROPERTIES TIMEOUT "${ARG_TIMEOUT}" LABELS "${ARG_LABELS}" ENVIRONMENT
-        "KAVELL_SOURCE_DIR=${PROJECT_SOURCE_DIR};KAVELL_BUILD_DIR=${PROJECT_BINARY_DIR};TSAN_OPTIONS=halt_on_error=1 die_after_fork=0 atexit_sleep_ms=20 suppressions=${PROJECT_SOURCE_DIR}/tests/support/tsan.supp")
+        "KAVELL_SOURCE_DIR=${PROJECT_SOURCE_DIR};KAVELL_BUILD_DIR=${PROJECT_BINARY_DIR};LSAN_OPTIONS=print_suppressions=0:suppressions=${PROJECT_SOURCE_DIR}/tests/support/lsan.supp;TSAN_OPTIONS=halt_on_error=1 die_after_fork=0 atexit_sleep_ms=20 suppressions=${PROJECT_SOURCE_DIR}/tests/support/tsan.supp")
 endfunction()
 
 # kavell_add_object_layer_library(NAME file…)

@@ -107,10 +107,11 @@ bool AppTableRows::showRows(int first, int end, const QElapsedTimer &clock)
 
 bool AppTableRows::showRowsInView(const QElapsedTimer &clock)
 {
-    if (!m_table || !m_scrollView)
+    const QScrollArea *const view = scrollView();
+    if (!m_table || !view)
         return true;
-    const int top = m_scrollView->verticalScrollBar()->value();
-    const int end = (top + m_scrollView->viewport()->height()) / m_rowHeight + 1;
+    const int top = view->verticalScrollBar()->value();
+    const int end = (top + view->viewport()->height()) / m_rowHeight + 1;
     return showRows(top / m_rowHeight, std::min(end, int(m_slots.size())), clock);
 }
 
@@ -174,7 +175,8 @@ void AppTableRows::chainFocus(int row)
 
 void AppTableRows::selectPlaceOf(QWidget *widget)
 {
-    if (!m_table || !m_scrollView || !widget || !m_table->isAncestorOf(widget))
+    QScrollArea *const view = scrollView();
+    if (!m_table || !view || !widget || !m_table->isAncestorOf(widget))
         return;
     for (const Slot &slot : m_slots) {
         if (!slot.place)
@@ -182,7 +184,7 @@ void AppTableRows::selectPlaceOf(QWidget *widget)
         const bool isSelected = slot.place == widget || slot.place->isAncestorOf(widget);
         slot.place->setSelected(isSelected);
         if (isSelected)
-            m_scrollView->ensureWidgetVisible(slot.place, 0, 0);
+            view->ensureWidgetVisible(slot.place, 0, 0);
     }
 }
 

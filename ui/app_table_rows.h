@@ -62,7 +62,10 @@ private:
     void chainFocus(int row);
     void selectPlaceOf(QWidget *widget);
 
-    QPointer<QScrollArea> m_scrollView;
+    /// Null too while it is being destroyed, when its last events come and it is a plain widget already.
+    [[nodiscard]] QScrollArea *scrollView() const { return qobject_cast<QScrollArea *>(m_scrollView.data()); }
+
+    const QPointer<QWidget> m_scrollView;  // a QScrollArea
     QPointer<QWidget> m_table;
     RowAt m_rowAt;
     std::vector<Slot> m_slots;  // one for each row
