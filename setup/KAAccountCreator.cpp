@@ -166,7 +166,7 @@ private:
 std::shared_ptr<KAAccountCreator> KAAccountCreator::initWithSettings(const std::optional<QVariantMap> &settings,
                                                                      KADataPlugin *plugin)
 {
-    return std::shared_ptr<KAAccountCreator>(new KAAccountCreator(settings, plugin));
+    return owned(new KAAccountCreator(settings, plugin));
 }
 
 KAAccountCreator::KAAccountCreator(const std::optional<QVariantMap> &settings, KADataPlugin *plugin)
@@ -177,19 +177,25 @@ KAAccountCreator::KAAccountCreator(const std::optional<QVariantMap> &settings, K
 
 KAAccountCreator::~KAAccountCreator()
 {
+    letGoOfPlugin();
+}
+
+void KAAccountCreator::letGoOfPlugin()
+{
     // To none, whoever the delegate is, but for another creator that is at work: it would wait for ever. One whose turn
     // has only just begun has yet to take this creator's place, to which messages come until it has.
-    while (_plugin) {
+    while (_plugin && !m_hasLetGo) {
         if (pluginsAtWork().take(_plugin) == PluginsAtWork::Answer::Taken) {
             _plugin->setDelegate(nullptr);
             pluginsAtWork().giveBack(_plugin);
-            return;
+            break;
         }
         // The plug-in itself is not asked: it may be in the midst of a question to the user.
         if (pluginsAtWork().servesItsDelegate(_plugin))
-            return;
+            break;
         std::this_thread::yield();
     }
+    m_hasLetGo = true;
 }
 
 std::shared_ptr<KAProvider> KAAccountCreator::provider() const

@@ -8,7 +8,7 @@
 std::shared_ptr<KACardellAccountCreator>
 KACardellAccountCreator::initWithSettings(const std::optional<QVariantMap> &settings, KADataPlugin *plugin)
 {
-    return std::shared_ptr<KACardellAccountCreator>(new KACardellAccountCreator(settings, plugin));
+    return owned(new KACardellAccountCreator(settings, plugin));
 }
 
 KACardellAccountCreator::~KACardellAccountCreator() = default;

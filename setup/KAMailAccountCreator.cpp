@@ -10,7 +10,7 @@
 std::shared_ptr<KAMailAccountCreator> KAMailAccountCreator::initWithSettings(const std::optional<QVariantMap> &settings,
                                                                              KADataPlugin *plugin)
 {
-    return std::shared_ptr<KAMailAccountCreator>(new KAMailAccountCreator(settings, plugin));
+    return owned(new KAMailAccountCreator(settings, plugin));
 }
 
 KAMailAccountCreator::~KAMailAccountCreator() = default;

@@ -28,7 +28,7 @@ const ServiceOfProvider kServices[] = {
 std::shared_ptr<KAParlexAccountCreator>
 KAParlexAccountCreator::initWithSettings(const std::optional<QVariantMap> &settings, KADataPlugin *plugin)
 {
-    return std::shared_ptr<KAParlexAccountCreator>(new KAParlexAccountCreator(settings, plugin));
+    return owned(new KAParlexAccountCreator(settings, plugin));
 }
 
 KAParlexAccountCreator::~KAParlexAccountCreator() = default;

@@ -8,7 +8,7 @@
 std::shared_ptr<KATidewellAccountCreator>
 KATidewellAccountCreator::initWithSettings(const std::optional<QVariantMap> &settings, KADataPlugin *plugin)
 {
-    return std::shared_ptr<KATidewellAccountCreator>(new KATidewellAccountCreator(settings, plugin));
+    return owned(new KATidewellAccountCreator(settings, plugin));
 }
 
 KATidewellAccountCreator::~KATidewellAccountCreator() = default;

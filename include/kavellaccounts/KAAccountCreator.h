@@ -114,6 +114,16 @@ public:
     void describeFields(KAFieldList &fields) const override;
 
 protected:
+    /// Owns a new creator. It lets go of its plug-in before it is destroyed: a message from another thread must not come
+    /// while an object is on its way from one class to its base.
+    template <typename Creator> [[nodiscard]] static std::shared_ptr<Creator> owned(Creator *creator)
+    {
+        return std::shared_ptr<Creator>(creator, [](Creator *dying) {
+            dying->letGoOfPlugin();
+            delete dying;
+        });
+    }
+
     KAAccountCreator(const std::optional<QVariantMap> &settings, KADataPlugin *plugin);
 
     /// What the plug-in is to set up; null in this class.
@@ -135,6 +145,8 @@ protected:
     void fillIn(KAAccountSetupInput &input, const QString &descriptionKey) const;
 
 private:
+    void letGoOfPlugin();
+
     [[nodiscard]] QString pluginIdentifier() const;
     [[nodiscard]] bool _warnAboutMigrationSyncIfNecessary() const;
     [[nodiscard]] bool _enableBrondelService();
@@ -155,6 +167,7 @@ private:
     QString m_failureReason;
     KAError m_failureError;
     QString m_createdAccountUID;
+    bool m_hasLetGo = false;  // of the plug-in, on the way out
 };
 
 /// Makes accounts of the mail client.

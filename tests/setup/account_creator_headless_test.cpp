@@ -69,6 +69,7 @@ bool createInConsoleProgram()
     };
     bool created = true;
     QString reason;
+    std::promise<void> done;  // what the application object waits for, told in a way that the thread sanitizer sees
     {
         int count = 1;
         char name[] = "console";
@@ -78,10 +79,12 @@ bool createInConsoleProgram()
             const auto creator = KAMailAccountCreator::initWithSettings(kSettings, &plugin);
             created = creator->create();
             reason = creator->failureReason();
+            done.set_value();
         });
         while (!started)
             std::this_thread::yield();
     }
+    done.get_future().wait();
     const bool ended = reason == "The program ended while the plug-in looked for the account.";
     std::_Exit(!created && ended ? 0 : 1);
 }
@@ -99,6 +102,7 @@ bool createInConsoleProgram()
     const auto first = KAMailAccountCreator::initWithSettings(kSettings, &plugin);
     const auto second = KAMailAccountCreator::initWithSettings(kSettings, &plugin);
     bool created = true;
+    std::promise<void> done;
     std::thread worker;
     {
         int count = 1;
@@ -107,10 +111,14 @@ bool createInConsoleProgram()
         const QCoreApplication application(count, arguments);
         worker = std::thread([&] { static_cast<void>(first->create()); });
         busy.get_future().wait();
-        QThreadPool::globalInstance()->start([&] { created = second->create(); });
+        QThreadPool::globalInstance()->start([&] {
+            created = second->create();
+            done.set_value();
+        });
     }
     ended.set_value();
     worker.join();
+    done.get_future().wait();
     const QString reason = "The plug-in or the program ended while it was at work on another account.";
     std::_Exit(!created && second->failureReason() == reason ? 0 : 1);
 }
