@@ -365,11 +365,11 @@ TEST_F(KAAccountCreatorTest, AReportMayBeAQueuedMessageOnTheCreatingThread)
     QThreadPool::globalInstance()->start([&] { inPool.set_value(create()); });
     EXPECT_TRUE(inPool.get_future().get());
 
-    bool inThread = false;
-    const std::unique_ptr<QThread> thread(QThread::create([&] { inThread = create(); }));
+    std::promise<bool> inThread;
+    const std::unique_ptr<QThread> thread(QThread::create([&] { inThread.set_value(create()); }));
     thread->start();
+    EXPECT_TRUE(inThread.get_future().get());
     thread->wait();
-    EXPECT_TRUE(inThread);
     EXPECT_EQ(creations, 4);
 }
 

@@ -9,6 +9,8 @@
 
 #include <map>
 
+#include <QtCore/QThreadPool>
+
 #include <kavellaccounts/KAAccountCreator.h>
 #include <kavellaccounts/KABundle.h>
 #include <kavellaccounts/KAFieldList.h>
@@ -27,6 +29,9 @@ inline const QVariantMap kSettings{{"emailAddress", "ada@zorbo.example"}};
 
 class CreatorTest : public AccountWithPluginsTest {
 protected:
+    /// Creators in the pool let go of their plug-ins last of all.
+    ~CreatorTest() override { QThreadPool::globalInstance()->waitForDone(); }
+
     /// The data plug-in of an application, which finds everything at once and makes the account "uid-1".
     ScriptedDataPlugin &plugin(const QString &identifier = kKAMailPluginID)
     {

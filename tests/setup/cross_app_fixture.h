@@ -12,6 +12,8 @@
 #include <QtTest/QTest>
 #include <QtWidgets/QCheckBox>
 
+#include <QtCore/QThreadPool>
+
 #include <kavellaccounts/KAAListPlugin.h>
 #include <kavellaccounts/KAAccountSetupInput.h>
 #include <kavellaccounts/KAAccountSetupResult.h>
@@ -33,6 +35,9 @@ inline const QVariantMap kAda{{"emailAddress", "ada@zorbo.example"}};
 
 class CrossAppTest : public AccountTest {
 protected:
+    /// The set-ups in the pool use the plug-ins until they end.
+    ~CrossAppTest() override { QThreadPool::globalInstance()->waitForDone(); }
+
     /// The account-list plug-in that claims zorbo.example.
     void addProvider(const QStringList &services = kAllServices)
     {
