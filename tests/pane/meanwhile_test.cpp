@@ -145,35 +145,6 @@ TEST_F(Meanwhile, OpenDialogsAndSheetsEndWithTheWindow)
     }
 }
 
-TEST_F(Meanwhile, StormOfSavesIsGatheredAndEndsWithTheLast)
-{
-    storedAccount("ada");
-    int start[2];
-    ASSERT_EQ(pipe(start), 0);
-    // Before the pane has threads, of which a forked process would have the locks.
-    ChildProcess storm([&] {
-        char letter = 0;
-        if (read(start[0], &letter, 1) != 1)
-            return 1;
-        const auto account = newAccount("ada", kKindType);
-        for (int save = 1; save <= 300; ++save) {
-            account->setProviderAttribute(QString::number(save), KAMailAccountDescriptionKey);
-            commit(account);
-        }
-        return 0;
-    });
-    openPane();
-    waitForPage("ada");
-    int readings = 0;
-    QObject::connect(&window().registry(), &pane::AccountRegistry::read, [&] { ++readings; });
-    ASSERT_EQ(write(start[1], "x", 1), 1);
-    waitForPage("300");
-    EXPECT_EQ(storm.wait(), 0);
-    EXPECT_LT(readings, 200);
-    close(start[0]);
-    close(start[1]);
-}
-
 TEST_F(Meanwhile, ThousandAccountsAreListedAndTheSelectionStaysThroughAChange)
 {
     storedAccount("1000", kKAProviderGoogle);
