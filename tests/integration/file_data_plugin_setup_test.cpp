@@ -3,6 +3,8 @@
 //
 // The example data plug-ins while they set an account up: what the delegate is told, on which thread, and what ends it.
 
+#include <atomic>
+
 #include <gmock/gmock.h>
 
 #include <QtCore/QUrl>
@@ -194,8 +196,8 @@ TEST_F(FileDataPluginSetup, ADelegateThatIsGoneIsNotTold)
 
 TEST_F(FileDataPluginSetup, AnswersOnTheThreadThatAsked)
 {
-    QThread *told = nullptr;
-    bool wasFound = false;
+    std::atomic<QThread *> told = nullptr;
+    std::atomic<bool> wasFound = false;
     const std::unique_ptr<QThread> worker(QThread::create([&] {
         SetupRecorder own;
         plugin().setDelegate(&own);
@@ -207,7 +209,7 @@ TEST_F(FileDataPluginSetup, AnswersOnTheThreadThatAsked)
     worker->start();
     ASSERT_TRUE(worker->wait(20000));  // while this thread runs no events
     EXPECT_TRUE(wasFound);
-    EXPECT_EQ(told, worker.get());
+    EXPECT_EQ(told.load(), worker.get());
 }
 
 TEST_F(FileDataPluginSetup, SaysThatTheApplicationHasTheAccountAlready)
@@ -224,12 +226,12 @@ TEST_F(FileDataPluginSetup, SaysThatTheApplicationHasTheAccountAlready)
 /// events the creator runs while this thread does nothing. The settings of the account that was made.
 template <typename Creator> QVariantMap createdBy(KADataPlugin &dataPlugin, const QVariantMap &settings)
 {
-    bool isMade = false;
+    std::atomic<bool> isMade = false;
     const std::unique_ptr<QThread> worker(QThread::create([&] {
         const auto creator = Creator::initWithSettings(settings, &dataPlugin);
         creator->setProvider(KAProvider::initWithProviderType("com.example.account.zorbo"));
         isMade = creator->create();
-        EXPECT_TRUE(isMade) << creator->failureReason().toStdString();
+        EXPECT_TRUE(isMade.load()) << creator->failureReason().toStdString();
     }));
     worker->start();
     EXPECT_TRUE(worker->wait(20000));

@@ -68,7 +68,7 @@ TEST(MainThreadTest, WhatTheWorkThrowsComesThrough)
 [[noreturn]] void endBeforeTheWork()
 {
     std::atomic<bool> asks = false;
-    bool returned = false;
+    std::atomic<bool> returned = false;
     {
         const Application application;
         QThreadPool::globalInstance()->start([&] {
