@@ -3,7 +3,8 @@
 //
 // The example data plug-ins while they set an account up: what the delegate is told, on which thread, and what ends it.
 
-#include <atomic>
+#include <chrono>
+#include <future>
 
 #include <gmock/gmock.h>
 
@@ -19,6 +20,7 @@ namespace kavell::test {
 
 using testing::ElementsAre;
 using testing::IsEmpty;
+using namespace std::chrono_literals;
 
 const QString kLooking = QStringLiteral("update Looking for the account’s servers…");
 
@@ -196,20 +198,20 @@ TEST_F(FileDataPluginSetup, ADelegateThatIsGoneIsNotTold)
 
 TEST_F(FileDataPluginSetup, AnswersOnTheThreadThatAsked)
 {
-    std::atomic<QThread *> told = nullptr;
-    std::atomic<bool> wasFound = false;
+    std::promise<QThread *> told;  // the thread, none when the set-up failed
     const std::unique_ptr<QThread> worker(QThread::create([&] {
         SetupRecorder own;
         plugin().setDelegate(&own);
         plugin().startAccountSetupWithInput(mailInput("carla@zorbo.example"));
-        wasFound = runUntil([&] { return own.hasEnded(); }) && own.result;
-        told = own.thread;
+        const bool wasFound = runUntil([&] { return own.hasEnded(); }) && own.result;
         plugin().setDelegate(nullptr);
+        told.set_value(wasFound ? own.thread : nullptr);
     }));
     worker->start();
-    ASSERT_TRUE(worker->wait(20000));  // while this thread runs no events
-    EXPECT_TRUE(wasFound);
-    EXPECT_EQ(told.load(), worker.get());
+    auto answer = told.get_future();
+    ASSERT_EQ(answer.wait_for(20s), std::future_status::ready);  // while this thread runs no events
+    EXPECT_EQ(answer.get(), worker.get());
+    EXPECT_TRUE(worker->wait(20000));
 }
 
 TEST_F(FileDataPluginSetup, SaysThatTheApplicationHasTheAccountAlready)
@@ -226,17 +228,23 @@ TEST_F(FileDataPluginSetup, SaysThatTheApplicationHasTheAccountAlready)
 /// events the creator runs while this thread does nothing. The settings of the account that was made.
 template <typename Creator> QVariantMap createdBy(KADataPlugin &dataPlugin, const QVariantMap &settings)
 {
-    std::atomic<bool> isMade = false;
+    std::promise<bool> isMade;
     const std::unique_ptr<QThread> worker(QThread::create([&] {
-        const auto creator = Creator::initWithSettings(settings, &dataPlugin);
-        creator->setProvider(KAProvider::initWithProviderType("com.example.account.zorbo"));
-        isMade = creator->create();
-        EXPECT_TRUE(isMade.load()) << creator->failureReason().toStdString();
+        bool wasMade = false;
+        {
+            const auto creator = Creator::initWithSettings(settings, &dataPlugin);
+            creator->setProvider(KAProvider::initWithProviderType("com.example.account.zorbo"));
+            wasMade = creator->create();
+            EXPECT_TRUE(wasMade) << creator->failureReason().toStdString();
+        }
+        isMade.set_value(wasMade);
     }));
     worker->start();
+    auto answer = isMade.get_future();
+    const bool wasMade = answer.wait_for(20s) == std::future_status::ready && answer.get();
     EXPECT_TRUE(worker->wait(20000));
     const QStringList uids = dataPlugin.accountUIDs();
-    return isMade && uids.size() == 1 ? dataPlugin.settingsForAccountUID(uids.first()) : QVariantMap();
+    return wasMade && uids.size() == 1 ? dataPlugin.settingsForAccountUID(uids.first()) : QVariantMap();
 }
 
 TEST_F(FileDataPluginSetup, TheCreatorOfMailAccountsMakesOne)
