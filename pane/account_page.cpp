@@ -135,9 +135,8 @@ void AccountPage::showAccount(const OpenAccount &account, KAAListPlugin *plugin)
         saveDescription();
     m_account = account.shown;
     m_defaultDescription = plugin ? plugin->defaultAccountDescription() : QString();
-    if (isAnother) {
+    if (isAnother)
         verticalScrollBar()->setValue(0);
-    }
     showHeader(plugin);
     m_applications->showAccount(account.shown, account.forPlugin, plugin);
     if (isAnother)

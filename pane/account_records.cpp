@@ -115,13 +115,13 @@ QList<AccountGroup> readAccounts()
         if (type.isEmpty() || known.contains(type))
             continue;
         known += type;
-        groups += AccountGroup{type, plugin->userVisibleProviderName(), plugin, summariesOf(type)};
+        groups += AccountGroup{type, plugin, summariesOf(type)};
     }
     known += providerTypesOfApplications();
     const QStringList stored = QDir(accountsDirectory()).entryList(QDir::Dirs | QDir::NoDotAndDotDot, QDir::Name);
     for (const QString &type : stored) {
         if (!known.contains(type))
-            groups += AccountGroup{type, QString(), nullptr, summariesOf(type)};
+            groups += AccountGroup{type, nullptr, summariesOf(type)};
     }
     groups.removeIf([](const AccountGroup &group) { return group.accounts.isEmpty(); });
     return groups;

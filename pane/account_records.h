@@ -48,7 +48,6 @@ struct AccountSummary {
 /// The accounts of one provider, in the order of their login names.
 struct AccountGroup {
     QString providerType;
-    QString title;
     KAAListPlugin *plugin = nullptr;  ///< the registry's; null for accounts of a kind that no installed plug-in serves
     QList<AccountSummary> accounts;
     bool operator==(const AccountGroup &other) const = default;

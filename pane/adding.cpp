@@ -15,6 +15,7 @@
 
 #include "pane/account_registry.h"
 #include "pane/provider_chooser.h"
+#include "pane/provider_looks.h"
 #include "pane/undertakings.h"
 
 namespace kavell::pane {
@@ -71,7 +72,7 @@ void Adding::showSheet(KAAListPlugin *plugin)
     try {
         plugin->createAccountInWindow(m_window);
     } catch (const std::exception &error) {
-        emit failed(qtTrId("PLUGIN_FAILED").arg(plugin->userVisibleProviderName(), QString::fromUtf8(error.what())));
+        emit failed(pluginFailure(*plugin, error));
     }
 }
 

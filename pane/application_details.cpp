@@ -15,6 +15,8 @@
 #include <kavellaccounts/KADataPlugin.h>
 #include <kavellaccounts/KAPluginManager.h>
 
+#include "pane/provider_looks.h"
+
 namespace kavell::pane {
 
 namespace {
@@ -39,9 +41,7 @@ void configure(KADataPlugin *plugin, const QString &uid, QWidget *window)
     try {
         plugin->configureAccountUID(uid);
     } catch (const std::exception &error) {
-        QMessageBox::warning(
-            window, qtTrId("PANE_TITLE"),
-            qtTrId("PLUGIN_FAILED").arg(plugin->userVisibleProviderName(), QString::fromUtf8(error.what())));
+        QMessageBox::warning(window, qtTrId("PANE_TITLE"), pluginFailure(*plugin, error));
     }
 }
 

@@ -7,7 +7,6 @@
 #include <chrono>
 #include <exception>
 
-#include <QtCore/QDeadlineTimer>
 #include <QtWidgets/QApplication>
 #include <QtWidgets/QVBoxLayout>
 
@@ -19,6 +18,7 @@
 
 #include "pane/account_records.h"
 #include "pane/application_details.h"
+#include "pane/provider_looks.h"
 
 namespace kavell::pane {
 
@@ -108,18 +108,16 @@ bool ApplicationSection::setEnabled(bool enabled, const std::shared_ptr<KAApplic
 {
     if (!m_plugin || !m_pluginsAccount)
         return false;
-    const QString title = m_plugin->userVisibleProviderName();
     try {
         m_plugin->setAccount(m_pluginsAccount);
         m_plugin->setEnabled(enabled, application, m_pluginsAccount, window());
     } catch (const std::exception &error) {
         if (m_table)
             m_table->stopProgressForApp(application);
-        emit failed(qtTrId("PLUGIN_FAILED").arg(title, QString::fromUtf8(error.what())));
+        emit failed(pluginFailure(*m_plugin, error));
         return false;
     }
-    const auto deadline = QDeadlineTimer(kPluginsTime).deadline();
-    m_expected.insert(application->bundleID(), {application, enabled, deadline, false});
+    m_expected.insert(application->bundleID(), {application, enabled, QDeadlineTimer(kPluginsTime), false});
     m_deadline.start();
     if (m_table && enabled)
         m_table->startProgressForApp(application);
@@ -158,7 +156,7 @@ void ApplicationSection::pluginIsDone(const QList<std::shared_ptr<KAAccount>> &a
 void ApplicationSection::giveUp()
 {
     for (auto expected = m_expected.begin(); expected != m_expected.end();) {
-        if (!QDeadlineTimer(expected->deadline - QDeadlineTimer::current().deadline()).hasExpired()) {
+        if (!expected->deadline.hasExpired()) {
             ++expected;
             continue;
         }

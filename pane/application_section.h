@@ -9,6 +9,7 @@
 
 #include <memory>
 
+#include <QtCore/QDeadlineTimer>
 #include <QtCore/QHash>
 #include <QtCore/QPointer>
 #include <QtCore/QTimer>
@@ -63,8 +64,8 @@ private:
     struct Expectation {
         std::shared_ptr<KAApplication> application;
         bool isEnabled;
-        qint64 deadline;  // of the monotonic clock, in ms
-        bool isOver;      // the plug-in says that it is done, whatever came of it
+        QDeadlineTimer deadline;
+        bool isOver;  // the plug-in says that it is done, whatever came of it
     };
 
     std::shared_ptr<KAAccount> m_account;

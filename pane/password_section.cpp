@@ -6,7 +6,6 @@
 #include <array>
 
 #include <QtWidgets/QHBoxLayout>
-#include <QtWidgets/QMessageBox>
 #include <QtWidgets/QVBoxLayout>
 
 #include "pane/password_dialog.h"

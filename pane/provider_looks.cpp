@@ -71,6 +71,11 @@ QString providerTitle(const QString &providerType, const KAAListPlugin *plugin)
     return providerType;
 }
 
+QString pluginFailure(const KAPlugin &plugin, const std::exception &error)
+{
+    return qtTrId("PLUGIN_FAILED").arg(plugin.userVisibleProviderName(), QString::fromUtf8(error.what()));
+}
+
 QIcon brandIcon(const KAAListPlugin *plugin)
 {
     if (!plugin)

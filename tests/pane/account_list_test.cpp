@@ -36,7 +36,7 @@ protected:
         std::shuffle(types.begin(), types.end(), m_random);
         QList<AccountGroup> groups;
         for (const QString &type : types.first(upTo(4))) {
-            AccountGroup group{type, QString(), nullptr, {}};
+            AccountGroup group{type, nullptr, {}};
             QStringList names{"ada",        "Ada", "ADA", "a-da", "bob", "Bob", "carla", "dora@example.org",
                               "\u00e9mile", "zoe"};
             std::shuffle(names.begin(), names.end(), m_random);
