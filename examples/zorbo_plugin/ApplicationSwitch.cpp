@@ -86,7 +86,7 @@ void ApplicationSwitch::turn(bool on, const std::shared_ptr<KAApplication> &appl
 {
     if (!application || !account)
         return;
-    m_orders.enqueue({on, application, account, window, isStored(*account)});
+    m_orders.enqueue({on, application, account, window, isStored(*account), childUIDOf(*account, *application)});
     if (m_orders.size() == 1)
         startNext();
 }
@@ -136,7 +136,9 @@ ApplicationSwitch::Outcome ApplicationSwitch::turnOn(const Order &order, KADataP
 
 ApplicationSwitch::Outcome ApplicationSwitch::turnOff(const Order &order, KADataPlugin *dataPlugin) const
 {
-    const QString uid = childUIDOf(*order.account, *order.application);
+    QString uid = childUIDOf(*order.account, *order.application);
+    if (uid.isNull())
+        uid = order.childUID;  // an account that is removed meanwhile knows its child no more
     if (uid.isNull() || !dataPlugin->accountUIDs().contains(uid))
         return {uid, {}, {}};
     dataPlugin->deactivateAccountUID(uid);
@@ -148,15 +150,31 @@ ApplicationSwitch::Outcome ApplicationSwitch::turnOff(const Order &order, KAData
 void ApplicationSwitch::finish(const Order &order, const Outcome &outcome)
 {
     const bool isRemoved = order.wasStored && !isStored(*order.account);
+    if (isRemoved && order.on && !outcome.childUID.isNull()) {
+        turnOffAgain(order, outcome.childUID);
+        return;
+    }
     if (!isRemoved) {
         remember(order, outcome);
         if (!outcome.problem.isNull())
             showProblem(order.window, outcome.problem);
-    } else if (order.on && !outcome.childUID.isNull()) {
-        // The online account went while its child was being made; the child must not stay on without it.
-        KADataPlugin *const dataPlugin = dataPluginOf(*order.application);
-        m_worker.start([dataPlugin, uid = outcome.childUID] { dataPlugin->deactivateAccountUID(uid); });
     }
+    end(order);
+}
+
+/// The online account went while its child was being made; the child must not stay on without it.
+void ApplicationSwitch::turnOffAgain(const Order &order, const QString &childUID)
+{
+    m_worker.start([this, order, childUID] {
+        dataPluginOf(*order.application)->deactivateAccountUID(childUID);
+        QMetaObject::invokeMethod(
+            this, [this, order] { end(order); }, Qt::QueuedConnection);
+    });
+}
+
+/// Tells that the order is carried out, and starts the next.
+void ApplicationSwitch::end(const Order &order)
+{
     m_orders.dequeue();
     if (!m_orders.isEmpty())
         startNext();

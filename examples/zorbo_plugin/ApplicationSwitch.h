@@ -50,6 +50,7 @@ private:
         std::shared_ptr<KAAccount> account;
         QPointer<QWidget> window;
         bool wasStored = false;  // whether the account's file was there when the order came
+        QString childUID;        // what the account said of its child then; null when it had none
     };
 
     /// What the worker thread did.
@@ -64,6 +65,8 @@ private:
     [[nodiscard]] Outcome turnOn(const Order &order, KADataPlugin *dataPlugin) const;
     [[nodiscard]] Outcome turnOff(const Order &order, KADataPlugin *dataPlugin) const;
     void finish(const Order &order, const Outcome &outcome);
+    void turnOffAgain(const Order &order, const QString &childUID);
+    void end(const Order &order);
     void remember(const Order &order, const Outcome &outcome) const;
     void showProblem(QWidget *window, const QString &sentence) const;
     [[nodiscard]] QString text(const char *key) const;
