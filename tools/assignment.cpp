@@ -161,6 +161,13 @@ bool looksLikeType(std::string_view word)
            std::all_of(word.begin(), word.end(), [](char letter) { return letter >= 'a' && letter <= 'z'; });
 }
 
+/// Whether the end of a key would be read as a type, so that a string under it needs one of its own.
+bool endsLikeType(std::string_view key)
+{
+    const size_t colon = key.rfind(':');
+    return colon != key.npos && looksLikeType(key.substr(colon + 1));
+}
+
 [[noreturn]] void refuseType(std::string_view type, std::string_view word)
 {
     std::vector<std::string_view> known;
@@ -232,7 +239,8 @@ std::string assignmentText(std::string_view key, CSKavellTypeRef value)
     const std::string shown = escaped(shortAttributeKey(key));
     const CSKavellTypeID type = CSKavellGetTypeID(value);
     if (type == CSKavellStringGetTypeID())
-        return shown + "=" + escaped(toStringView(static_cast<CSKavellStringRef>(value)));
+        return shown + (endsLikeType(shown) ? ":string=" : "=") +
+               escaped(toStringView(static_cast<CSKavellStringRef>(value)));
     if (type == CSKavellNumberGetTypeID())
         return numberText(shown, static_cast<CSKavellNumberRef>(value));
     if (type == CSKavellBooleanGetTypeID())

@@ -83,6 +83,22 @@ TEST_F(AttributeCommands, EveryTypeOfValueIsShownAsItWasGiven)
         << result.output;
 }
 
+TEST_F(AttributeCommands, AKeyThatEndsLikeATypeIsShownWithTheTypeBehindIt)
+{
+    run({"add", "google", "anna", "a:b:string=x", "a:string:string=y", "a:B=z", "a:b:int=1"});
+
+    const std::string shown = client({"show", "google", "anna"}).output;
+
+    EXPECT_NE(shown.find("Attributes\n"
+                         "  a:b:int=1\n"
+                         "  a:string:string=y\n"
+                         "  a:B=z\n"),
+              std::string::npos)
+        << shown;
+    run({"set", "google", "anna", "a:b:string=x"});
+    EXPECT_NE(client({"show", "google", "anna"}).output.find("  a:b:string=x\n"), std::string::npos);
+}
+
 TEST_F(AttributeCommands, TypesReachTheDataFile)
 {
     run({"add", "google", "anna", "port:int=993", "on:bool=true", "real:real=1", "date:date=2026-01-31T10:00:00Z",
