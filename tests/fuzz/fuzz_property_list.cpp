@@ -1,27 +1,25 @@
 // SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
-// A data file of any bytes: it parses or it does not, and what parses can be written and parsed again to the same
+// A property list of any bytes: it parses or it does not, and what parses can be written and parsed again to the same
 // value, unless it holds what a property list cannot keep.
-
-#include <cstdint>
-#include <cstdlib>
-#include <string_view>
 
 #include <kavellaccounts/CSKavellType.h>
 
 #include "platform/property_list.h"
+#include "tests/fuzz/fuzz_target.h"
 
 using namespace kavell;
+using kavell::fuzz::require;
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size)
 {
-    const auto first = parsePropertyList({reinterpret_cast<const char *>(data), size});
+    const auto first = parsePropertyList(fuzz::textOf(data, size));
+    require(isPropertyList(fuzz::textOf(data, size)) == static_cast<bool>(first), "what is a property list parses");
     std::string xml;
     if (!first || !writePropertyList(first.get(), xml))
         return 0;
     const auto second = parsePropertyList(xml);
-    if (!second || !CSKavellEqual(first.get(), second.get()))
-        std::abort();
+    require(second && CSKavellEqual(first.get(), second.get()), "what is written parses to the same value");
     return 0;
 }
