@@ -5,11 +5,9 @@
 // when the threads ask for them.
 
 #include <array>
-#include <barrier>
-#include <thread>
-#include <vector>
 
 #include "tests/runtime/values.h"
+#include "tests/support/threads.h"
 
 using namespace kavell;
 using namespace kavell::test;
@@ -18,16 +16,9 @@ namespace {
 
 constexpr int kThreads = 16;
 
-/// Runs `body(index)` on all threads, which start together.
 template <typename Body> void onAllThreads(Body body)
 {
-    std::barrier start(kThreads);
-    std::vector<std::jthread> threads;
-    for (int index = 0; index < kThreads; ++index)
-        threads.emplace_back([&, index] {
-            start.arrive_and_wait();
-            body(index);
-        });
+    onThreads(kThreads, body);
 }
 
 }  // namespace
@@ -46,6 +37,24 @@ TEST(Threads, ATypeAskedForByAllAtOnceIsRegisteredOnce)
     EXPECT_STREQ(CSKavellTypeIDGetName(answers[0][0]), "CSKavellAccount");
     EXPECT_STREQ(CSKavellTypeIDGetName(answers[0][1]), "CSKavellAccountProvider");
     EXPECT_STREQ(CSKavellTypeIDGetName(answers[0][2]), "CSKavellAccountSettings");
+}
+
+TEST(Threads, TypesKeepTheirNamesWhileOthersAreRegistered)
+{
+    const CSKavellTypeID known[] = {CSKavellStringGetTypeID(), CSKavellDictionaryGetTypeID(), CSKavellUUIDGetTypeID()};
+    onAllThreads([&](int index) {
+        if (index % 2 == 0) {
+            EXPECT_STREQ(CSKavellTypeIDGetName(CSKavellNotificationObserverGetTypeID()),
+                         "CSKavellNotificationObserver");
+            EXPECT_STREQ(CSKavellTypeIDGetName(CSKavellCofferelAccessGetTypeID()), "CSKavellCofferelAccess");
+        }
+        for (int round = 0; round < 2000; ++round) {
+            EXPECT_STREQ(CSKavellTypeIDGetName(known[0]), "CSKavellString");
+            EXPECT_STREQ(CSKavellTypeIDGetName(known[1]), "CSKavellDictionary");
+            EXPECT_STREQ(CSKavellTypeIDGetName(known[2]), "CSKavellUUID");
+            EXPECT_EQ(CSKavellTypeIDGetName(60), nullptr);
+        }
+    });
 }
 
 TEST(Threads, RetainAndReleaseFromAllThreadsLoseNoReference)
