@@ -3,13 +3,11 @@
 
 #include "platform/property_list.h"
 
-#include <array>
 #include <clocale>
 #include <cmath>
 #include <cstdlib>
 #include <locale.h>
 #include <memory>
-#include <mutex>
 
 #include <plist/plist.h>
 
@@ -20,6 +18,8 @@
 #include <kavellaccounts/CSKavellNumber.h>
 
 #include "platform/data_file.h"
+#include "platform/key_pool.h"
+#include "platform/plain_property_list.h"
 #include "platform/property_list_guard.h"
 #include "runtime/dictionary_p.h"
 #include "runtime/string_p.h"
@@ -62,37 +62,9 @@ private:
     locale_t m_previous;
 };
 
-/// Lets equal keys of many files share one string: accounts use the same few keys over and over, and keys would be half
-/// of a loaded account. Bounded, so that hostile files only push others out. A thread that finds it in use goes
-/// without.
-class KeyPool {
-public:
-    [[nodiscard]] Ref<CSKavellStringRef> key(std::string_view text) noexcept
-    {
-        Ref<CSKavellStringRef> &slot = m_slots[hashOfText(text) % m_slots.size()];
-        if (slot && slot->view() == text)
-            return slot;
-        return slot = adopt(makeValidString(nullptr, text));
-    }
-
-    std::mutex mutex;
-
-private:
-    std::array<Ref<CSKavellStringRef>, 256> m_slots;
-};
-
-KeyPool &keyPool()
-{
-    // Never destroyed: a thread may still be reading a file while the process exits.
-    static auto *const pool = new KeyPool;
-    return *pool;
-}
-
 /// Turns the parser's tree into objects. None for a tree with anything that a property list does not have.
 class ObjectMaker {
 public:
-    ObjectMaker() : m_pool(keyPool()), m_poolLock(m_pool.mutex, std::try_to_lock) {}
-
     [[nodiscard]] Ref<CSKavellTypeRef> object(plist_t node)
     {
         switch (plist_get_node_type(node)) {
@@ -136,7 +108,7 @@ private:
         const std::unique_ptr<char, FreeMemory> text(rawText);
         if (!text || !isUTF8(text.get()))
             return nullptr;
-        return m_poolLock.owns_lock() ? m_pool.key(text.get()) : adopt(makeValidString(nullptr, text.get()));
+        return m_keyMaker.key(text.get());
     }
 
     [[nodiscard]] static Ref<CSKavellStringRef> string(plist_t node)
@@ -191,8 +163,7 @@ private:
         }
     }
 
-    KeyPool &m_pool;
-    std::unique_lock<std::mutex> m_poolLock;
+    KeyMaker m_keyMaker;
 };
 
 /// Turns objects into the writer's tree. None for anything that a property list cannot keep.
@@ -316,15 +287,21 @@ PlistNode parsedTree(std::string_view xml) noexcept
 
 Ref<CSKavellMutableDictionaryRef> parsePropertyList(std::string_view xml) noexcept
 {
+    return guarded(Ref<CSKavellMutableDictionaryRef>(), [&] {
+        auto plain = parsePlainPropertyList(xml);
+        return plain ? plain : parseAnyPropertyList(xml);
+    });
+}
+
+Ref<CSKavellMutableDictionaryRef> parseAnyPropertyList(std::string_view xml)
+{
     const PlistNode tree = parsedTree(xml);
-    if (!tree)
-        return nullptr;
-    return guarded(Ref<CSKavellMutableDictionaryRef>(), [&] { return ObjectMaker().dictionary(tree.get()); });
+    return tree ? ObjectMaker().dictionary(tree.get()) : nullptr;
 }
 
 bool isPropertyList(std::string_view xml) noexcept
 {
-    return parsedTree(xml) != nullptr;
+    return static_cast<bool>(parsePropertyList(xml));
 }
 
 bool writePropertyList(CSKavellDictionaryRef dictionary, std::string &xml) noexcept

@@ -1,8 +1,9 @@
 // SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
-// XML property lists (format version 1.0) to objects and back, through libplist behind a guard. Used for data files and
-// for notifications between processes. Any thread may call; nothing here blocks.
+// XML property lists (format version 1.0) to objects and back: through libplist behind a guard, and, for the form that
+// is found nearly always, through a quicker reader (plain_property_list.h). Used for data files and for notifications
+// between processes. Any thread may call; nothing here blocks.
 
 #ifndef KAVELL_PLATFORM_PROPERTY_LIST_H
 #define KAVELL_PLATFORM_PROPERTY_LIST_H
@@ -18,6 +19,9 @@ namespace kavell {
 /// The dictionary that the XML text describes, with mutable containers; none when the text is not a property list that
 /// can be trusted (property_list_guard.h) or its top level is not a dictionary.
 [[nodiscard]] Ref<CSKavellMutableDictionaryRef> parsePropertyList(std::string_view xml) noexcept;
+
+/// The same without the quicker reader, whose answers must be equal. May throw std::bad_alloc.
+[[nodiscard]] Ref<CSKavellMutableDictionaryRef> parseAnyPropertyList(std::string_view xml);
 
 /// Whether parsePropertyList would answer a dictionary.
 [[nodiscard]] bool isPropertyList(std::string_view xml) noexcept;

@@ -2,10 +2,11 @@
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
 // A property list of any bytes: it parses or it does not, and what parses can be written and parsed again to the same
-// value, unless it holds what a property list cannot keep.
+// value, unless it holds what a property list cannot keep. What the quick reader answers, the general one answers too.
 
 #include <kavellaccounts/CSKavellType.h>
 
+#include "platform/plain_property_list.h"
 #include "platform/property_list.h"
 #include "tests/fuzz/fuzz_target.h"
 
@@ -16,6 +17,9 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size)
 {
     const auto first = parsePropertyList(fuzz::textOf(data, size));
     require(isPropertyList(fuzz::textOf(data, size)) == static_cast<bool>(first), "what is a property list parses");
+    const auto plain = parsePlainPropertyList(fuzz::textOf(data, size));
+    require(!plain || CSKavellEqual(plain.get(), parseAnyPropertyList(fuzz::textOf(data, size)).get()),
+            "both readers answer the same value");
     std::string xml;
     if (!first || !writePropertyList(first.get(), xml))
         return 0;

@@ -1,0 +1,297 @@
+// SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
+// SPDX-License-Identifier: LGPL-2.1-or-later
+
+#include "platform/plain_property_list.h"
+
+#include <array>
+#include <charconv>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include <kavellaccounts/CSKavellArray.h>
+#include <kavellaccounts/CSKavellBoolean.h>
+#include <kavellaccounts/CSKavellData.h>
+#include <kavellaccounts/CSKavellNumber.h>
+
+#include "platform/data_file.h"
+#include "platform/key_pool.h"
+#include "platform/property_list_guard.h"
+#include "runtime/dictionary_p.h"
+#include "runtime/string_p.h"
+#include "runtime/utf8.h"
+
+namespace kavell {
+
+namespace {
+
+/// How deep containers may stand in one another here. Each takes a frame of the stack; what is deeper is not plain.
+constexpr int kDeepestContainer = 32;
+
+/// What a byte of text means to the reader.
+enum class Byte : uint8_t { Plain, NotASCII, Reference, Markup, Unfit };
+
+constexpr std::array<Byte, 256> makeByteTable()
+{
+    std::array<Byte, 256> table{};
+    for (size_t byte = 0; byte < table.size(); ++byte)
+        table[byte] = byte < 0x20 ? Byte::Unfit : byte < 0x80 ? Byte::Plain : Byte::NotASCII;
+    table['\t'] = table['\n'] = Byte::Plain;
+    table['&'] = Byte::Reference;
+    table['<'] = Byte::Markup;
+    return table;
+}
+
+constexpr std::array<Byte, 256> kBytes = makeByteTable();
+
+/// The references by name (XML 1.0, section 4.6).
+constexpr std::array<std::pair<std::string_view, char>, 5> kReferences{
+    {{"&amp;", '&'}, {"&lt;", '<'}, {"&gt;", '>'}, {"&quot;", '"'}, {"&apos;", '\''}}};
+
+constexpr int kNoDigit = -1;
+
+constexpr int base64Digit(char character) noexcept
+{
+    if (character >= 'A' && character <= 'Z')
+        return character - 'A';
+    if (character >= 'a' && character <= 'z')
+        return character - 'a' + 26;
+    if (character >= '0' && character <= '9')
+        return character - '0' + 52;
+    return character == '+' ? 62 : character == '/' ? 63 : kNoDigit;
+}
+
+/// Reads one document from its start to its end. Each member that answers a bool or a value passes what it has read, and
+/// answers false or none for what is not plain.
+class PlainReader {
+public:
+    explicit PlainReader(std::string_view xml) : m_rest(xml) { m_pairs.reserve(32); }
+
+    [[nodiscard]] Ref<CSKavellMutableDictionaryRef> document()
+    {
+        if (!passPrologue() || !pass("<dict>"))
+            return nullptr;
+        auto root = dictionary(0);
+        passBlanks();
+        const bool isClosed = root && pass("</plist>");
+        passBlanks();
+        return isClosed && m_rest.empty() ? std::move(root) : nullptr;
+    }
+
+private:
+    using Value = Ref<CSKavellTypeRef>;
+
+    bool pass(std::string_view text) noexcept
+    {
+        if (!m_rest.starts_with(text))
+            return false;
+        m_rest.remove_prefix(text.size());
+        return true;
+    }
+
+    void passBlanks() noexcept
+    {
+        size_t count = 0;
+        while (count < m_rest.size() && (m_rest[count] == '\n' || m_rest[count] == '\t' || m_rest[count] == ' '))
+            ++count;
+        m_rest.remove_prefix(count);
+    }
+
+    bool passPrologue() noexcept
+    {
+        return pass("<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n") && pass("<!DOCTYPE plist PUBLIC ") &&
+               passIdentifier() && pass(" ") && passIdentifier() && pass(">\n<plist version=\"1.0\">\n");
+    }
+
+    /// One of the two identifiers of a document type, in its quotes.
+    bool passIdentifier() noexcept
+    {
+        constexpr std::string_view kCharacters = "ABCDEFGHIJKLMNOPQRSTUVWXYZabcdefghijklmnopqrstuvwxyz0123456789 /.:-";
+        if (!pass("\""))
+            return false;
+        m_rest.remove_prefix(std::min(m_rest.find_first_not_of(kCharacters), m_rest.size()));
+        return pass("\"");
+    }
+
+    /// What stands up to the element's end; a view into the document or, where references stood in it, into m_decoded.
+    bool text(std::string_view end, std::string_view &result)
+    {
+        size_t length = 0;
+        bool isASCII = true;
+        for (;; ++length) {
+            if (length == m_rest.size())
+                return false;
+            const Byte byte = kBytes[static_cast<unsigned char>(m_rest[length])];
+            if (byte == Byte::Plain)
+                continue;
+            if (byte == Byte::Reference)
+                return decodedText(end, result);
+            if (byte != Byte::NotASCII)
+                break;
+            isASCII = false;
+        }
+        result = m_rest.substr(0, length);
+        m_rest.remove_prefix(length);
+        return pass(end) && (isASCII || isUTF8(result));
+    }
+
+    bool decodedText(std::string_view end, std::string_view &result)
+    {
+        m_decoded.clear();
+        while (!m_rest.empty() && m_rest.front() != '<') {
+            const Byte byte = kBytes[static_cast<unsigned char>(m_rest.front())];
+            if (byte == Byte::Unfit || (byte == Byte::Reference && !passReference()))
+                return false;
+            if (byte == Byte::Reference)
+                continue;
+            m_decoded += m_rest.front();
+            m_rest.remove_prefix(1);
+        }
+        result = m_decoded;
+        return pass(end) && isUTF8(result);
+    }
+
+    bool passReference()
+    {
+        for (const auto &[reference, character] : kReferences) {
+            if (pass(reference)) {
+                m_decoded += character;
+                return true;
+            }
+        }
+        return false;
+    }
+
+    [[nodiscard]] Value value(int depth)
+    {
+        if (pass("<string>"))
+            return string();
+        if (pass("<integer>"))
+            return integer();
+        if (pass("<true/>"))
+            return retain<CSKavellTypeRef>(CSKavellBooleanGetShared(true));
+        if (pass("<false/>"))
+            return retain<CSKavellTypeRef>(CSKavellBooleanGetShared(false));
+        if (pass("<dict>"))
+            return Value(dictionary(depth + 1));
+        if (pass("<dict/>"))
+            return adopt<CSKavellTypeRef>(CSKavellDictionaryCreateMutable());
+        if (pass("<array>"))
+            return array(depth + 1);
+        if (pass("<array/>"))
+            return adopt<CSKavellTypeRef>(CSKavellArrayCreateMutable());
+        return pass("<data>") ? data() : nullptr;
+    }
+
+    [[nodiscard]] Value string()
+    {
+        std::string_view characters;
+        return text("</string>", characters) ? adopt<CSKavellTypeRef>(makeValidString(nullptr, characters)) : nullptr;
+    }
+
+    /// A number as a writer writes it: "0", or digits that do not begin with one.
+    [[nodiscard]] Value integer()
+    {
+        int64_t number = 0;
+        const char *const first = m_rest.data(), *const last = first + m_rest.size();
+        const char *const digits = m_rest.starts_with('-') ? first + 1 : first;
+        const auto [end, error] = std::from_chars(first, last, number);
+        if (error != std::errc() || (*digits == '0' && (end != first + 1 || digits != first)))
+            return nullptr;
+        m_rest.remove_prefix(static_cast<size_t>(end - first));
+        return pass("</integer>") ? adopt<CSKavellTypeRef>(CSKavellNumberCreateWithInt64(number)) : nullptr;
+    }
+
+    /// Whole groups of base64 (RFC 4648, section 4), with blanks between its digits.
+    [[nodiscard]] Value data()
+    {
+        std::string bytes;
+        unsigned bits = 0;
+        int count = 0, padding = 0;
+        for (; !m_rest.empty() && m_rest.front() != '<'; m_rest.remove_prefix(1)) {
+            const char character = m_rest.front();
+            if (character == '\n' || character == '\t' || character == ' ')
+                continue;
+            const int digit = base64Digit(character);
+            padding += character == '=';
+            if ((digit == kNoDigit && character != '=') || (digit != kNoDigit && padding > 0) || padding > 2)
+                return nullptr;
+            bits = bits << 6 | static_cast<unsigned>(digit == kNoDigit ? 0 : digit);
+            if (++count % 4 != 0)
+                continue;
+            for (int shift = 16; shift >= 0; shift -= 8)
+                bytes += static_cast<char>(bits >> shift);
+        }
+        if (count % 4 != 0 || !pass("</data>"))
+            return nullptr;
+        // The padding stands for bytes that are not there; bits in their place are no writer's.
+        for (; padding > 0; --padding) {
+            if (bytes.back() != '\0')
+                return nullptr;
+            bytes.pop_back();
+        }
+        return adopt<CSKavellTypeRef>(CSKavellDataCreate(bytes.data(), bytes.size()));
+    }
+
+    [[nodiscard]] Value array(int depth)
+    {
+        const auto result = adopt(CSKavellArrayCreateMutable());
+        for (passBlanks(); result && depth < kDeepestContainer && !pass("</array>"); passBlanks()) {
+            const Value element = value(depth);
+            if (!element)
+                return nullptr;
+            CSKavellArrayAppendValue(result.get(), element.get());
+        }
+        return depth < kDeepestContainer ? Value(result) : nullptr;
+    }
+
+    [[nodiscard]] Ref<CSKavellMutableDictionaryRef> dictionary(int depth)
+    {
+        const size_t first = m_pairs.size();
+        if (depth >= kDeepestContainer || !pairs(depth))
+            return nullptr;
+        auto result = adopt(CSKavellDictionaryCreateMutable());
+        const size_t count = m_pairs.size() - first;
+        if (!result || (m_keys += count) > kMostKeys)
+            return nullptr;
+        result->reserve(count);
+        for (size_t index = first; index < m_pairs.size(); ++index)
+            result->take(std::move(m_pairs[index].first), std::move(m_pairs[index].second));
+        m_pairs.resize(first);
+        // No writer writes a key twice.
+        return result->count == count ? std::move(result) : nullptr;
+    }
+
+    /// Adds the pairs up to the dictionary's end to m_pairs.
+    bool pairs(int depth)
+    {
+        for (passBlanks(); !pass("</dict>"); passBlanks()) {
+            std::string_view keyText;
+            if (!pass("<key>") || !text("</key>", keyText))
+                return false;
+            Value key(m_keyMaker.key(keyText));
+            passBlanks();
+            Value pairValue = value(depth);
+            if (!key || !pairValue)
+                return false;
+            m_pairs.emplace_back(std::move(key), std::move(pairValue));
+        }
+        return true;
+    }
+
+    std::string_view m_rest;
+    std::string m_decoded;
+    /// Those of all dictionaries that are not closed yet, so that each is made with exactly the room that it needs.
+    std::vector<std::pair<Value, Value>> m_pairs;
+    size_t m_keys = 0;
+    KeyMaker m_keyMaker;
+};
+
+}  // namespace
+
+Ref<CSKavellMutableDictionaryRef> parsePlainPropertyList(std::string_view xml)
+{
+    return xml.size() <= kLargestDataFile ? PlainReader(xml).document() : nullptr;
+}
+
+}  // namespace kavell
