@@ -5,7 +5,11 @@
 // when the threads ask for them.
 
 #include <array>
+#include <barrier>
+#include <deque>
+#include <set>
 
+#include "runtime/object_p.h"
 #include "tests/runtime/values.h"
 #include "tests/support/threads.h"
 
@@ -39,6 +43,32 @@ TEST(Threads, ATypeAskedForByAllAtOnceIsRegisteredOnce)
     EXPECT_STREQ(CSKavellTypeIDGetName(answers[0][2]), "CSKavellAccountSettings");
 }
 
+TEST(Threads, TypesThatAreRegisteredTogetherGetOneNumberEach)
+{
+    constexpr size_t rounds = 16;
+    static constexpr TypeOperations operations{.name = "Registered by many"};
+    static std::deque<LazyType> types;  // which stay registered
+    for (size_t index = 0; index < 2 * rounds; ++index)
+        types.emplace_back(operations);
+    std::array<std::array<CSKavellTypeID, rounds>, kThreads> answers;
+    std::barrier next(kThreads);
+    onAllThreads([&](int index) {
+        for (size_t round = 0; round < rounds; ++round) {
+            next.arrive_and_wait();
+            const size_t asked = 2 * round + static_cast<size_t>(index % 2);  // half of the threads ask for each
+            answers[static_cast<size_t>(index)][round] = types[asked].typeID();
+        }
+    });
+    std::set<CSKavellTypeID> numbers(answers[0].begin(), answers[0].end());
+    numbers.insert(answers[1].begin(), answers[1].end());
+    EXPECT_EQ(numbers.size(), 2 * rounds);
+    EXPECT_EQ(*numbers.rbegin() - *numbers.begin(), 2 * rounds - 1);
+    for (size_t index = 0; index < kThreads; ++index)
+        EXPECT_EQ(answers[index], answers[index % 2]);
+    for (const CSKavellTypeID number : numbers)
+        EXPECT_STREQ(CSKavellTypeIDGetName(number), "Registered by many");
+}
+
 TEST(Threads, TypesKeepTheirNamesWhileOthersAreRegistered)
 {
     const CSKavellTypeID known[] = {CSKavellStringGetTypeID(), CSKavellDictionaryGetTypeID(), CSKavellUUIDGetTypeID()};
@@ -52,7 +82,7 @@ TEST(Threads, TypesKeepTheirNamesWhileOthersAreRegistered)
             EXPECT_STREQ(CSKavellTypeIDGetName(known[0]), "CSKavellString");
             EXPECT_STREQ(CSKavellTypeIDGetName(known[1]), "CSKavellDictionary");
             EXPECT_STREQ(CSKavellTypeIDGetName(known[2]), "CSKavellUUID");
-            EXPECT_EQ(CSKavellTypeIDGetName(60), nullptr);
+            EXPECT_EQ(CSKavellTypeIDGetName(0), nullptr);
         }
     });
 }
