@@ -100,6 +100,15 @@ bool syncData(int file) noexcept
     return withoutInterruption([&] { return fdatasync(file); }) == 0;
 }
 
+/// Makes what was written durable, and the file its owner's alone; `isPrivate` when it certainly is already.
+bool makeDurable(int file, bool isPrivate) noexcept
+{
+    if (isPrivate)
+        return syncData(file);
+    // Syncing the data leaves permissions out.
+    return fchmod(file, 0600) == 0 && withoutInterruption([&] { return fsync(file); }) == 0;
+}
+
 /// A redo record that was found, read and judged.
 struct FoundRecord {
     std::string newContents;
@@ -138,7 +147,8 @@ bool settleRecord(int file, const std::string &recordPath)
         return false;
     struct stat status;
     if (found->verdict == RedoVerdict::Finish &&
-        (fstat(file, &status) != 0 || !overwrite(file, found->newContents, status.st_size) || !syncData(file)))
+        (fstat(file, &status) != 0 || !overwrite(file, found->newContents, status.st_size) ||
+         !makeDurable(file, false)))
         return false;
     return unlink(recordPath.c_str()) == 0;
 }
@@ -192,7 +202,8 @@ bool replaceInPlace(int file, const char *path, std::string_view contents, Intac
         unlink(recordPath.c_str());
         return false;
     }
-    if (overwrite(file, contents, status.st_size) && fchmod(file, 0600) == 0 && stampFile(file) && syncData(file))
+    if (overwrite(file, contents, status.st_size) && stampFile(file) &&
+        makeDurable(file, (status.st_mode & 07777) == 0600))
         return unlink(recordPath.c_str()) == 0 || errno == ENOENT;
     // Back to the old contents where they are known and can be put back; else the record stays and is finished later.
     if (record.oldContents && overwrite(file, oldContents, static_cast<off_t>(contents.size())) && syncData(file))

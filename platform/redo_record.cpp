@@ -30,7 +30,8 @@ uint64_t integerAt(std::string_view bytes, size_t offset) noexcept
 }
 
 /// Whether an interrupted replacement of the old by the new contents can have left these: each byte is the old one, the
-/// new one, or, past the old end, a zero that was not filled yet.
+/// new one, or, past the end of either, a zero: one that was not filled yet, or one that was cleared before the file
+/// became shorter.
 bool isMix(std::string_view oldContents, std::string_view newContents, std::string_view contents) noexcept
 {
     if (contents.size() < std::min(oldContents.size(), newContents.size()) ||
@@ -38,7 +39,7 @@ bool isMix(std::string_view oldContents, std::string_view newContents, std::stri
         return false;
     for (size_t place = 0; place < contents.size(); ++place) {
         const bool isOld = place < oldContents.size() ? contents[place] == oldContents[place] : contents[place] == '\0';
-        const bool isNew = place < newContents.size() && contents[place] == newContents[place];
+        const bool isNew = place < newContents.size() ? contents[place] == newContents[place] : contents[place] == '\0';
         if (!isOld && !isNew)
             return false;
     }
@@ -84,8 +85,9 @@ std::optional<RedoRecord> decodeRedoRecord(std::string_view bytes) noexcept
 
 RedoVerdict judgeRedoRecord(const RedoRecord &record, ino_t inode, std::string_view contents) noexcept
 {
-    if (record.inode != inode || contents == record.newContents)
+    if (record.inode != inode)
         return RedoVerdict::Discard;
+    // The new contents whole are a mix too: their permissions may not be what they are to be yet.
     if (!record.oldContents || isMix(*record.oldContents, record.newContents, contents))
         return RedoVerdict::Finish;
     return RedoVerdict::Discard;

@@ -8,12 +8,13 @@
 //
 //     record                                data file              is settled by
 //     torn, or of another inode             anything               deleting the record: the data file was not touched
-//     whole                                 the new contents       deleting the record
-//     whole                                 a mix of old and new   writing the new contents, then deleting the record
+//     whole                                 a mix of old and new   writing the new contents, with permissions 0600,
+//                                                                  then deleting the record
 //     whole                                 anything else          deleting the record: another program wrote since
 //
 // "A mix" is decided byte by byte, so that no tear, at whatever place, is taken for another program's work, and the
-// other way round. The zeros of a file that grew without its bytes count as torn.
+// other way round. The zeros of a file that grew without its bytes count as torn, and so do those that a file system
+// puts behind the new end of a file that becomes shorter, which may be on the disk before the new size is.
 //
 //     offset  bytes
 //          0  8   "KAVREDO1"

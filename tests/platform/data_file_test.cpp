@@ -90,6 +90,29 @@ TEST_F(DataFile, AFileThatGrewWithoutItsBytesIsFinished)
     EXPECT_EQ(read(), kNew);
 }
 
+TEST_F(DataFile, AFileThatWasClearedBeforeItShrankIsFinished)
+{
+    constexpr std::string_view kShorter = "shorter";
+    RedoRecord record;
+    writeFile(m_path, std::string(kShorter) + std::string(kOld.size() - kShorter.size(), '\0'));
+    record.inode = inode();
+    record.oldContents = kOld;
+    record.newContents = kShorter;
+    writeFile(m_recordPath, encodeRedoRecord(record));
+    EXPECT_EQ(read(), kShorter);
+    EXPECT_EQ(readFile(m_path), kShorter);
+    EXPECT_FALSE(hasRecord());
+}
+
+TEST_F(DataFile, AFinishedReplacementIsItsOwnersAlone)
+{
+    writeFile(m_path, kNew);
+    leaveRecord(inode());
+    EXPECT_EQ(chmod(m_path.c_str(), 0644), 0);
+    EXPECT_EQ(read(), kNew);
+    EXPECT_EQ(std::filesystem::status(m_path).permissions(), std::filesystem::perms(0600));
+}
+
 TEST_F(DataFile, AFinishedReplacementOnlyLosesItsRecord)
 {
     writeFile(m_path, kNew);
