@@ -342,20 +342,4 @@ bool removeDataFile(const char *path) noexcept
     });
 }
 
-void createDirectoriesAbove(const char *path) noexcept
-{
-    guarded([&] {
-        const std::string_view view(path);
-        for (size_t slash = view.find('/', 1); slash != std::string_view::npos; slash = view.find('/', slash + 1)) {
-            const std::string directory(view.substr(0, slash));
-            struct stat status;
-            if (stat(directory.c_str(), &status) == 0 || mkdir(directory.c_str(), 0700) != 0)
-                continue;
-            // The process's file mode mask may have taken bits away.
-            chmod(directory.c_str(), 0700);
-            static_cast<void>(syncDirectoryOf(directory.c_str()));
-        }
-    });
-}
-
 }  // namespace kavell

@@ -52,9 +52,6 @@ using IntactCheck = bool (*)(std::string_view contents) noexcept;
 /// Deletes the file, durably; false when it could not be deleted.
 [[nodiscard]] bool removeDataFile(const char *path) noexcept;
 
-/// Creates each missing directory above the path, with permissions 0700. Failures show when the file is written.
-void createDirectoriesAbove(const char *path) noexcept;
-
 /// What the names begin with that this code gives to files beside a data file; none of them ends in ".plist". Each is
 /// followed by 16 hexadecimal digits, the hash of the data file's name.
 inline constexpr std::string_view kRedoRecordPrefix = ".redo-";

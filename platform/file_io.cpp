@@ -5,6 +5,9 @@
 
 #include <algorithm>
 #include <fcntl.h>
+#include <mutex>
+#include <new>
+#include <sys/stat.h>
 
 namespace kavell {
 
@@ -59,6 +62,64 @@ void FileContents::assign(std::string_view bytes)
 {
     m_large.assign(bytes);
     m_smallLength = 0;
+}
+
+namespace {
+
+/// The directories whose names, all the way from the root, this process has made sure are on the disk: the last few.
+class DurableDirectories {
+public:
+    [[nodiscard]] bool contains(const struct stat &status)
+    {
+        const std::lock_guard lock(m_mutex);
+        return std::find(m_directories.begin(), m_directories.end(), Directory{status.st_dev, status.st_ino}) !=
+               m_directories.end();
+    }
+
+    void add(const struct stat &status)
+    {
+        const std::lock_guard lock(m_mutex);
+        m_directories[m_next++ % m_directories.size()] = {status.st_dev, status.st_ino};
+    }
+
+private:
+    using Directory = std::pair<dev_t, ino_t>;
+
+    std::mutex m_mutex;
+    std::array<Directory, 8> m_directories{};
+    size_t m_next = 0;
+};
+
+constinit DurableDirectories durableDirectories;
+
+/// Makes the directory unless it stands. False when its name is not certain to be on the disk.
+bool makeDirectory(const std::string &path) noexcept
+{
+    struct stat status;
+    const bool isMade = stat(path.c_str(), &status) != 0 && mkdir(path.c_str(), 0700) == 0;
+    // The process's file mode mask may have taken bits away.
+    if (isMade)
+        chmod(path.c_str(), 0700);
+    // Also where it stood already: whoever made it may have died before this. Not every directory may be opened, though.
+    return syncDirectoryOf(path.c_str()) || !isMade;
+}
+
+}  // namespace
+
+void createDirectoriesAbove(const char *path) noexcept
+try {
+    const std::string_view view(path);
+    const std::string directory(view.substr(0, view.rfind('/') + 1));
+    struct stat status;
+    if (stat(directory.c_str(), &status) == 0 && durableDirectories.contains(status))
+        return;
+    bool isDurable = true;
+    for (size_t slash = view.find('/', 1); slash != std::string_view::npos; slash = view.find('/', slash + 1))
+        isDurable = makeDirectory(std::string(view.substr(0, slash))) && isDurable;
+    if (isDurable && stat(directory.c_str(), &status) == 0)
+        durableDirectories.add(status);
+} catch (const std::bad_alloc &) {
+    // Without its directory the file cannot be made, which is reported then.
 }
 
 bool syncDirectoryOf(const char *path) noexcept

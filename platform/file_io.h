@@ -71,6 +71,10 @@ private:
     std::string m_large;  ///< instead of m_small, when it is not empty
 };
 
+/// Creates each missing directory above the path, with permissions 0700, and makes sure once in a process that their
+/// names are on the disk. Failures show when a file is made there.
+void createDirectoriesAbove(const char *path) noexcept;
+
 /// Makes names created, renamed and deleted in the directory of a path durable.
 [[nodiscard]] bool syncDirectoryOf(const char *path) noexcept;
 

@@ -32,12 +32,6 @@ std::string hiddenSibling(const std::string &path, const char *suffix)
     return path.substr(0, name) + "." + path.substr(name) + suffix;
 }
 
-void makeDirectoriesAbove(const std::string &path)
-{
-    for (size_t slash = path.find('/', 1); slash != std::string::npos; slash = path.find('/', slash + 1))
-        mkdir(path.substr(0, slash).c_str(), 0700);
-}
-
 PreferencesStamp stampOf(const struct stat &status)
 {
     return {status.st_dev, status.st_ino, status.st_size, status.st_mtim.tv_sec, status.st_mtim.tv_nsec};
@@ -81,7 +75,7 @@ std::string preferencesPath(const std::string &domain)
 PreferencesLock::PreferencesLock(const std::string &path, std::chrono::milliseconds bound)
 {
     const auto deadline = std::chrono::steady_clock::now() + bound;
-    makeDirectoriesAbove(path);
+    createDirectoriesAbove(path.c_str());
     m_file = FileDescriptor(
         open(hiddenSibling(path, ".lock").c_str(), O_RDWR | O_CREAT | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK, 0600));
     m_error = m_file ? lockUntil(m_file.get(), deadline) : errno;

@@ -32,13 +32,10 @@ std::string credentialDirectory()
 
 bool makeCredentialDirectory()
 {
-    const std::string path = credentialDirectory();
-    for (size_t slash = path.find('/', 1); slash != std::string::npos; slash = path.find('/', slash + 1))
-        ::mkdir(path.substr(0, slash).c_str(), 0700);
-    if (::mkdir(path.c_str(), 0700) == 0)
-        return true;
+    const std::string path = credentialDirectory() + "/";
+    createDirectoriesAbove(path.c_str());
     struct stat status {};
-    return errno == EEXIST && ::stat(path.c_str(), &status) == 0 && S_ISDIR(status.st_mode);
+    return ::stat(path.c_str(), &status) == 0 && S_ISDIR(status.st_mode);
 }
 
 FileLock::FileLock(const std::string &name, const Deadline &deadline)
