@@ -130,7 +130,8 @@ std::string setDamagedFileAside(const std::string &path)
     std::string aside = base;
     for (int number = 2; access(aside.c_str(), F_OK) == 0; ++number)
         aside = base + "-" + std::to_string(number);
-    return std::rename(path.c_str(), aside.c_str()) == 0 ? aside : std::string();
+    // Before another file takes the name: a power cut that keeps only the later change would lose the damaged one.
+    return std::rename(path.c_str(), aside.c_str()) == 0 && syncDirectoryOf(aside.c_str()) ? aside : std::string();
 }
 
 std::optional<PreferencesStamp> replacePreferencesFile(const std::string &path, std::string_view xml)
