@@ -28,13 +28,12 @@ void tryRecord(std::string_view bytes)
     if (!record)
         return;
     require(encodeRedoRecord(*record) == bytes, "a record has one form only");
-    require(judgeRedoRecord(*record, record->inode, record->newContents) == RedoVerdict::Discard,
-            "what is finished is not finished again");
+    require(judgeRedoRecord(*record, record->inode, record->newContents) == RedoVerdict::Finish,
+            "new contents that may lack their permissions are finished");
     require(judgeRedoRecord(*record, record->inode + 1, "x") == RedoVerdict::Discard,
             "another file's record does not count");
     const std::string torn = tornContents(record->oldContents.value_or("x"), record->newContents);
-    if (torn != record->newContents)
-        require(judgeRedoRecord(*record, record->inode, torn) == RedoVerdict::Finish, "a torn file is finished");
+    require(judgeRedoRecord(*record, record->inode, torn) == RedoVerdict::Finish, "a torn file is finished");
 }
 
 }  // namespace
