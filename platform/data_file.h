@@ -18,6 +18,7 @@
 #include <string_view>
 
 #include "platform/file_io.h"
+#include "platform/property_list_guard.h"
 
 namespace kavell {
 
@@ -30,7 +31,7 @@ struct FileTime {
 };
 
 /// The largest file that is read or written, in bytes. A larger one counts as damaged.
-inline constexpr size_t kLargestDataFile = size_t{32} << 20;
+inline constexpr size_t kLargestDataFile = kLargestPropertyList;
 
 enum class FileRead {
     Done,      ///< the contents are there

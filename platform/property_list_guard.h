@@ -14,6 +14,9 @@
 
 namespace kavell {
 
+/// The largest document in bytes, far more than any honest one has. What is larger need not even be read.
+inline constexpr size_t kLargestPropertyList = size_t{32} << 20;
+
 /// How deep elements may stand in one another. The writer's recursion needs about 256 bytes of stack a level; this
 /// leaves room on the smallest thread stacks in use.
 inline constexpr int kDeepestPropertyList = 256;

@@ -9,6 +9,7 @@
 #include <kavellaccounts/CSKavellPropertyList.h>
 #include <kavellaccounts/Ref.h>
 
+#include "platform/property_list_guard.h"
 #include "platform/qt/value_conversion.h"
 
 namespace kavell {
@@ -17,6 +18,8 @@ std::optional<QVariantMap> readPropertyList(const QString &path)
 {
     QFile file(path);
     if (!QFileInfo(path).isFile() || !file.open(QIODevice::ReadOnly))
+        return std::nullopt;
+    if (file.size() > static_cast<qint64>(kLargestPropertyList))
         return std::nullopt;
     const QByteArray bytes = file.readAll();
     const auto dictionary =

@@ -13,7 +13,8 @@
 
 namespace kavell {
 
-/// The dictionary in an XML property-list file; nothing when it cannot be read, is no regular file, or holds none.
+/// The dictionary in an XML property-list file; nothing when it cannot be read, is no regular file, is larger than any
+/// property list, or holds none.
 [[nodiscard]] std::optional<QVariantMap> readPropertyList(const QString &path);
 
 }  // namespace kavell

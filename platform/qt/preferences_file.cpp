@@ -17,13 +17,11 @@
 #include <kavellaccounts/CSKavellPropertyList.h>
 
 #include "platform/home_directory.h"
+#include "platform/property_list_guard.h"
 
 namespace kavell {
 
 namespace {
-
-// A larger file is no property list that would be parsed.
-constexpr size_t kLargestFile = size_t{32} << 20;
 
 /// A hidden file beside the preferences file.
 std::string hiddenSibling(const std::string &path, const char *suffix)
@@ -109,7 +107,7 @@ std::optional<PreferencesContents> readPreferencesFile(const std::string &path)
         return std::nullopt;
     errno = EINVAL;
     FileContents bytes;
-    if (!S_ISREG(status.st_mode) || !bytes.read(file.get(), kLargestFile))
+    if (!S_ISREG(status.st_mode) || !bytes.read(file.get(), kLargestPropertyList))
         return std::nullopt;
     contents.stamp = stampOf(status);
     const auto found = adopt(CSKavellPropertyListCreateDictionary(bytes.view().data(), bytes.view().size()));

@@ -62,6 +62,14 @@ TEST(KABundle, FindsResourcesByNameAndType)
     EXPECT_TRUE(exampleBundle()->pathForResource("domains", "txt").isNull());
 }
 
+TEST(KABundle, InformationThatNoMemoryHoldsIsNone)
+{
+    const QTemporaryDir directory;
+    writeInformation(directory.path(), {});
+    ASSERT_TRUE(QFile::resize(directory.path() + "/Contents/Info.plist", qint64{1} << 40));
+    EXPECT_FALSE(KABundle::bundleWithPath(directory.path()));
+}
+
 TEST(KABundle, WithoutReadableInformationIsNone)
 {
     const QTemporaryDir directory;
