@@ -60,11 +60,11 @@ public:
     /// Opens the file that has the path and takes its flock; none, with errno, when either fails. Opening never waits,
     /// whatever the path names. A file that was deleted while its flock was waited for is not the one that has the path,
     /// and must not be written to; for reading, it is as good as the moment before.
-    LockedFile(const char *path, int access) noexcept
+    LockedFile(const char *path, int access, int directory = AT_FDCWD) noexcept
     {
         for (int attempt = 0; attempt < kMostAttempts; ++attempt) {
-            m_file = FileDescriptor(
-                withoutInterruption([&] { return open(path, access | O_CLOEXEC | O_NONBLOCK | O_NOCTTY); }));
+            m_file = FileDescriptor(withoutInterruption(
+                [&] { return openat(directory, path, access | O_CLOEXEC | O_NONBLOCK | O_NOCTTY); }));
             if (m_file && !lockFile(m_file.get()))
                 m_file = FileDescriptor();
             if (!m_file || access == O_RDONLY || !wasUnlinked(m_file.get()))
@@ -132,9 +132,9 @@ std::optional<FoundRecord> findRecord(int file, const std::string &recordPath)
     return found;
 }
 
-bool hasRecord(const std::string &recordPath) noexcept
+bool hasRecord(const std::string &recordPath, int directory = AT_FDCWD) noexcept
 {
-    return access(recordPath.c_str(), F_OK) == 0;
+    return faccessat(directory, recordPath.c_str(), F_OK, 0) == 0;
 }
 
 /// Settles a redo record, if there is one, on a file that is open for writing. False when that could not be done.
@@ -250,19 +250,21 @@ Creation createWhole(const char *path, std::string_view contents)
 }
 
 /// The contents of a file that has no redo record; none when it has one.
-std::optional<FileRead> readWithoutRecord(const char *path, const std::string &recordPath, FileContents &contents)
+std::optional<FileRead> readWithoutRecord(const char *path, FileContents &contents, int directory)
 {
-    const LockedFile file(path, O_RDONLY);
+    const char *const name = nameIn(directory, path);
+    const LockedFile file(name, O_RDONLY, directory);
     if (!file)
         return FileRead::Failed;
-    if (hasRecord(recordPath))
+    if (hasRecord(siblingPath(name, kRedoRecordPrefix), directory))
         return std::nullopt;
     return contents.read(file.get(), kLargestDataFile) ? FileRead::Done : FileRead::Failed;
 }
 
 /// The contents of a file that has a redo record, settling the record where this process may write.
-FileRead readWithRecord(const char *path, const std::string &recordPath, FileContents &contents)
+FileRead readWithRecord(const char *path, FileContents &contents)
 {
+    const std::string recordPath = siblingPath(path, kRedoRecordPrefix);
     if (const LockedFile writable(path, O_RDWR); writable) {
         if (!settleRecord(writable.get(), recordPath))
             return FileRead::Failed;
@@ -295,12 +297,11 @@ std::string siblingPath(std::string_view path, std::string_view prefix)
     return sibling;
 }
 
-FileRead readDataFile(const char *path, FileContents &contents) noexcept
+FileRead readDataFile(const char *path, FileContents &contents, int directory) noexcept
 {
     return guarded(FileRead::Failed, [&] {
-        const std::string recordPath = siblingPath(path, kRedoRecordPrefix);
-        const auto unhindered = readWithoutRecord(path, recordPath, contents);
-        const FileRead result = unhindered ? *unhindered : readWithRecord(path, recordPath, contents);
+        const auto unhindered = readWithoutRecord(path, contents, directory);
+        const FileRead result = unhindered ? *unhindered : readWithRecord(path, contents);
         return result == FileRead::Done && contents.view().size() > kLargestDataFile ? FileRead::TooLarge : result;
     });
 }

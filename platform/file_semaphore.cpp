@@ -31,6 +31,12 @@ void spendIdentifierZero() noexcept
     });
 }
 
+/// The key that ftok(path, 0) makes of a file's status, which the caller has at hand: ftok would ask the kernel again.
+key_t keyOf(const struct stat &status) noexcept
+{
+    return static_cast<key_t>((status.st_ino & 0xFFFF) | (status.st_dev & 0xFF) << 16);
+}
+
 bool operateOnSemaphore(int32_t semaphoreID, short change) noexcept
 {
     sembuf operation{0, change, 0};
@@ -39,12 +45,12 @@ bool operateOnSemaphore(int32_t semaphoreID, short change) noexcept
 
 }  // namespace
 
-std::optional<int32_t> obtainFileSemaphore(const char *path) noexcept
+std::optional<int32_t> obtainFileSemaphore(const struct stat *status) noexcept
 {
     spendIdentifierZero();
-    // The failure value is a key like any other, deliberately unchecked: records of files that do not exist yet meet in
-    // it.
-    const key_t key = path ? ftok(path, 0) : -1;
+    // What ftok answers for a missing file is a key like any other, deliberately: records of files that do not exist yet
+    // meet in it.
+    const key_t key = status ? keyOf(*status) : -1;
     int set = semget(key, 0, 0);
     if (set >= 0)
         return set;

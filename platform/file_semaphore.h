@@ -10,12 +10,14 @@
 
 #include <cstdint>
 #include <optional>
+#include <sys/stat.h>
 
 namespace kavell {
 
-/// The identifier of the file's set, opened or created; none when neither could be done. A path of none or of a missing
-/// file has the key -1, which all such files share. The identifier may be 0, which callers never use.
-[[nodiscard]] std::optional<int32_t> obtainFileSemaphore(const char *path) noexcept;
+/// The identifier of the set of a file with this status, opened or created; none when neither could be done. A file
+/// that is missing, whose status is null, has the key -1, which all such files share. The identifier may be 0, which
+/// callers never use.
+[[nodiscard]] std::optional<int32_t> obtainFileSemaphore(const struct stat *status) noexcept;
 
 /// Waits for the semaphore without a bound and takes it. False when it was not taken: the set is gone, or a signal's
 /// handler ran meanwhile.

@@ -119,6 +119,12 @@ CSKavellTypeID _CSKavellAccountGetTypeID(void)
 CSKavellAccountRef _CSKavellAccountCreate(const CSKavellAllocator *allocator, CSKavellStringRef providerType,
                                           CSKavellStringRef loginName)
 {
+    return createAccountIn(AT_FDCWD, allocator, providerType, loginName);
+}
+
+CSKavellAccountRef kavell::createAccountIn(int directory, const CSKavellAllocator *allocator,
+                                           CSKavellStringRef providerType, CSKavellStringRef loginName) noexcept
+{
     if (CSKavellStringGetLength(providerType) == 0) {
         writeError("Error: No service provider specified in CSKavellAccountCreate\n");
         return nullptr;
@@ -139,7 +145,7 @@ CSKavellAccountRef _CSKavellAccountCreate(const CSKavellAllocator *allocator, CS
             return nullptr;
         account->dataFilePath = makeDataFilePath(providerType, loginName);
         const Guard guard(account->lock);
-        ReadAccountData(*account.get());
+        ReadAccountData(*account.get(), directory);
         if (!account->uuidString) {
             account->uuidString = freshUUIDString();
             account->hasChanges = true;

@@ -39,10 +39,11 @@ CSKavellDictionaryRef asDictionary(CSKavellTypeRef value) noexcept
 
 /// Queries the status of the data file; false, with errno, when it cannot be had. An account whose name cannot be a
 /// path has no file to query.
-bool queryStatus(const CSKavellAccount &account, struct stat &status) noexcept
+bool queryStatus(const CSKavellAccount &account, struct stat &status, int directory = AT_FDCWD) noexcept
 {
     errno = EINVAL;
-    return account.dataFilePath && stat(account.dataFilePath.get(), &status) == 0;
+    const char *const path = account.dataFilePath.get();
+    return path && fstatat(directory, nameIn(directory, path), &status, 0) == 0;
 }
 
 FileTime modificationTime(const struct stat &status) noexcept
@@ -51,13 +52,14 @@ FileTime modificationTime(const struct stat &status) noexcept
 }
 
 /// Reads the whole file under the semaphore; Failed when the semaphore could not be taken.
-FileRead readUnderSemaphore(CSKavellAccount &account, const struct stat &status, FileContents &contents) noexcept
+FileRead readUnderSemaphore(CSKavellAccount &account, int directory, const struct stat &status,
+                            FileContents &contents) noexcept
 {
-    if (!LockDatafileAccess(account))
+    if (!LockDatafileAccess(account, &status))
         return FileRead::Failed;
     // A pipe or a device would never end; only files hold accounts.
     const FileRead result =
-        S_ISREG(status.st_mode) ? readDataFile(account.dataFilePath.get(), contents) : FileRead::Failed;
+        S_ISREG(status.st_mode) ? readDataFile(account.dataFilePath.get(), contents, directory) : FileRead::Failed;
     UnlockDatafileAccess(account);
     return result;
 }
@@ -139,10 +141,10 @@ void deleteDataFile(const CSKavellAccount &account) noexcept
 /// Writes the file under the semaphore. When the semaphore cannot be taken nothing is written and nothing more is said.
 void writeUnderSemaphore(CSKavellAccount &account, std::string_view contents) noexcept
 {
-    if (!LockDatafileAccess(account))
+    struct stat status;
+    if (!LockDatafileAccess(account, queryStatus(account, status) ? &status : nullptr))
         return;
     if (writeDataFile(account.dataFilePath.get(), contents, isPropertyList)) {
-        struct stat status;
         if (queryStatus(account, status))
             account.dataFileModTime = modificationTime(status);
         account.hasChanges = false;
@@ -168,10 +170,10 @@ void saveDataFile(CSKavellAccount &account, CSKavellDictionaryRef propertyList) 
 
 }  // namespace
 
-bool ReadAccountData(CSKavellAccount &account) noexcept
+bool ReadAccountData(CSKavellAccount &account, int directory) noexcept
 {
     struct stat status;
-    if (!queryStatus(account, status)) {
+    if (!queryStatus(account, status, directory)) {
         const bool isMissing = errno == ENOENT;
         // The number is the call's result, not the system's error; programs compare the line as it is.
         if (!isMissing)
@@ -184,7 +186,7 @@ bool ReadAccountData(CSKavellAccount &account) noexcept
     if (modificationTime(status) == account.dataFileModTime)
         return true;
     FileContents contents;
-    const FileRead result = readUnderSemaphore(account, status, contents);
+    const FileRead result = readUnderSemaphore(account, directory, status, contents);
     if (result == FileRead::Failed)
         return true;
     const auto propertyList = result == FileRead::Done ? parsePropertyList(contents.view()) : nullptr;
@@ -215,10 +217,10 @@ void UpdateServiceAttributes(CSKavellAccount &account, CSKavellDictionaryRef fil
     dropServicesWithoutAttributes(account);
 }
 
-bool LockDatafileAccess(CSKavellAccount &account) noexcept
+bool LockDatafileAccess(CSKavellAccount &account, const struct stat *status) noexcept
 {
     if (account.semaphoreID == 0) {
-        const auto semaphoreID = obtainFileSemaphore(account.dataFilePath.get());
+        const auto semaphoreID = obtainFileSemaphore(status);
         if (!semaphoreID) {
             writeError("Error: unable to initialize Kavell Accounts data semaphore\n");
             return false;

@@ -74,6 +74,15 @@ void appendAccount(CSKavellAccountProvider &provider, CSKavellAccountRef account
     SetDictKey(provider.accountsByLoginName, loginName, account);
 }
 
+/// Makes an account record and lists it. None, with nothing listed, when that fails.
+CSKavellAccountRef addNewAccount(CSKavellAccountProvider &provider, CSKavellStringRef loginName, int directory) noexcept
+{
+    const auto account = adopt(createAccountIn(directory, nullptr, provider.providerType.get(), loginName));
+    if (account)
+        appendAccount(provider, account.get(), loginName);
+    return account.get();
+}
+
 CSKavellAccountRef accountOf(const CSKavellAccountProvider &provider, CSKavellStringRef loginName) noexcept
 {
     // Only accounts are ever put into this dictionary.
@@ -129,8 +138,8 @@ void CSKavellAccountProviderLoadAccountData(CSKavellAccountProvider &provider)
             continue;
         // A name that is not UTF-8 cannot be a login name, and answers none here.
         const auto loginName = makeString(name.substr(0, name.size() - kDataFileSuffix.size()));
-        if (loginName)
-            _CSKavellAccountProviderGetAccount(&provider, loginName.get(), true);
+        if (loginName && !accountOf(provider, loginName.get()))
+            addNewAccount(provider, loginName.get(), dirfd(directory.get()));
     }
 }
 
@@ -182,12 +191,8 @@ CSKavellAccountRef _CSKavellAccountProviderGetAccount(CSKavellAccountProviderRef
 {
     if (!provider)
         return nullptr;
-    if (CSKavellAccountRef existing = accountOf(*provider, loginName); existing || !create)
-        return existing;
-    const auto account = adopt(_CSKavellAccountCreate(nullptr, provider->providerType.get(), loginName));
-    if (account)
-        appendAccount(*provider, account.get(), loginName);
-    return account.get();
+    CSKavellAccountRef existing = accountOf(*provider, loginName);
+    return existing || !create ? existing : addNewAccount(*provider, loginName, AT_FDCWD);
 }
 
 CSKavellAccountRef _CSKavellAccountProviderCopyAccount(CSKavellAccountProviderRef provider, CSKavellStringRef loginName,

@@ -71,15 +71,21 @@ template <typename Body> void forEachService(const CSKavellAccount &account, Bod
 /// The absolute path of the directory that holds all accounts, without a closing "/".
 [[nodiscard]] std::string dataRootPath();
 
-/// Brings the committed side up to what the data file says. False on a real error, after its message.
-bool ReadAccountData(CSKavellAccount &account) noexcept;
+/// _CSKavellAccountCreate for an account whose provider's directory is open, as a descriptor; AT_FDCWD when it is not.
+[[nodiscard]] CSKavellAccountRef createAccountIn(int directory, const CSKavellAllocator *allocator,
+                                                 CSKavellStringRef providerType, CSKavellStringRef loginName) noexcept;
+
+/// Brings the committed side up to what the data file says. False on a real error, after its message. The directory is
+/// the file's, where that is open.
+bool ReadAccountData(CSKavellAccount &account, int directory = AT_FDCWD) noexcept;
 
 /// Replaces the committed side of every service by what the file's "Services" dictionary (may be none) says, taking its
 /// dictionaries over.
 void UpdateServiceAttributes(CSKavellAccount &account, CSKavellDictionaryRef fileServices) noexcept;
 
-/// Takes the semaphore of the data file, waiting for as long as it takes; false when it cannot be taken.
-[[nodiscard]] bool LockDatafileAccess(CSKavellAccount &account) noexcept;
+/// Takes the semaphore of the data file, waiting for as long as it takes; false when it cannot be taken. The status is the
+/// file's, from just before, or null when there is no file.
+[[nodiscard]] bool LockDatafileAccess(CSKavellAccount &account, const struct stat *status) noexcept;
 
 /// Gives the semaphore back.
 void UnlockDatafileAccess(CSKavellAccount &account) noexcept;
