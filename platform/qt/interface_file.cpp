@@ -3,8 +3,10 @@
 
 #include "platform/qt/interface_file.h"
 
+#include <QtCore/QBuffer>
 #include <QtCore/QFile>
 #include <QtCore/QMetaMethod>
+#include <QtCore/QXmlStreamReader>
 #include <QtUiTools/QUiLoader>
 #include <QtWidgets/QAbstractButton>
 
@@ -15,6 +17,30 @@
 namespace kavell {
 
 namespace {
+
+// More than any interface has, and far less than the toolkit's reader has stack for, which goes down by recursion.
+constexpr int kDeepestElement = 200;
+constexpr qint64 kLargestFile = 8 * 1024 * 1024;
+
+/// Whether elements stand too deep in one another. What else may be wrong with a file the toolkit's reader says.
+bool isTooDeep(const QByteArray &xml)
+{
+    QXmlStreamReader reader(xml);
+    for (int depth = 0; depth <= kDeepestElement;) {
+        switch (reader.readNext()) {
+        case QXmlStreamReader::StartElement:
+            ++depth;
+            break;
+        case QXmlStreamReader::EndElement:
+            --depth;
+            break;
+        default:
+            if (reader.atEnd())
+                return false;
+        }
+    }
+    return true;
+}
 
 /// Knows the reader's own classes of widgets besides the toolkit's.
 class WidgetLoader : public QUiLoader {
@@ -35,16 +61,33 @@ private:
     const InterfaceFile::WidgetMakers &m_makers;
 };
 
+/// The outermost widget of a file; null, with the reason, when there is none.
+QWidget *readWidgets(QUiLoader &loader, const QString &path, QString &reason)
+{
+    QFile file(path);
+    if (path.isEmpty() || !file.open(QIODevice::ReadOnly)) {
+        reason = QStringLiteral("It cannot be opened.");
+        return nullptr;
+    }
+    QByteArray xml = file.size() <= kLargestFile ? file.readAll() : QByteArray();
+    if (file.size() > kLargestFile || isTooDeep(xml)) {
+        reason = QStringLiteral("It is too large or nested too deeply.");
+        return nullptr;
+    }
+    QBuffer buffer(&xml);
+    QWidget *const root = loader.load(&buffer);
+    reason = loader.errorString();
+    return root;
+}
+
 }  // namespace
 
 std::unique_ptr<InterfaceFile> InterfaceFile::load(const QString &path, QString *problem, const WidgetMakers &makers)
 {
-    QFile file(path);
     WidgetLoader loader(makers);
-    const bool isOpen = !path.isEmpty() && file.open(QIODevice::ReadOnly);
-    QWidget *const root = isOpen ? loader.load(&file) : nullptr;
+    QString reason;
+    QWidget *const root = readWidgets(loader, path, reason);
     if (!root) {
-        const QString reason = isOpen ? loader.errorString() : QStringLiteral("It cannot be opened.");
         if (problem)
             *problem = reason;
         else
