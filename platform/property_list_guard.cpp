@@ -96,6 +96,32 @@ bool isBase64Text(std::string_view text) noexcept
     return padding <= 2 && (digits + padding) % 4 == 0;
 }
 
+/// The characters that a document may have, written out or as references (XML 1.0, production 2).
+constexpr bool isXMLCharacter(uint32_t character) noexcept
+{
+    return character == '\t' || character == '\n' || character == '\r' || (character >= 0x20 && character <= 0xD7FF) ||
+           (character >= 0xE000 && character <= 0xFFFD) || (character >= 0x10000 && character <= 0x10FFFF);
+}
+
+constexpr std::string_view kReference = "&#";
+
+/// Whether all references to characters by number are well-formed and to such characters. What the parser made of others
+/// could not be written again.
+bool referencesAreSound(std::string_view text) noexcept
+{
+    for (size_t next; (next = text.find(kReference)) != std::string_view::npos;) {
+        text.remove_prefix(next + kReference.size());
+        const bool isHexadecimal = text.starts_with('x');
+        text.remove_prefix(isHexadecimal ? 1 : 0);
+        uint32_t character = 0;
+        const auto [end, error] =
+            std::from_chars(text.data(), text.data() + text.size(), character, isHexadecimal ? 16 : 10);
+        if (error != std::errc() || end == text.data() + text.size() || *end != ';' || !isXMLCharacter(character))
+            return false;
+    }
+    return true;
+}
+
 struct ScalarElement {
     std::string_view name;
     bool (*isText)(std::string_view) noexcept;
@@ -112,11 +138,16 @@ constexpr std::array kScalarElements{
 /// section what the parser does not, so that no nesting stays hidden from it.
 class MarkupWalk {
 public:
-    explicit MarkupWalk(std::string_view xml) noexcept : m_rest(xml) {}
+    explicit MarkupWalk(std::string_view xml) noexcept
+        : m_rest(xml), m_hasReferences(xml.find(kReference) != std::string_view::npos)
+    {
+    }
 
     [[nodiscard]] bool isSafe() noexcept
     {
         for (size_t next; (next = m_rest.find('<')) != std::string_view::npos;) {
+            if (m_hasReferences && !referencesAreSound(m_rest.substr(0, next)))
+                return false;
             m_rest.remove_prefix(next + 1);
             if (!passMarkup())
                 return false;
@@ -198,6 +229,7 @@ private:
     }
 
     std::string_view m_rest;
+    const bool m_hasReferences;  // hardly any document has some
     int m_depth = 0;
     size_t m_keys = 0;
     bool m_sawElement = false;

@@ -96,8 +96,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size)
     checkRecord(account, file.get());
 
     change(account);
-    if (_CSKavellAccountHasPendingChanges(account.get()))
-        return 0;  // there is something in the file that cannot be written
+    require(!_CSKavellAccountHasPendingChanges(account.get()), "what was read can be saved");
     const Dictionary all = adopt(_CSKavellAccountCopyServiceAttributes(account.get(), nullptr));
     const Account reread = Home::openAccount();
     checkAttributes(reread, nullptr, all.get());

@@ -2,7 +2,7 @@
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
 // A bundle whose information dictionary is any bytes: it is a bundle when the bytes are a dictionary, answers texts or
-// nothing, and is no plug-in that loads, whatever it says.
+// nothing, is no plug-in that loads, whatever it says, and its values can be stored again.
 
 #include <fstream>
 
@@ -15,6 +15,7 @@
 #include <kavellaccounts/KAPlugin.h>
 #include <kavellaccounts/KAPluginManager.h>
 
+#include "platform/qt/value_conversion.h"
 #include "plugins/information_dictionary.h"
 #include "tests/fuzz/fuzz_target.h"
 
@@ -80,6 +81,8 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size)
     if (!bundle)
         return 0;
     require(bundle->infoDictionary() == *information, "a bundle that has changed is read again");
+    const auto stored = kavell::toStoreDictionary(*information);
+    require(stored && kavell::toVariantMap(stored->get()) == *information, "what comes out of a file goes into one");
     require(areSame(bundle->bundleIdentifier(), textIn(*information, "KABundleIdentifier")),
             "an identifier is the text that is there");
     const QString executable = textIn(*information, "KABundleExecutable");

@@ -164,6 +164,31 @@ TEST_F(DamagedFile, ControlCharactersNeitherCrashNorEmptyTheAccount)
     }
 }
 
+TEST_F(DamagedFile, AReferenceToACharacterThatCouldNotBeWrittenAgainIsRefused)
+{
+    for (const char *reference : {"&#16;", "&#x1B;", "&#0;", "&#xFFFE;", "&#xFFFF;", "&#xD800;", "&#x110000;", "&#16",
+                                  "&# 65;", "&#+65;", "&#X41;", "&#;", "&#-1;", "&#4294967361;"}) {
+        SCOPED_TRACE(reference);
+        expectRefused(accountFile("<key>a</key><string>x" + std::string(reference) + "</string>"));
+        expectRefused(accountFile("<key>a" + std::string(reference) + "</key><string>x</string>"));
+    }
+}
+
+TEST_F(DamagedFile, OtherReferencesAndTextThatOnlyLooksLikeOneAreRead)
+{
+    writeFile(fileOf("ada"), accountFile("<!-- &#16; --><key>a</key><string>&#65;&#x9;&#x1F600;&#127;</string>"
+                                         "<key>b</key><string><![CDATA[&#16;]]></string>"
+                                         "<key>c</key><string>&amp;#16;</string>"));
+    ASSERT_TRUE(CSKavellAccountLoadData(m_account.get()));
+    EXPECT_TRUE(same(attribute(m_account, "a"), text("A\t\xF0\x9F\x98\x80\x7F")));
+    EXPECT_TRUE(same(attribute(m_account, "b"), text("&#16;")));
+    EXPECT_TRUE(same(attribute(m_account, "c"), text("&#16;")));
+    setAttribute(m_account, "d", integer(4));
+    commit(m_account);
+    EXPECT_FALSE(hasPendingChanges(m_account));
+    EXPECT_TRUE(same(attribute(openAccount("ada"), "b"), text("&#16;")));
+}
+
 TEST_F(DamagedFile, AWrongTypeOfServicesCountsAsAbsent)
 {
     writeFile(fileOf("ada"), propertyList("<key>UUID</key><string>" + std::string(kUUID) +
