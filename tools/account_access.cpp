@@ -19,7 +19,6 @@
 #include "tools/failure.h"
 #include "tools/files.h"
 #include "tools/names.h"
-#include "tools/store_wait.h"
 #include "tools/text.h"
 
 namespace kavell::tools {
@@ -144,25 +143,27 @@ bool isRegularFile(const Address &address)
     return stat(dataFileOf(address).c_str(), &status) == 0 && S_ISREG(status.st_mode);
 }
 
-OpenedAccount openAccount(const Address &address)
+OpenedAccount openAccount(const Address &address, Patience patience)
 {
     const std::string path = dataFileOf(address);
     OpenedAccount opened;
     opened.address = address;
-    const StoreWait waiting(address.text(), path);
+    const StoreWait waiting(address.text(), path, patience);
     opened.record =
         adopt(_CSKavellAccountCreate(nullptr, makeString(address.providerType).get(), makeString(address.login).get()));
     if (!opened.record)
         throw Failure(ExitCode::Failed, "the store cannot open " + address.text());
     opened.existed = !_CSKavellAccountHasPendingChanges(opened.record.get());
     opened.readable = opened.existed;
-    if (opened.existed || !isOnDisk(address))
+    opened.wasBrokenOff = waiting.wasBrokenOff();
+    if (opened.existed || opened.wasBrokenOff || !isOnDisk(address))
         return opened;
     // There is a file, but no UUID came from it. That is no error of a readable file; only reading it again tells.
     const QuietStandardError quiet;
     opened.existed = true;
     opened.readable =
         isRegularFile(address) && access(path.c_str(), R_OK) == 0 && CSKavellAccountLoadData(opened.record.get());
+    opened.wasBrokenOff = waiting.wasBrokenOff();
     return opened;
 }
 

@@ -16,6 +16,8 @@
 #include <kavellaccounts/CSKavellAccount.h>
 #include <kavellaccounts/Ref.h>
 
+#include "tools/store_wait.h"
+
 namespace kavell::tools {
 
 /// The words of a command line that remain to be read.
@@ -54,12 +56,13 @@ struct Address {
 struct OpenedAccount {
     Address address;
     Ref<CSKavellAccountRef> record;
-    bool existed = false;   ///< whether it has a data file
-    bool readable = false;  ///< whether that file could be read and understood
+    bool existed = false;       ///< whether it has a data file
+    bool readable = false;      ///< whether that file could be read and understood
+    bool wasBrokenOff = false;  ///< whether its lock was not to be had with bounded patience; nothing else counts then
 };
 
 /// Opens an account, or a new one if there is none.
-[[nodiscard]] OpenedAccount openAccount(const Address &address);
+[[nodiscard]] OpenedAccount openAccount(const Address &address, Patience patience = Patience::Endless);
 
 /// Opens an account that exists; fails with NoSuchAccount, naming the nearest, or with Failed when its file is damaged.
 [[nodiscard]] OpenedAccount openExisting(const Address &address);

@@ -73,24 +73,6 @@ void printText(const Findings &findings, size_t accounts, size_t left, size_t me
 
 }  // namespace
 
-void Findings::problem(std::string kind, std::string path, std::string sentence)
-{
-    all.push_back({std::move(kind), Weight::Problem, std::move(path), std::move(sentence), false, false});
-}
-
-void Findings::note(std::string kind, std::string path, std::string sentence)
-{
-    all.push_back({std::move(kind), Weight::Note, std::move(path), std::move(sentence), false, false});
-}
-
-void Findings::mendable(std::string kind, std::string path, const std::string &sentence,
-                        const std::function<bool()> &mend)
-{
-    const bool mended = repair && mend();
-    all.push_back({std::move(kind), Weight::Problem, std::move(path),
-                   sentence + (repair && !mended ? "; it could not be mended" : ""), !repair, mended});
-}
-
 ExitCode runDoctor(const Words &words)
 {
     CommandLine line(help);

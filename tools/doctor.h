@@ -8,6 +8,7 @@
 #define KAVELL_TOOLS_DOCTOR_H
 
 #include <functional>
+#include <optional>
 #include <set>
 #include <string>
 #include <vector>
@@ -44,6 +45,10 @@ struct Findings {
 
 /// Semaphores whose holder is dead, or that are held for long.
 void examineLocks(const std::vector<Address> &accounts, Findings &findings);
+
+/// Opens an account to look at it. Where a lock was taken since the locks were examined, by a program that was killed or
+/// is slow, that is a finding of its own; none when the account cannot be opened for that reason.
+[[nodiscard]] std::optional<OpenedAccount> openForExamination(const Address &address, Findings &findings);
 
 /// Permissions of directories and files, files left over or kept, and entries that are no accounts but look like it.
 void examineDirectories(const std::vector<Address> &accounts, Findings &findings);

@@ -92,9 +92,8 @@ void examineRedoRecord(const std::string &path, const std::map<ino_t, Address> &
     const bool canOpen = !findings.untouchable.contains(*account);
     findings.mendable("unfinished-save", path, "a save of " + account->text() + " was interrupted and is not finished",
                       [&] {
-                          const QuietStandardError quiet;
                           if (canOpen)
-                              (void)openAccount(*account);
+                              (void)openForExamination(*account, findings);
                           return !exists(path);
                       });
     if (!findings.all.back().mended)
@@ -158,6 +157,11 @@ std::vector<std::string> namesIn(const std::string &directory)
     return names;
 }
 
+void notExamined(const Address &address, Findings &findings)
+{
+    findings.note("not-examined", dataFileOf(address), address.text() + " was not opened because of the problem above");
+}
+
 std::map<ino_t, Address> inodesOf(const std::vector<Address> &accounts)
 {
     std::map<ino_t, Address> inodes;
@@ -192,18 +196,16 @@ void examineContents(const std::vector<Address> &accounts, Findings &findings)
     for (const Address &address : accounts) {
         const std::string path = dataFileOf(address);
         if (findings.untouchable.contains(address)) {
-            findings.note("not-examined", path, address.text() + " was not opened because of the problem above");
+            notExamined(address, findings);
             continue;
         }
         struct stat status;
         if (lstat(path.c_str(), &status) != 0)
             continue;  // removed meanwhile
-        bool readable = false;
-        {
-            const QuietStandardError quiet;
-            readable = openAccount(address).readable;
-        }
-        if (readable)
+        const auto account = openForExamination(address, findings);
+        if (!account)
+            notExamined(address, findings);
+        if (!account || account->readable)
             continue;
         if (access(path.c_str(), R_OK) != 0)
             findings.problem("unreadable-file", path,

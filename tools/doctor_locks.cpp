@@ -7,6 +7,7 @@
 #include <thread>
 
 #include "tools/doctor.h"
+#include "tools/files.h"
 #include "tools/semaphore_repair.h"
 #include "tools/text.h"
 
@@ -17,6 +18,9 @@ namespace {
 /// How long a living holder may take before it is worth a word. A save takes milliseconds.
 constexpr std::chrono::seconds patience{2};
 
+/// How often an account is tried whose lock is found taken again and again.
+constexpr int mostAttempts = 3;
+
 /// A set and the accounts that share it: keys are made of a few bits of a file's inode, so files do collide.
 struct SharedSet {
     SemaphoreReport report;
@@ -24,7 +28,7 @@ struct SharedSet {
     bool isOfMissingFiles = false;
 };
 
-std::map<int, SharedSet> setsOf(const std::vector<Address> &accounts)
+std::map<int, SharedSet> setsOfFiles(const std::vector<Address> &accounts)
 {
     std::map<int, SharedSet> sets;
     for (const Address &address : accounts)
@@ -32,6 +36,12 @@ std::map<int, SharedSet> setsOf(const std::vector<Address> &accounts)
             sets[report->id].report = *report;
             sets[report->id].accounts.push_back(address);
         }
+    return sets;
+}
+
+std::map<int, SharedSet> allSets(const std::vector<Address> &accounts)
+{
+    std::map<int, SharedSet> sets = setsOfFiles(accounts);
     if (const auto report = inspectSemaphore({})) {
         sets[report->id].report = *report;
         sets[report->id].isOfMissingFiles = true;
@@ -62,7 +72,10 @@ std::string processText(pid_t process)
 SemaphoreReport afterPatience(SemaphoreReport report)
 {
     const auto end = std::chrono::steady_clock::now() + patience;
-    while (report.state == SemaphoreState::Held && std::chrono::steady_clock::now() < end) {
+    const auto mayEnd = [&] {
+        return report.state == SemaphoreState::Held || report.state == SemaphoreState::NeverReady;
+    };
+    while (mayEnd() && std::chrono::steady_clock::now() < end) {
         std::this_thread::sleep_for(std::chrono::milliseconds(10));
         if (const auto again = inspectSemaphoreSet(report.id))
             report = *again;
@@ -88,10 +101,14 @@ void examineSet(SharedSet &set, Findings &findings)
                           lock + " was left taken by process " + std::to_string(report.lastOperator) +
                               ", which is dead, and everyone waits for it",
                           mend);
+    else if (report.state == SemaphoreState::NeverReady)
+        findings.mendable("unready-lock", path,
+                          lock + " was made by a process that ended before it was ready, and everyone waits for it",
+                          mend);
     else if (report.state == SemaphoreState::AdmitsSeveral)
         findings.mendable("open-lock", path, lock + " lets " + std::to_string(report.value) + " programs in at once",
                           mend);
-    const bool stuck = report.state == SemaphoreState::Held || report.state == SemaphoreState::HeldByDead;
+    const bool stuck = report.state != SemaphoreState::Free && report.state != SemaphoreState::AdmitsSeveral;
     if (stuck && !(findings.all.size() > before && findings.all.back().mended))
         findings.untouchable.insert(set.accounts.begin(), set.accounts.end());
 }
@@ -100,9 +117,23 @@ void examineSet(SharedSet &set, Findings &findings)
 
 void examineLocks(const std::vector<Address> &accounts, Findings &findings)
 {
-    std::map<int, SharedSet> sets = setsOf(accounts);
+    std::map<int, SharedSet> sets = allSets(accounts);
     for (auto &[id, set] : sets)
         examineSet(set, findings);
+}
+
+std::optional<OpenedAccount> openForExamination(const Address &address, Findings &findings)
+{
+    for (int attempt = 0; attempt < mostAttempts && !findings.untouchable.contains(address); ++attempt) {
+        const QuietStandardError quiet;
+        OpenedAccount account = openAccount(address, Patience::Bounded);
+        if (!account.wasBrokenOff)
+            return account;
+        std::map<int, SharedSet> sets = setsOfFiles({address});
+        for (auto &[id, set] : sets)
+            examineSet(set, findings);
+    }
+    return std::nullopt;
 }
 
 }  // namespace kavell::tools

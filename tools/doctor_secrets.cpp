@@ -79,9 +79,8 @@ void examineSecrets(const std::vector<Address> &accounts, Findings &findings)
     for (const Address &address : accounts) {
         if (findings.untouchable.contains(address) || !isOnDisk(address))
             continue;
-        const QuietStandardError quiet;
-        const OpenedAccount account = openAccount(address);
-        if (account.readable && refersToPassword(account) && !examineReference(account, findings))
+        const auto account = openForExamination(address, findings);
+        if (account && account->readable && refersToPassword(*account) && !examineReference(*account, findings))
             return;
     }
 }

@@ -26,13 +26,30 @@ bool isDead(pid_t process)
     return process > 0 && kill(process, 0) != 0 && errno == ESRCH;
 }
 
-SemaphoreState stateOf(int value, bool operatorIsDead)
+/// Whether nobody has ever operated on the set: the kernel then knows no time of it. A process that makes a set gives
+/// the semaphore its value with a second call, and may be killed before that.
+bool isUntouched(int id)
+{
+    semid_ds status{};
+    return semctl(id, 0, IPC_STAT, &status) == 0 && status.sem_otime == 0;
+}
+
+SemaphoreState stateOf(int id, int value, pid_t lastOperator, bool operatorIsDead)
 {
     if (value > 1)
         return SemaphoreState::AdmitsSeveral;
     if (value == 1)
         return SemaphoreState::Free;
+    if (lastOperator == 0 && isUntouched(id))
+        return SemaphoreState::NeverReady;
     return operatorIsDead ? SemaphoreState::HeldByDead : SemaphoreState::Held;
+}
+
+/// Gives the semaphore the value that whoever made it did not come to give, unless it has one meanwhile.
+bool makeReady(int id)
+{
+    std::array<sembuf, 2> ready{{{0, 0, IPC_NOWAIT}, {0, 1, 0}}};
+    return semop(id, ready.data(), ready.size()) == 0;
 }
 
 /// Steps into the dead holder's place and gives the semaphore back as that holder would have. The first operation waits
@@ -68,7 +85,7 @@ std::optional<SemaphoreReport> inspectSemaphoreSet(int id)
         if (lastOperator < 0 || value < 0)
             return std::nullopt;
         if (semctl(id, 0, GETPID) == lastOperator)
-            return SemaphoreReport{id, stateOf(value, operatorIsDead), value, lastOperator};
+            return SemaphoreReport{id, stateOf(id, value, lastOperator, operatorIsDead), value, lastOperator};
     }
     return SemaphoreReport{id, SemaphoreState::Free, 1, 0};
 }
@@ -92,6 +109,8 @@ bool repairSemaphore(const SemaphoreReport &report, const std::string &lockDirec
         return false;
     if (before->state == SemaphoreState::AdmitsSeveral)
         return takeSurplus(report.id, before->value);
+    if (before->state == SemaphoreState::NeverReady)
+        return makeReady(report.id);
     return before->state == SemaphoreState::HeldByDead && takeOverAndGive(report.id);
 }
 

@@ -19,6 +19,7 @@ enum class SemaphoreState {
     Free,
     Held,           ///< by a process that lives, or by one that cannot be seen from here
     HeldByDead,     ///< the last process to operate on it is gone
+    NeverReady,     ///< nobody has operated on it, nor given it its first value
     AdmitsSeveral,  ///< its value is above 1, so that it keeps nobody out
 };
 
@@ -36,7 +37,7 @@ struct SemaphoreReport {
 /// The same of a set already found; none when it is gone.
 [[nodiscard]] std::optional<SemaphoreReport> inspectSemaphoreSet(int id);
 
-/// Brings a semaphore that is HeldByDead or AdmitsSeveral back to order; false when it was in order meanwhile or cannot
+/// Brings a semaphore that is HeldByDead, NeverReady or AdmitsSeveral to order; false when it was in order meanwhile or cannot
 /// be changed. `lockDirectory` is a directory whose flock keeps two repairs from freeing one semaphore twice; waits for
 /// the other repair.
 [[nodiscard]] bool repairSemaphore(const SemaphoreReport &report, const std::string &lockDirectory);

@@ -17,6 +17,7 @@
 #include <thread>
 #include <unistd.h>
 
+#include "tools/semaphore_repair.h"
 #include "tools/text.h"
 
 namespace kavell::tools {
@@ -25,7 +26,7 @@ namespace {
 
 using Clock = std::chrono::steady_clock;
 
-constexpr std::chrono::seconds patience{2};
+constexpr std::chrono::seconds longestWait{2};
 constexpr std::array<int, 3> endingSignals{SIGINT, SIGTERM, SIGHUP};
 
 /// The wait that the helper thread watches. Never destroyed: the thread outlives main.
@@ -33,8 +34,11 @@ struct Watch {
     std::mutex mutex;
     std::string subject;
     Clock::time_point since;
+    std::string dataFile;
+    Patience patience = Patience::Endless;
     bool active = false;
     bool announced = false;
+    bool brokenOff = false;
 };
 
 Watch &watch()
@@ -81,13 +85,29 @@ void onEndingSignal(int number)
     errno = savedError;
 }
 
+bool isHolderDead(const std::string &dataFile)
+{
+    const auto report = inspectSemaphore(dataFile);
+    return report && report->state == SemaphoreState::HeldByDead;
+}
+
+/// Breaks the main thread's wait off, again and again, until the call has returned: it may wait more than once.
+void breakOff(Watch &shared)
+{
+    shared.brokenOff = true;
+    pthread_kill(mainThread, SIGUSR1);
+}
+
 void watchForWaits()
 {
     while (true) {
         std::this_thread::sleep_for(std::chrono::milliseconds(250));
         Watch &shared = watch();
         const std::lock_guard lock(shared.mutex);
-        if (!shared.active || shared.announced || Clock::now() - shared.since < patience)
+        const bool isLong = shared.active && Clock::now() - shared.since >= longestWait;
+        if (shared.active && shared.patience == Patience::Bounded && (isLong || isHolderDead(shared.dataFile)))
+            breakOff(shared);
+        if (!isLong || shared.announced || shared.patience == Patience::Bounded)
             continue;
         shared.announced = true;
         complain("waiting for another program to finish with " + shared.subject +
@@ -110,6 +130,12 @@ void prepareOnce()
         if (sigaction(number, nullptr, &former) == 0 && former.sa_handler != SIG_IGN)
             sigaction(number, &ending, nullptr);
     }
+    // Does nothing; a wait for a semaphore is broken off by it, and nothing else is.
+    struct sigaction breaking = {};
+    breaking.sa_handler = [](int) {
+    };
+    breaking.sa_flags = SA_RESTART;
+    sigaction(SIGUSR1, &breaking, nullptr);
     sigset_t all;
     sigset_t former;
     sigfillset(&all);
@@ -120,7 +146,7 @@ void prepareOnce()
 
 }  // namespace
 
-StoreWait::StoreWait(std::string subject, const std::string &dataFile)
+StoreWait::StoreWait(std::string subject, const std::string &dataFile, Patience patience)
 {
     prepareOnce();
     std::strncpy(dataFilePath.data(), dataFile.c_str(), dataFilePath.size() - 1);
@@ -129,8 +155,10 @@ StoreWait::StoreWait(std::string subject, const std::string &dataFile)
         const std::lock_guard lock(shared.mutex);
         shared.subject = std::move(subject);
         shared.since = Clock::now();
+        shared.dataFile = dataFile;
+        shared.patience = patience;
         shared.active = true;
-        shared.announced = false;
+        shared.announced = shared.brokenOff = false;
     }
     inStore = 1;
 }
@@ -145,6 +173,13 @@ StoreWait::~StoreWait()
     }
     if (endAfterwards != 0)
         endBySignal(endAfterwards);
+}
+
+bool StoreWait::wasBrokenOff() const
+{
+    Watch &shared = watch();
+    const std::lock_guard lock(shared.mutex);
+    return shared.brokenOff;
 }
 
 }  // namespace kavell::tools

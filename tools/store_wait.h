@@ -11,6 +11,8 @@
 // A signal whose handler returned would break the wait instead, and the store then goes on without having read the
 // file: a commit would overwrite what others have saved. Hence the handler either ends the program or touches nothing.
 //
+// The doctor, which only looks, breaks its waits off in that very way, with SIGUSR1.
+//
 // Used around every call that reads or writes a data file, on the main thread only, one at a time.
 
 #ifndef KAVELL_TOOLS_STORE_WAIT_H
@@ -20,15 +22,24 @@
 
 namespace kavell::tools {
 
+/// What becomes of a wait for a program that was killed, or that does not come to its end.
+enum class Patience {
+    Endless,  ///< the person is told, and may end it
+    Bounded,  ///< it is broken off; the store's call then returns as if there were nothing to read. For reading only
+};
+
 class StoreWait {
 public:
     /// `subject` names what is worked on, such as "google anna"; `dataFile` is the path of its data file.
-    StoreWait(std::string subject, const std::string &dataFile);
+    StoreWait(std::string subject, const std::string &dataFile, Patience patience = Patience::Endless);
 
     /// Ends the program when a signal asked for it meanwhile.
     ~StoreWait();
     StoreWait(const StoreWait &) = delete;
     StoreWait &operator=(const StoreWait &) = delete;
+
+    /// Whether a wait was broken off since this was made.
+    [[nodiscard]] bool wasBrokenOff() const;
 };
 
 }  // namespace kavell::tools

@@ -124,6 +124,17 @@ TEST_F(DoctorCommand, FreesTheLockThatNewAccountsShare)
     EXPECT_EQ(client({"add", "google", "bob"}).status, 0);
 }
 
+TEST_F(DoctorCommand, ReadiesALockWhoseMakerWasKilled)
+{
+    semctl(semaphoreOf(m_path), 0, IPC_RMID);
+    ASSERT_GT(semget(ftok(m_path.c_str(), 0), 1, IPC_CREAT | IPC_EXCL | 0600), 0);  // and no value yet
+
+    expectMended("unready-lock");
+
+    EXPECT_EQ(semaphoreValue(m_path), 1);
+    EXPECT_EQ(client({"set", "google", "anna", "b=2"}).status, 0);
+}
+
 TEST_F(DoctorCommand, WakesThoseWhoWaitAndLetsThemInOneByOne)
 {
     SemaphoreHolder holder(m_path);
