@@ -46,12 +46,19 @@ std::map<int, SharedSet> allSets(const std::vector<Address> &accounts)
         sets[report->id].report = *report;
         sets[report->id].isOfMissingFiles = true;
     }
+    for (const int id : setsLikeThoseIn(dataRoot())) {
+        const auto report = sets.contains(id) ? std::nullopt : inspectSemaphoreSet(id);
+        if (report && report->state != SemaphoreState::Free)
+            sets[id].report = *report;
+    }
     return sets;
 }
 
 std::string subjectOf(const SharedSet &set)
 {
-    std::string subject = set.accounts.empty() ? "accounts that were just being added" : set.accounts.front().text();
+    std::string subject = !set.accounts.empty()  ? set.accounts.front().text()
+                          : set.isOfMissingFiles ? "accounts that were just being added"
+                                                 : "an account that was removed";
     if (set.accounts.size() > 1)
         subject += " and " + std::to_string(set.accounts.size() - 1) + " more";
     return subject;

@@ -7,9 +7,12 @@
 #include <cerrno>
 #include <csignal>
 #include <fcntl.h>
+#include <fstream>
+#include <sstream>
 #include <sys/file.h>
 #include <sys/ipc.h>
 #include <sys/sem.h>
+#include <unistd.h>
 
 #include "tools/files.h"
 
@@ -97,6 +100,28 @@ std::optional<SemaphoreReport> inspectSemaphore(const std::string &path)
         return std::nullopt;
     const int id = semget(key, 0, 0);
     return id > 0 ? inspectSemaphoreSet(id) : std::nullopt;
+}
+
+std::vector<int> setsLikeThoseIn(const std::string &directory)
+{
+    const key_t model = ftok(directory.c_str(), 0);
+    std::ifstream table("/proc/sysvipc/sem");
+    std::string line;
+    std::getline(table, line);  // the columns' names
+    std::vector<int> found;
+    while (model != -1 && std::getline(table, line)) {
+        long long key = 0;
+        int id = 0, semaphores = 0;
+        unsigned permissions = 0, owner = 0;
+        std::istringstream fields(line);
+        fields >> key >> id >> std::oct >> permissions >> std::dec >> semaphores >> owner;
+        // The low half of a key is of the inode, the next byte of the device, and the project is 0, which no program's
+        // own keys have.
+        if (fields && id > 0 && key >> 16 == model >> 16 && permissions == 0600 && semaphores == 1 &&
+            owner == geteuid())
+            found.push_back(id);
+    }
+    return found;
 }
 
 bool repairSemaphore(const SemaphoreReport &report, const std::string &lockDirectory)

@@ -12,6 +12,7 @@
 #include <optional>
 #include <string>
 #include <sys/types.h>
+#include <vector>
 
 namespace kavell::tools {
 
@@ -36,6 +37,10 @@ struct SemaphoreReport {
 
 /// The same of a set already found; none when it is gone.
 [[nodiscard]] std::optional<SemaphoreReport> inspectSemaphoreSet(int id);
+
+/// All sets of this user that look like those of data files in the directory's file system, also of files that are gone:
+/// an account that is removed and made anew has another set, while programs that have opened it before keep the first.
+[[nodiscard]] std::vector<int> setsLikeThoseIn(const std::string &directory);
 
 /// Brings a semaphore that is HeldByDead, NeverReady or AdmitsSeveral to order; false when it was in order meanwhile or cannot
 /// be changed. `lockDirectory` is a directory whose flock keeps two repairs from freeing one semaphore twice; waits for

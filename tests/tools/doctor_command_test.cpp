@@ -2,6 +2,7 @@
 // SPDX-License-Identifier: LGPL-2.1-or-later
 
 #include <chrono>
+#include <fcntl.h>
 #include <gmock/gmock.h>
 #include <memory>
 #include <nlohmann/json.hpp>
@@ -133,6 +134,38 @@ TEST_F(DoctorCommand, ReadiesALockWhoseMakerWasKilled)
 
     EXPECT_EQ(semaphoreValue(m_path), 1);
     EXPECT_EQ(client({"set", "google", "anna", "b=2"}).status, 0);
+}
+
+TEST_F(DoctorCommand, FreesTheLockThatARemovedAccountHad)
+{
+    SemaphoreHolder holder(m_path);
+    const int set = semaphoreOf(m_path);
+    // Made anew while the first file still has its inode, so that the second has another.
+    const int first = open(m_path.c_str(), O_RDONLY | O_CLOEXEC);
+    std::filesystem::remove(m_path);
+    run({"add", "google", "anna", "a=1"});
+    run({"list"});
+    ASSERT_NE(semaphoreOf(m_path), set);
+    holder.killIt();
+
+    expectMended("stuck-lock");
+
+    EXPECT_EQ(semctl(set, 0, GETVAL), 1);
+    close(first);
+}
+
+TEST_F(DoctorCommand, LeavesTheLocksOfOtherPrograms)
+{
+    const int foreign = semget(ftok(m_path.c_str(), 'x'), 1, IPC_CREAT | IPC_EXCL | 0600);
+    ASSERT_GT(foreign, 0);
+    sembuf use{0, 1, 0};
+    ChildProcess user(
+        [&] { return semop(foreign, &use, 1) == 0 && (use.sem_op = -1, semop(foreign, &use, 1)) == 0 ? 0 : 1; });
+    ASSERT_EQ(user.wait(), 0);
+
+    EXPECT_EQ(client({"doctor", "--repair"}).status, 0);
+    EXPECT_EQ(semctl(foreign, 0, GETVAL), 0);
+    semctl(foreign, 0, IPC_RMID);
 }
 
 TEST_F(DoctorCommand, WakesThoseWhoWaitAndLetsThemInOneByOne)
