@@ -150,13 +150,14 @@ extern "C" {
     return result;
 }
 
-[[gnu::visibility("default")]] int stat(const char *path, struct stat *status) noexcept
+[[gnu::visibility("default")]] int fstatat(int directory, const char *path, struct stat *status, int flags) noexcept
 {
-    static auto *const system = systemFunction<int(const char *, struct stat *)>("stat");
-    const auto account = accountOfPath(path);
+    static auto *const system = systemFunction<int(int, const char *, struct stat *, int)>("fstatat");
+    // The scan of a directory asks without following links; a record asks for its own file.
+    const auto account = flags == 0 ? accountOfPath(path) : std::nullopt;
     if (account)
         recordLoad(LoadEvent::Status, *account);
-    const int result = system(path, status);
+    const int result = system(directory, path, status, flags);
     const int error = errno;
     if (account && result != 0 && error == ENOENT)
         recordLoad(LoadEvent::Missing, *account);
