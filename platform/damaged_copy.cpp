@@ -66,7 +66,7 @@ FileDescriptor createCopy(const char *path, std::string &copyPath)
     const std::string base = siblingPath(path, kDamagedCopyPrefix) + when.data();
     for (int number = 1; number <= kMostCopiesASecond; ++number) {
         copyPath = number == 1 ? base : base + "-" + std::to_string(number);
-        FileDescriptor copy(open(copyPath.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0600));
+        FileDescriptor copy = openFile(copyPath.c_str(), O_WRONLY | O_CREAT | O_EXCL, 0600);
         if (copy || errno != EEXIST)
             return copy;
     }

@@ -47,10 +47,11 @@ bool lockFile(int file) noexcept
     return true;
 }
 
-bool wasUnlinked(int file) noexcept
+/// Whether the file has a name for certain.
+bool hasName(int file) noexcept
 {
     struct stat status;
-    return fstat(file, &status) == 0 && status.st_nlink == 0;
+    return fstat(file, &status) == 0 && status.st_nlink > 0;
 }
 
 /// An open file with its flock. The flock is given back explicitly: a child that the host forks meanwhile has the file
@@ -63,13 +64,14 @@ public:
     LockedFile(const char *path, int access, int directory = AT_FDCWD) noexcept
     {
         for (int attempt = 0; attempt < kMostAttempts; ++attempt) {
-            m_file = FileDescriptor(withoutInterruption(
-                [&] { return openat(directory, path, access | O_CLOEXEC | O_NONBLOCK | O_NOCTTY); }));
+            m_file = openFile(path, access | O_NONBLOCK | O_NOCTTY, 0, directory);
             if (m_file && !lockFile(m_file.get()))
                 m_file = FileDescriptor();
-            if (!m_file || access == O_RDONLY || !wasUnlinked(m_file.get()))
+            if (!m_file || access == O_RDONLY || hasName(m_file.get()))
                 return;
         }
+        m_file = FileDescriptor();
+        errno = EBUSY;
     }
     ~LockedFile()
     {
@@ -118,7 +120,7 @@ struct FoundRecord {
 /// Judges the record at `recordPath` against the file; none when there is no record or it cannot be read.
 std::optional<FoundRecord> findRecord(int file, const std::string &recordPath)
 {
-    const FileDescriptor record(open(recordPath.c_str(), O_RDONLY | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK));
+    const FileDescriptor record = openFile(recordPath.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK);
     FileContents bytes, contents;
     struct stat status;
     if (!record || !bytes.read(record.get(), kLargestRedoRecord) || !contents.read(file, kLargestDataFile) ||
@@ -132,16 +134,20 @@ std::optional<FoundRecord> findRecord(int file, const std::string &recordPath)
     return found;
 }
 
-bool hasRecord(const std::string &recordPath, int directory = AT_FDCWD) noexcept
+/// Whether there is a record; none when that cannot be told, and the file may be torn.
+std::optional<bool> hasRecord(const std::string &recordPath, int directory = AT_FDCWD) noexcept
 {
-    return faccessat(directory, recordPath.c_str(), F_OK, 0) == 0;
+    if (faccessat(directory, recordPath.c_str(), F_OK, 0) == 0)
+        return true;
+    return errno == ENOENT ? std::optional(false) : std::nullopt;
 }
 
 /// Settles a redo record, if there is one, on a file that is open for writing. False when that could not be done.
 bool settleRecord(int file, const std::string &recordPath)
 {
-    if (!hasRecord(recordPath))
-        return true;
+    const auto isThere = hasRecord(recordPath);
+    if (!isThere || !*isThere)
+        return isThere.has_value();
     const auto found = findRecord(file, recordPath);
     if (!found)
         return false;
@@ -156,8 +162,10 @@ bool settleRecord(int file, const std::string &recordPath)
 /// Makes a file that must not exist yet; it has its contents durably, but not its name. None, with errno, on failure.
 FileDescriptor makeNewFile(const std::string &path, std::string_view contents) noexcept
 {
-    FileDescriptor file(open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC | O_NOFOLLOW, 0600));
-    if (!file || (fchmod(file.get(), 0600) == 0 && writeWhole(file.get(), contents) && syncData(file.get())))
+    FileDescriptor file = openFile(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_NOFOLLOW, 0600);
+    if (!file)
+        return file;
+    if (fchmod(file.get(), 0600) == 0 && writeWhole(file.get(), contents) && syncData(file.get()))
         return file;
     unlink(path.c_str());
     return FileDescriptor();
@@ -196,9 +204,10 @@ bool replaceInPlace(int file, const char *path, std::string_view contents, Intac
         record.oldContents = oldContents;
     if ((!record.oldContents || !isIntact(oldContents)) && !keepDamagedCopy(file, path))
         return false;
-    const bool isProtected = (contents.size() <= oldContents.size() || reserveRoom(file, contents.size())) &&
-                             makeNewFile(recordPath, encodeRedoRecord(record)) && syncDirectoryOf(path);
-    if (!isProtected) {
+    if ((contents.size() > oldContents.size() && !reserveRoom(file, contents.size())) ||
+        !makeNewFile(recordPath, encodeRedoRecord(record)))
+        return false;
+    if (!syncDirectoryOf(path)) {
         unlink(recordPath.c_str());
         return false;
     }
@@ -237,8 +246,12 @@ Creation createWhole(const char *path, std::string_view contents)
     // A process of this number may have died here before.
     if (!file && errno == EEXIST && unlink(newPath.c_str()) == 0)
         file = makeNewFile(newPath, contents);
-    if (!file || !lockFile(file.get()))
+    if (!file)
         return Creation::Failed;
+    if (!lockFile(file.get())) {
+        unlink(newPath.c_str());
+        return Creation::Failed;
+    }
     const Creation creation = publish(newPath.c_str(), path);
     if (creation == Creation::Done) {
         // Whoever has the flock is the only one who may make a record; one that is there was left by an earlier file.
@@ -256,7 +269,10 @@ std::optional<FileRead> readWithoutRecord(const char *path, FileContents &conten
     const LockedFile file(name, O_RDONLY, directory);
     if (!file)
         return FileRead::Failed;
-    if (hasRecord(siblingPath(name, kRedoRecordPrefix), directory))
+    const auto isThere = hasRecord(siblingPath(name, kRedoRecordPrefix), directory);
+    if (!isThere)
+        return FileRead::Failed;
+    if (*isThere)
         return std::nullopt;
     return contents.read(file.get(), kLargestDataFile) ? FileRead::Done : FileRead::Failed;
 }
@@ -333,12 +349,13 @@ bool removeDataFile(const char *path) noexcept
         // settled, not only deleted: a power cut may undo the deletion of the file and keep that of the record.
         const std::string recordPath = siblingPath(path, kRedoRecordPrefix);
         const LockedFile file(path, O_RDWR);
-        if (hasRecord(recordPath) && (!file || !settleRecord(file.get(), recordPath)))
-            unlink(recordPath.c_str());
+        const bool isSettled = file && settleRecord(file.get(), recordPath);
         if (unlink(path) != 0)
             return false;
-        // The file is gone for every program; that a power cut may bring it back is no failure of the removal.
-        static_cast<void>(syncDirectoryOf(path));
+        // The file is gone for every program; that a power cut may bring it back is no failure of the removal. But then
+        // it is torn without its record, so a record that could not be settled goes only when it cannot come back.
+        if (syncDirectoryOf(path) && !isSettled)
+            unlink(recordPath.c_str());
         return true;
     });
 }

@@ -11,6 +11,11 @@
 
 namespace kavell {
 
+FileDescriptor openFile(const char *path, int flags, mode_t mode, int directory) noexcept
+{
+    return FileDescriptor(withoutInterruption([&] { return openat(directory, path, flags | O_CLOEXEC, mode); }));
+}
+
 bool writeWhole(int descriptor, std::string_view bytes, off_t offset) noexcept
 {
     while (!bytes.empty()) {
@@ -36,24 +41,29 @@ ssize_t readAt(int descriptor, char *bytes, size_t length, size_t offset) noexce
 bool FileContents::read(int descriptor, size_t limit)
 {
     m_large.clear();
-    const ssize_t first = readAt(descriptor, m_small.data(), m_small.size(), 0);
-    if (first < 0)
-        return false;
-    m_smallLength = static_cast<size_t>(first);
-    // A read of a regular file that leaves room has seen its end.
-    if (m_smallLength < m_small.size())
-        return true;
+    m_smallLength = 0;
+    // Only a read of nothing has seen the end: one that comes short may have met a bad place of the disk.
+    while (m_smallLength < m_small.size()) {
+        const ssize_t count =
+            readAt(descriptor, m_small.data() + m_smallLength, m_small.size() - m_smallLength, m_smallLength);
+        if (count <= 0)
+            return count == 0;
+        m_smallLength += static_cast<size_t>(count);
+    }
+    return readLarge(descriptor, limit);
+}
+
+/// Goes on where m_small is full.
+bool FileContents::readLarge(int descriptor, size_t limit)
+{
     m_large.assign(m_small.data(), m_small.size());
     for (size_t length = m_large.size(); length <= limit;) {
         m_large.resize(length * 2);
         const ssize_t count = readAt(descriptor, m_large.data() + length, length, length);
-        if (count < 0)
-            return false;
-        const bool isEnd = static_cast<size_t>(count) < length;
-        length += static_cast<size_t>(count);
-        m_large.resize(length);
-        if (isEnd)
-            break;
+        m_large.resize(length + static_cast<size_t>(std::max<ssize_t>(count, 0)));
+        if (count <= 0)
+            return count == 0;
+        length = m_large.size();
     }
     return true;
 }
@@ -127,7 +137,7 @@ bool syncDirectoryOf(const char *path) noexcept
     const std::string_view view(path);
     const size_t slash = view.rfind('/');
     const std::string directory(slash == std::string_view::npos ? "." : view.substr(0, std::max<size_t>(slash, 1)));
-    const FileDescriptor descriptor(open(directory.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
+    const FileDescriptor descriptor = openFile(directory.c_str(), O_RDONLY | O_DIRECTORY);
     return descriptor && withoutInterruption([&] { return fsync(descriptor.get()); }) == 0;
 }
 

@@ -8,8 +8,10 @@
 
 #include <array>
 #include <cerrno>
+#include <fcntl.h>
 #include <string>
 #include <string_view>
+#include <sys/types.h>
 #include <unistd.h>
 #include <utility>
 
@@ -48,6 +50,10 @@ template <typename Call> auto withoutInterruption(Call &&call) noexcept
     return result;
 }
 
+/// Opens a file that the programs which this one starts do not get; none, with errno, when that fails. A relative path is
+/// looked up from the directory.
+[[nodiscard]] FileDescriptor openFile(const char *path, int flags, mode_t mode = 0, int directory = AT_FDCWD) noexcept;
+
 /// Writes all bytes at an offset; false, with errno, when that fails part way.
 [[nodiscard]] bool writeWhole(int descriptor, std::string_view bytes, off_t offset = 0) noexcept;
 
@@ -66,6 +72,8 @@ public:
     }
 
 private:
+    [[nodiscard]] bool readLarge(int descriptor, size_t limit);
+
     std::array<char, 8192> m_small;
     size_t m_smallLength = 0;
     std::string m_large;  ///< instead of m_small, when it is not empty

@@ -74,8 +74,7 @@ PreferencesLock::PreferencesLock(const std::string &path, std::chrono::milliseco
 {
     const auto deadline = std::chrono::steady_clock::now() + bound;
     createDirectoriesAbove(path.c_str());
-    m_file = FileDescriptor(
-        open(hiddenSibling(path, ".lock").c_str(), O_RDWR | O_CREAT | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK, 0600));
+    m_file = openFile(hiddenSibling(path, ".lock").c_str(), O_RDWR | O_CREAT | O_NOFOLLOW | O_NONBLOCK, 0600);
     m_error = m_file ? lockUntil(m_file.get(), deadline) : errno;
 }
 
@@ -99,7 +98,7 @@ std::optional<PreferencesContents> readPreferencesFile(const std::string &path)
     PreferencesContents contents;
     contents.values = adopt(CSKavellDictionaryCreateMutable());
     // Not blocking: what stands there may be a pipe.
-    const FileDescriptor file(open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY));
+    const FileDescriptor file = openFile(path.c_str(), O_RDONLY | O_NONBLOCK | O_NOCTTY);
     if (!file)
         return errno == ENOENT || errno == ENOTDIR ? std::optional(contents) : std::nullopt;
     struct stat status;
@@ -137,7 +136,7 @@ std::optional<PreferencesStamp> replacePreferencesFile(const std::string &path, 
     const std::string fresh = hiddenSibling(path, ".new");
     // A leftover of a process that was killed here; the lock's holder is its only user.
     unlink(fresh.c_str());
-    const FileDescriptor file(open(fresh.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC | O_NOFOLLOW, 0600));
+    const FileDescriptor file = openFile(fresh.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_NOFOLLOW, 0600);
     if (!file)
         return std::nullopt;
     struct stat status;

@@ -43,7 +43,7 @@ FileLock::FileLock(const std::string &name, const Deadline &deadline)
     if (!makeCredentialDirectory())
         return;
     const std::string path = credentialDirectory() + "/" + name;
-    m_file = FileDescriptor(::open(path.c_str(), O_RDWR | O_CREAT | O_CLOEXEC | O_NOFOLLOW, 0600));
+    m_file = openFile(path.c_str(), O_RDWR | O_CREAT | O_NOFOLLOW, 0600);
     if (!m_file)
         return;
     int error = 0;
@@ -57,7 +57,7 @@ FileLock::FileLock(const std::string &name, const Deadline &deadline)
 StoredFile readWholeFile(const std::string &path, size_t most)
 {
     // Not blocking: what stands there may be a pipe.
-    const FileDescriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK));
+    const FileDescriptor file = openFile(path.c_str(), O_RDONLY | O_NONBLOCK);
     if (!file)
         return {errno == ENOENT ? StoredFile::State::absent : StoredFile::State::failed, {}};
     struct stat status {};
@@ -83,10 +83,11 @@ bool replaceFile(const std::string &name, std::string_view bytes)
     const std::string fresh = path + ".new";
     // A leftover of a process that was killed here; the lock's holder is its only user.
     ::unlink(fresh.c_str());
-    const FileDescriptor file(::open(fresh.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC | O_NOFOLLOW, 0600));
+    const FileDescriptor file = openFile(fresh.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_NOFOLLOW, 0600);
     if (!file)
         return false;
-    if (!writeWhole(file.get(), bytes) || fsync(file.get()) != 0 || std::rename(fresh.c_str(), path.c_str()) != 0) {
+    if (!writeWhole(file.get(), bytes) || withoutInterruption([&] { return fsync(file.get()); }) != 0 ||
+        std::rename(fresh.c_str(), path.c_str()) != 0) {
         ::unlink(fresh.c_str());
         return false;
     }
