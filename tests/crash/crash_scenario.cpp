@@ -39,8 +39,8 @@ std::string describe(const DiskState &state)
 
 }  // namespace
 
-CrashScenario::CrashScenario(WatchedDirectory &directory, Observe observe, Proceed proceed, Renaming renaming)
-    : m_directory(directory), m_observe(std::move(observe)), m_proceed(std::move(proceed)), m_renaming(renaming),
+CrashScenario::CrashScenario(WatchedDirectory &directory, Observe observe, Proceed proceed)
+    : m_directory(directory), m_observe(std::move(observe)), m_proceed(std::move(proceed)),
       m_most(numberFrom("CRASH_STATES", kUsualStates)), m_seed(numberFrom("CRASH_SEED", std::random_device()())),
       m_random(m_seed)
 {
@@ -61,9 +61,10 @@ void CrashScenario::start(const std::string &found)
     m_steps.push_back({"start", 0, found});
 }
 
-void CrashScenario::step(const std::string &name, const std::function<void()> &act, const std::string &found)
+void CrashScenario::step(const std::string &name, const std::function<void()> &act, const std::string &found,
+                         Refusal refusal)
 {
-    Recorder recorder(m_directory, m_renaming);
+    Recorder recorder(m_directory, refusal);
     {
         const Observation observation(recorder);
         act();
@@ -217,7 +218,7 @@ void CrashScenario::checkCutsOf(Disk disk, const std::vector<DiskOperation> &ope
 /// What was found once must be found again after a cut in the midst of finding it.
 void CrashScenario::checkRecovery(const Moment &moment, const DiskState &state)
 {
-    Recorder recorder(m_directory, m_renaming);
+    Recorder recorder(m_directory);
     m_directory.make(state);
     std::string found;
     {
@@ -247,7 +248,7 @@ void CrashScenario::checkPowerCutsAfterKills()
     forEachKill([&](const Moment &moment, const Disk &disk) {
         const std::string found = observeState(disk.latest());
         m_directory.makeAnew(disk.latest());
-        Recorder recorder(m_directory, m_renaming);
+        Recorder recorder(m_directory);
         std::string next;
         {
             const Observation observation(recorder);

@@ -43,7 +43,7 @@ public:
     /// Saves something more over what `found` describes; what is to be found then.
     using Proceed = std::function<std::string(const std::string &found)>;
 
-    CrashScenario(WatchedDirectory &directory, Observe observe, Proceed proceed, Renaming renaming = Renaming::Full);
+    CrashScenario(WatchedDirectory &directory, Observe observe, Proceed proceed);
     /// Prints how many states were checked.
     ~CrashScenario();
 
@@ -51,7 +51,8 @@ public:
     void start(const std::string &found);
 
     /// Does the next thing, after which `found` is to be found.
-    void step(const std::string &name, const std::function<void()> &act, const std::string &found);
+    void step(const std::string &name, const std::function<void()> &act, const std::string &found,
+              Refusal refusal = Refusal::Nothing);
 
     void checkPowerCuts();
     void checkKills();
@@ -86,7 +87,6 @@ private:
     WatchedDirectory &m_directory;
     const Observe m_observe;
     const Proceed m_proceed;
-    const Renaming m_renaming;
     const size_t m_most;
     const uint64_t m_seed;
     std::mt19937_64 m_random;

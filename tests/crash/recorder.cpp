@@ -229,8 +229,12 @@ void Recorder::noteFile(const SystemCall &call, long result, off_t offset)
 
 long Recorder::onCall(SystemCall &call, const std::function<long()> &make)
 {
-    if (call.kind == CallKind::Rename && call.flags != 0 && m_renaming == Renaming::OnlyReplacing) {
+    if (call.kind == CallKind::Rename && call.flags != 0 && m_refusal == Refusal::NewNames) {
         errno = EINVAL;
+        return -1;
+    }
+    if (call.kind == CallKind::Write && m_refusal == Refusal::Writes) {
+        errno = EIO;
         return -1;
     }
     struct stat status {};

@@ -57,17 +57,18 @@ private:
     unsigned m_putAway = 0;               ///< how many directories were put out of sight
 };
 
-/// What the file system of a test can do.
-enum class Renaming {
-    Full,
-    OnlyReplacing,  ///< it does not know how to rename a file unless the new name is taken
+/// What the system does not do while it is recorded.
+enum class Refusal {
+    Nothing,
+    NewNames,  ///< renaming a file unless the new name is taken, as some file systems do not know how to
+    Writes,    ///< writing to any file, as a disk that is going
 };
 
 /// Writes down what the observed thread does to the files of a directory.
 class Recorder : public SystemCallObserver {
 public:
-    explicit Recorder(WatchedDirectory &directory, Renaming renaming = Renaming::Full)
-        : m_directory(directory), m_renaming(renaming)
+    explicit Recorder(WatchedDirectory &directory, Refusal refusal = Refusal::Nothing)
+        : m_directory(directory), m_refusal(refusal)
     {
     }
 
@@ -81,7 +82,7 @@ private:
     void noteFile(const SystemCall &call, long result, off_t offset);
 
     WatchedDirectory &m_directory;
-    const Renaming m_renaming;
+    const Refusal m_refusal;
     std::vector<DiskOperation> m_operations;
 };
 
