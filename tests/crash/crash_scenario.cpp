@@ -17,7 +17,7 @@ namespace {
 
 // So many states of one scenario are worth reading.
 constexpr size_t kMostReports = 3;
-constexpr size_t kUsualStates = 1000;
+constexpr size_t kUsualStates = 800;
 // The second cut is tried for so many of the first ones.
 constexpr size_t kMostRecoveries = 300;
 constexpr size_t kStatesOfARecovery = 40;
