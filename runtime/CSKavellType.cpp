@@ -13,6 +13,7 @@
 #include <mutex>
 
 #include "runtime/object_p.h"
+#include "runtime/single_threaded.h"
 
 namespace kavell {
 
@@ -83,20 +84,47 @@ void deallocateObject(Object *object) noexcept
 
 using namespace kavell;
 
+namespace {
+
+/// Counts a reference more. Answers how many there were before.
+uint32_t countUp(std::atomic<uint32_t> &references, uint32_t current) noexcept
+{
+    if (!isSingleThreaded())
+        return references.fetch_add(1, std::memory_order_relaxed);
+    references.store(current + 1, std::memory_order_relaxed);
+    return current;
+}
+
+uint32_t countDown(std::atomic<uint32_t> &references, uint32_t current) noexcept
+{
+    if (!isSingleThreaded())
+        return references.fetch_sub(1, std::memory_order_acq_rel);
+    references.store(current - 1, std::memory_order_relaxed);
+    return current;
+}
+
+}  // namespace
+
 CSKavellTypeRef CSKavellRetain(CSKavellTypeRef object)
 {
-    if (!object || objectOf(object)->references.load(std::memory_order_relaxed) == kImmortal)
+    if (!object)
         return object;
-    [[maybe_unused]] const uint32_t before = objectOf(object)->references.fetch_add(1, std::memory_order_relaxed);
+    const uint32_t current = objectOf(object)->references.load(std::memory_order_relaxed);
+    if (current == kImmortal)
+        return object;
+    [[maybe_unused]] const uint32_t before = countUp(objectOf(object)->references, current);
     assert(before != 0 && before < kImmortal - 1);
     return object;
 }
 
 void CSKavellRelease(CSKavellTypeRef object)
 {
-    if (!object || objectOf(object)->references.load(std::memory_order_relaxed) == kImmortal)
+    if (!object)
         return;
-    const uint32_t before = objectOf(object)->references.fetch_sub(1, std::memory_order_acq_rel);
+    const uint32_t current = objectOf(object)->references.load(std::memory_order_relaxed);
+    if (current == kImmortal)
+        return;
+    const uint32_t before = countDown(objectOf(object)->references, current);
     assert(before != 0);
     if (before != 1)
         return;

@@ -49,10 +49,33 @@ static_assert(sizeof(CSKavellString) == 16, "the text of a constant follows its 
 /// A string of text that is known to be UTF-8; none when there is no memory for it.
 [[nodiscard]] CSKavellStringRef makeValidString(const CSKavellAllocator *allocator, std::string_view text) noexcept;
 
-/// Equality of two strings of which neither is none.
+/// Whether the first and the last bytes of two texts of one length, as many as a Word has, are equal.
+template <typename Word> [[nodiscard]] bool equalEnds(const char *first, const char *second, size_t length) noexcept
+{
+    Word ends[4];
+    std::memcpy(&ends[0], first, sizeof(Word));
+    std::memcpy(&ends[1], second, sizeof(Word));
+    std::memcpy(&ends[2], first + length - sizeof(Word), sizeof(Word));
+    std::memcpy(&ends[3], second + length - sizeof(Word), sizeof(Word));
+    return ends[0] == ends[1] && ends[2] == ends[3];
+}
+
+/// Equality of two strings of which neither is none. Keys are short, and the call of a library function would cost more
+/// than comparing them.
 [[nodiscard]] inline bool equalStrings(const CSKavellString &first, const CSKavellString &second) noexcept
 {
-    return first.length == second.length && std::memcmp(first.text(), second.text(), first.length) == 0;
+    const size_t length = first.length;
+    if (length != second.length)
+        return false;
+    const char *const one = first.text(), *const other = second.text();
+    if (length > 16)
+        return std::memcmp(one, other, length) == 0;
+    if (length >= 8)
+        return equalEnds<uint64_t>(one, other, length);
+    if (length >= 4)
+        return equalEnds<uint32_t>(one, other, length);
+    return length == 0 ||
+           (one[0] == other[0] && one[length / 2] == other[length / 2] && one[length - 1] == other[length - 1]);
 }
 
 }  // namespace kavell

@@ -33,6 +33,29 @@ void dropPendingChanges(CSKavellAccountSettings &settings) noexcept
     ReleaseAndClear(settings.removedKeys);
 }
 
+/// The committed attributes for a reader to keep. They are the record's own, which cannot be changed from here on, and
+/// which the record replaces by a copy when it has to change them: most are read many times and never changed.
+CSKavellDictionaryRef shareAttributes(const CSKavellAccountSettings &settings) noexcept
+{
+    CSKavellMutableDictionaryRef attributes = settings.attributes.get();
+    // Others may be reading what was shared before, so that it is not written to again.
+    if (attributes->flags & kObjectIsMutable)
+        attributes->flags &= static_cast<uint16_t>(~kObjectIsMutable);
+    return Ref<CSKavellDictionaryRef>(settings.attributes).leak();
+}
+
+/// Gives the record committed attributes that nobody else has; false when there is no memory for them.
+bool unshareAttributes(CSKavellAccountSettings &settings) noexcept
+{
+    if (!settings.attributes || (settings.attributes->flags & kObjectIsMutable))
+        return true;
+    auto own = adopt(CSKavellDictionaryCreateMutableCopy(settings.attributes.get()));
+    if (!own)
+        return false;
+    settings.attributes = std::move(own);
+    return true;
+}
+
 }  // namespace
 
 CSKavellTypeID _CSKavellAccountSettingsGetTypeID(void)
@@ -90,6 +113,8 @@ CSKavellDictionaryRef CSKavellAccountSettingsCopyAttributes(CSKavellAccountSetti
 {
     if (!settings)
         return nullptr;
+    if (settings->attributes && !CSKavellAccountSettingsHasChanges(settings) && settings->attributes->count > 0)
+        return shareAttributes(*settings);
     DictionarySlot effective;
     MergeDictKeys(effective, settings->attributes.get());
     MergeDictKeys(effective, settings->changedAttributes.get());
@@ -146,7 +171,7 @@ void CSKavellAccountSettingsRemoveAllAttributes(CSKavellAccountSettingsRef setti
 
 void CSKavellAccountSettingsCommitChanges(CSKavellAccountSettingsRef settings)
 {
-    if (!settings)
+    if (!settings || !CSKavellAccountSettingsHasChanges(settings) || !unshareAttributes(*settings))
         return;
     MergeDictKeys(settings->attributes, settings->changedAttributes.get());
     ReleaseAndClear(settings->changedAttributes);

@@ -11,12 +11,18 @@
 #include <atomic>
 #include <cstdint>
 
+#include "runtime/single_threaded.h"
+
 namespace kavell {
 
 class RecordLock {
 public:
     void lock() noexcept
     {
+        if (isSingleThreaded() && m_state.load(std::memory_order_relaxed) == kFree) {
+            m_state.store(kHeld, std::memory_order_relaxed);
+            return;
+        }
         uint32_t state = kFree;
         if (!m_state.compare_exchange_strong(state, kHeld, std::memory_order_acquire, std::memory_order_relaxed))
             lockContended();
@@ -24,6 +30,10 @@ public:
 
     void unlock() noexcept
     {
+        if (isSingleThreaded()) {
+            m_state.store(kFree, std::memory_order_relaxed);
+            return;
+        }
         if (m_state.exchange(kFree, std::memory_order_release) == kAwaited)
             m_state.notify_one();
     }

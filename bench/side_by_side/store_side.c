@@ -64,20 +64,27 @@ static void takeValue(Reading *reading, Kind kind, const char *key, CSKavellType
         takeText(reading, key, CSKavellStringGetUTF8(value));
     else
         takeNumber(reading, key, kind == kFlag ? CSKavellBooleanGetValue(value) : (int)CSKavellNumberGetInt64(value));
-    CSKavellRelease(value);
 }
 
 static void readAccount(CSKavellAccountRef account, Reading *reading)
 {
-    takeValue(reading, kText, "login", _CSKavellAccountCopyLoginName(account));
-    takeValue(reading, kText, "name", _CSKavellAccountCopyProviderAttribute(account, displayNameKey));
-    takeValue(reading, kFlag, "enabled", _CSKavellAccountCopyProviderAttribute(account, enabledKey));
-    takeValue(reading, kText, "provider", _CSKavellAccountCopyProviderType(account));
+    CSKavellStringRef loginName = _CSKavellAccountCopyLoginName(account);
+    CSKavellStringRef provider = _CSKavellAccountCopyProviderType(account);
+    CSKavellDictionaryRef own = _CSKavellAccountCopyProviderAttributes(account);
+    takeValue(reading, kText, "login", loginName);
+    takeValue(reading, kText, "name", CSKavellDictionaryGetValue(own, displayNameKey));
+    takeValue(reading, kFlag, "enabled", CSKavellDictionaryGetValue(own, enabledKey));
+    takeValue(reading, kText, "provider", provider);
     for (int service = 0; service < kServices; ++service) {
+        CSKavellDictionaryRef attributes = _CSKavellAccountCopyServiceAttributes(account, serviceIDs[service]);
         for (int field = 0; field < kFields; ++field)
             takeValue(reading, kServiceFields[service][field].kind, kServiceFields[service][field].key,
-                      _CSKavellAccountCopyServiceAttribute(account, serviceIDs[service], fieldKeys[service][field]));
+                      CSKavellDictionaryGetValue(attributes, fieldKeys[service][field]));
+        CSKavellRelease(attributes);
     }
+    CSKavellRelease(own);
+    CSKavellRelease(provider);
+    CSKavellRelease(loginName);
     endAccount(reading);
 }
 

@@ -45,7 +45,7 @@ CSKAVELL_EXPORT bool CSKavellAccountSettingsHasAttribute(CSKavellAccountSettings
 CSKAVELL_EXPORT CSKavellTypeRef CSKavellAccountSettingsCopyAttribute(CSKavellAccountSettingsRef settings,
                                                                      CSKavellStringRef key) CSKAVELL_NODISCARD;
 
-/// All effective attributes in a dictionary of their own (caller owns), empty when there are none; none only for a none
+/// All effective attributes as they are now (caller owns), empty when there are none; none only for a none
 /// record.
 CSKAVELL_EXPORT CSKavellDictionaryRef CSKavellAccountSettingsCopyAttributes(CSKavellAccountSettingsRef settings)
     CSKAVELL_NODISCARD;

@@ -72,6 +72,38 @@ TEST(CSKavellAccountSettings, TheEmptyAttributesAreImmutable)
     EXPECT_EQ(CSKavellDictionaryGetCount(empty.get()), 0u);
 }
 
+TEST(CSKavellAccountSettings, AttributesTakenBeforeAChangeStayAsTheyWere)
+{
+    const Settings settings;
+    CSKavellAccountSettingsUpdateAttributes(settings.get(), dictionary({{"a", text("1")}, {"b", text("2")}}).get());
+    const auto before = settings.all();
+    settings.set("a", text("3"));
+    settings.remove("b");
+    settings.commit();
+    EXPECT_TRUE(same(before, dictionary({{"a", text("1")}, {"b", text("2")}})));
+    EXPECT_TRUE(same(settings.all(), dictionary({{"a", text("3")}})));
+}
+
+TEST(CSKavellAccountSettings, AttributesTakenBeforeARereadStayAsTheyWere)
+{
+    const Settings settings;
+    CSKavellAccountSettingsUpdateAttributes(settings.get(), dictionary({{"a", text("1")}}).get());
+    const auto before = settings.all();
+    CSKavellAccountSettingsUpdateAttributes(settings.get(), dictionary({{"a", text("2")}}).get());
+    EXPECT_TRUE(same(before, dictionary({{"a", text("1")}})));
+    EXPECT_TRUE(same(settings.all(), dictionary({{"a", text("2")}})));
+}
+
+TEST(CSKavellAccountSettings, WhoeverTookTheAttributesCannotChangeTheRecordThroughThem)
+{
+    const Settings settings;
+    CSKavellAccountSettingsUpdateAttributes(settings.get(), dictionary({{"a", text("1")}}).get());
+    const auto taken = settings.all();
+    CSKavellDictionarySetValue(const_cast<CSKavellMutableDictionaryRef>(taken.get()), text("a").get(), text("2").get());
+    CSKavellDictionaryRemoveValue(const_cast<CSKavellMutableDictionaryRef>(taken.get()), text("a").get());
+    EXPECT_TRUE(same(settings.value("a"), text("1")));
+}
+
 TEST(CSKavellAccountSettings, EqualsOnlyItselfAndHashesByItsAddress)
 {
     const Settings first, second;
