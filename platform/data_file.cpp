@@ -7,6 +7,7 @@
 #include <array>
 #include <atomic>
 #include <chrono>
+#include <cstring>
 #include <ctime>
 #include <fcntl.h>
 #include <optional>
@@ -19,6 +20,7 @@
 #include "platform/file_io.h"
 #include "platform/redo_record.h"
 #include "runtime/object_p.h"
+#include "runtime/single_threaded.h"
 
 namespace kavell {
 
@@ -54,17 +56,20 @@ bool hasName(int file) noexcept
     return fstat(file, &status) == 0 && status.st_nlink > 0;
 }
 
-/// An open file with its flock. The flock is given back explicitly: a child that the host forks meanwhile has the file
-/// open too, and would keep it.
+/// What a data file is opened with, so that opening never waits, whatever the path names.
+constexpr int kOpenFlags = O_NONBLOCK | O_NOCTTY;
+
+/// An open file with its flock. The flock is given back explicitly where another thread may have forked meanwhile: its
+/// child has the file open too, and would keep it.
 class LockedFile {
 public:
-    /// Opens the file that has the path and takes its flock; none, with errno, when either fails. Opening never waits,
-    /// whatever the path names. A file that was deleted while its flock was waited for is not the one that has the path,
-    /// and must not be written to; for reading, it is as good as the moment before.
-    LockedFile(const char *path, int access, int directory = AT_FDCWD) noexcept
+    /// Opens the file that has the path and takes its flock; none, with errno, when either fails. A file that was deleted
+    /// while its flock was waited for is not the one that has the path, and must not be written to; for reading, it is
+    /// as good as the moment before.
+    LockedFile(const char *path, int access) noexcept
     {
         for (int attempt = 0; attempt < kMostAttempts; ++attempt) {
-            m_file = openFile(path, access | O_NONBLOCK | O_NOCTTY, 0, directory);
+            m_file = openFile(path, access | kOpenFlags);
             if (m_file && !lockFile(m_file.get()))
                 m_file = FileDescriptor();
             if (!m_file || access == O_RDONLY || hasName(m_file.get()))
@@ -73,9 +78,15 @@ public:
         m_file = FileDescriptor();
         errno = EBUSY;
     }
+    /// Takes the flock of a file that was opened for reading.
+    explicit LockedFile(FileDescriptor file) noexcept : m_file(std::move(file))
+    {
+        if (m_file && !lockFile(m_file.get()))
+            m_file = FileDescriptor();
+    }
     ~LockedFile()
     {
-        if (m_file)
+        if (m_file && !isSingleThreaded())
             flock(m_file.get(), LOCK_UN);
     }
     LockedFile(const LockedFile &) = delete;
@@ -262,19 +273,27 @@ Creation createWhole(const char *path, std::string_view contents)
     return creation;
 }
 
-/// The contents of a file that has no redo record; none when it has one.
-std::optional<FileRead> readWithoutRecord(const char *path, FileContents &contents, int directory)
+/// The contents of an open file that has no redo record; none when it has one.
+std::optional<FileRead> readWithoutRecord(const LockedFile &file, const std::string &recordPath, FileContents &contents,
+                                          int directory = AT_FDCWD)
 {
-    const char *const name = nameIn(directory, path);
-    const LockedFile file(name, O_RDONLY, directory);
     if (!file)
         return FileRead::Failed;
-    const auto isThere = hasRecord(siblingPath(name, kRedoRecordPrefix), directory);
+    const auto isThere = hasRecord(recordPath, directory);
     if (!isThere)
         return FileRead::Failed;
     if (*isThere)
         return std::nullopt;
     return contents.read(file.get(), kLargestDataFile) ? FileRead::Done : FileRead::Failed;
+}
+
+std::optional<FileRead> readUnhindered(const char *path, FileContents &contents, FoundFile found)
+{
+    if (!found.file)
+        return readWithoutRecord(LockedFile(path, O_RDONLY), siblingPath(path, kRedoRecordPrefix), contents);
+    const char *const name = std::strrchr(path, '/') + 1;
+    return readWithoutRecord(LockedFile(std::move(found.file)), siblingPath(name, kRedoRecordPrefix), contents,
+                             found.directory);
 }
 
 /// The contents of a file that has a redo record, settling the record where this process may write.
@@ -313,10 +332,15 @@ std::string siblingPath(std::string_view path, std::string_view prefix)
     return sibling;
 }
 
-FileRead readDataFile(const char *path, FileContents &contents, int directory) noexcept
+FoundFile FoundFile::open(int directory, const char *name) noexcept
+{
+    return {directory, openFile(name, O_RDONLY | kOpenFlags, 0, directory)};
+}
+
+FileRead readDataFile(const char *path, FileContents &contents, FoundFile found) noexcept
 {
     return guarded(FileRead::Failed, [&] {
-        const auto unhindered = readWithoutRecord(path, contents, directory);
+        const auto unhindered = readUnhindered(path, contents, std::move(found));
         const FileRead result = unhindered ? *unhindered : readWithRecord(path, contents);
         return result == FileRead::Done && contents.view().size() > kLargestDataFile ? FileRead::TooLarge : result;
     });

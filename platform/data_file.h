@@ -13,9 +13,7 @@
 #define KAVELL_PLATFORM_DATA_FILE_H
 
 #include <cstdint>
-#include <cstring>
 #include <ctime>
-#include <fcntl.h>
 #include <string>
 #include <string_view>
 
@@ -41,9 +39,17 @@ enum class FileRead {
     TooLarge,  ///< it is larger than kLargestDataFile and was not read
 };
 
-/// Reads a whole regular file into `contents`, after finishing a replacement that somebody could not finish. Whoever has
-/// the file's directory open gives its descriptor: from there, names are found faster than by a whole path.
-[[nodiscard]] FileRead readDataFile(const char *path, FileContents &contents, int directory = AT_FDCWD) noexcept;
+/// What whoever lists a directory has at hand of a file in it, so that it need not be looked up from the root again and
+/// again: the directory, open, and the file, opened for reading. Without a file it is of no use and harms nothing.
+struct FoundFile {
+    int directory = -1;
+    FileDescriptor file{};
+
+    [[nodiscard]] static FoundFile open(int directory, const char *name) noexcept;
+};
+
+/// Reads a whole regular file into `contents`, after finishing a replacement that somebody could not finish.
+[[nodiscard]] FileRead readDataFile(const char *path, FileContents &contents, FoundFile found = {}) noexcept;
 
 /// Says whether bytes are what this kind of file should hold.
 using IntactCheck = bool (*)(std::string_view contents) noexcept;
@@ -62,13 +68,6 @@ inline constexpr std::string_view kRedoRecordPrefix = ".redo-";
 inline constexpr std::string_view kNewFilePrefix = ".new-";
 /// Followed by the hash, "-", and the time of keeping, as in damaged-0123456789abcdef-20260131T100000Z.
 inline constexpr std::string_view kDamagedCopyPrefix = "damaged-";
-
-/// What finds the file from its directory, when that is open, or else from anywhere.
-[[nodiscard]] inline const char *nameIn(int directory, const char *path) noexcept
-{
-    const char *const slash = directory == AT_FDCWD ? nullptr : std::strrchr(path, '/');
-    return slash ? slash + 1 : path;
-}
 
 /// The path beside a data file that consists of the prefix and the hash of the file's name.
 [[nodiscard]] std::string siblingPath(std::string_view path, std::string_view prefix);

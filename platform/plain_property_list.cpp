@@ -48,6 +48,12 @@ constexpr std::array<Byte, 256> kBytes = makeByteTable();
 constexpr std::array<std::pair<std::string_view, char>, 5> kReferences{
     {{"&amp;", '&'}, {"&lt;", '<'}, {"&gt;", '>'}, {"&quot;", '"'}, {"&apos;", '\''}}};
 
+constexpr bool isIdentifierCharacter(char character) noexcept
+{
+    return (character >= '-' && character <= ':') || (character >= 'A' && character <= 'Z') ||
+           (character >= 'a' && character <= 'z') || character == ' ';
+}
+
 constexpr int kNoDigit = -1;
 
 constexpr int base64Digit(char character) noexcept
@@ -106,10 +112,12 @@ private:
     /// One of the two identifiers of a document type, in its quotes.
     bool passIdentifier() noexcept
     {
-        constexpr std::string_view kCharacters = "ABCDEFGHIJKLMNOPQRSTUVWXYZabcdefghijklmnopqrstuvwxyz0123456789 /.:-";
         if (!pass("\""))
             return false;
-        m_rest.remove_prefix(std::min(m_rest.find_first_not_of(kCharacters), m_rest.size()));
+        size_t length = 0;
+        while (length < m_rest.size() && isIdentifierCharacter(m_rest[length]))
+            ++length;
+        m_rest.remove_prefix(length);
         return pass("\"");
     }
 

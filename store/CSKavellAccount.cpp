@@ -119,11 +119,11 @@ CSKavellTypeID _CSKavellAccountGetTypeID(void)
 CSKavellAccountRef _CSKavellAccountCreate(const CSKavellAllocator *allocator, CSKavellStringRef providerType,
                                           CSKavellStringRef loginName)
 {
-    return createAccountIn(AT_FDCWD, allocator, providerType, loginName);
+    return createFoundAccount({}, allocator, providerType, loginName);
 }
 
-CSKavellAccountRef kavell::createAccountIn(int directory, const CSKavellAllocator *allocator,
-                                           CSKavellStringRef providerType, CSKavellStringRef loginName) noexcept
+CSKavellAccountRef kavell::createFoundAccount(FoundFile found, const CSKavellAllocator *allocator,
+                                              CSKavellStringRef providerType, CSKavellStringRef loginName) noexcept
 {
     if (CSKavellStringGetLength(providerType) == 0) {
         writeError("Error: No service provider specified in CSKavellAccountCreate\n");
@@ -145,7 +145,7 @@ CSKavellAccountRef kavell::createAccountIn(int directory, const CSKavellAllocato
             return nullptr;
         account->dataFilePath = makeDataFilePath(providerType, loginName);
         const Guard guard(account->lock);
-        ReadAccountData(*account.get(), directory);
+        ReadAccountData(*account.get(), std::move(found));
         if (!account->uuidString) {
             account->uuidString = freshUUIDString();
             account->hasChanges = true;

@@ -39,11 +39,10 @@ CSKavellDictionaryRef asDictionary(CSKavellTypeRef value) noexcept
 
 /// Queries the status of the data file; false, with errno, when it cannot be had. An account whose name cannot be a
 /// path has no file to query.
-bool queryStatus(const CSKavellAccount &account, struct stat &status, int directory = AT_FDCWD) noexcept
+bool queryStatus(const CSKavellAccount &account, struct stat &status) noexcept
 {
     errno = EINVAL;
-    const char *const path = account.dataFilePath.get();
-    return path && fstatat(directory, nameIn(directory, path), &status, 0) == 0;
+    return account.dataFilePath && stat(account.dataFilePath.get(), &status) == 0;
 }
 
 FileTime modificationTime(const struct stat &status) noexcept
@@ -52,14 +51,15 @@ FileTime modificationTime(const struct stat &status) noexcept
 }
 
 /// Reads the whole file under the semaphore; Failed when the semaphore could not be taken.
-FileRead readUnderSemaphore(CSKavellAccount &account, int directory, const struct stat &status,
+FileRead readUnderSemaphore(CSKavellAccount &account, FoundFile found, const struct stat &status,
                             FileContents &contents) noexcept
 {
     if (!LockDatafileAccess(account, &status))
         return FileRead::Failed;
     // A pipe or a device would never end; only files hold accounts.
-    const FileRead result =
-        S_ISREG(status.st_mode) ? readDataFile(account.dataFilePath.get(), contents, directory) : FileRead::Failed;
+    const FileRead result = S_ISREG(status.st_mode)
+                                ? readDataFile(account.dataFilePath.get(), contents, std::move(found))
+                                : FileRead::Failed;
     UnlockDatafileAccess(account);
     return result;
 }
@@ -170,10 +170,11 @@ void saveDataFile(CSKavellAccount &account, CSKavellDictionaryRef propertyList) 
 
 }  // namespace
 
-bool ReadAccountData(CSKavellAccount &account, int directory) noexcept
+bool ReadAccountData(CSKavellAccount &account, FoundFile found) noexcept
 {
     struct stat status;
-    if (!queryStatus(account, status, directory)) {
+    const bool isKnown = found.file ? fstat(found.file.get(), &status) == 0 : queryStatus(account, status);
+    if (!isKnown) {
         const bool isMissing = errno == ENOENT;
         // The number is the call's result, not the system's error; programs compare the line as it is.
         if (!isMissing)
@@ -186,7 +187,7 @@ bool ReadAccountData(CSKavellAccount &account, int directory) noexcept
     if (modificationTime(status) == account.dataFileModTime)
         return true;
     FileContents contents;
-    const FileRead result = readUnderSemaphore(account, directory, status, contents);
+    const FileRead result = readUnderSemaphore(account, std::move(found), status, contents);
     if (result == FileRead::Failed)
         return true;
     const auto propertyList = result == FileRead::Done ? parsePropertyList(contents.view()) : nullptr;

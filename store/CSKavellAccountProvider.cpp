@@ -75,9 +75,10 @@ void appendAccount(CSKavellAccountProvider &provider, CSKavellAccountRef account
 }
 
 /// Makes an account record and lists it. None, with nothing listed, when that fails.
-CSKavellAccountRef addNewAccount(CSKavellAccountProvider &provider, CSKavellStringRef loginName, int directory) noexcept
+CSKavellAccountRef addNewAccount(CSKavellAccountProvider &provider, CSKavellStringRef loginName,
+                                 FoundFile found) noexcept
 {
-    const auto account = adopt(createAccountIn(directory, nullptr, provider.providerType.get(), loginName));
+    const auto account = adopt(createFoundAccount(std::move(found), nullptr, provider.providerType.get(), loginName));
     if (account)
         appendAccount(provider, account.get(), loginName);
     return account.get();
@@ -139,7 +140,7 @@ void CSKavellAccountProviderLoadAccountData(CSKavellAccountProvider &provider)
         // A name that is not UTF-8 cannot be a login name, and answers none here.
         const auto loginName = makeString(name.substr(0, name.size() - kDataFileSuffix.size()));
         if (loginName && !accountOf(provider, loginName.get()))
-            addNewAccount(provider, loginName.get(), dirfd(directory.get()));
+            addNewAccount(provider, loginName.get(), FoundFile::open(dirfd(directory.get()), entry->d_name));
     }
 }
 
@@ -192,7 +193,7 @@ CSKavellAccountRef _CSKavellAccountProviderGetAccount(CSKavellAccountProviderRef
     if (!provider)
         return nullptr;
     CSKavellAccountRef existing = accountOf(*provider, loginName);
-    return existing || !create ? existing : addNewAccount(*provider, loginName, AT_FDCWD);
+    return existing || !create ? existing : addNewAccount(*provider, loginName, {});
 }
 
 CSKavellAccountRef _CSKavellAccountProviderCopyAccount(CSKavellAccountProviderRef provider, CSKavellStringRef loginName,

@@ -10,6 +10,7 @@
 #include <cstdlib>
 #include <memory>
 #include <string>
+#include <sys/stat.h>
 
 #include <kavellaccounts/CSKavellAccount.h>
 #include <kavellaccounts/Ref.h>
@@ -71,13 +72,13 @@ template <typename Body> void forEachService(const CSKavellAccount &account, Bod
 /// The absolute path of the directory that holds all accounts, without a closing "/".
 [[nodiscard]] std::string dataRootPath();
 
-/// _CSKavellAccountCreate for an account whose provider's directory is open, as a descriptor; AT_FDCWD when it is not.
-[[nodiscard]] CSKavellAccountRef createAccountIn(int directory, const CSKavellAllocator *allocator,
-                                                 CSKavellStringRef providerType, CSKavellStringRef loginName) noexcept;
+/// _CSKavellAccountCreate for an account whose data file was found in a listing of its directory.
+[[nodiscard]] CSKavellAccountRef createFoundAccount(FoundFile found, const CSKavellAllocator *allocator,
+                                                    CSKavellStringRef providerType,
+                                                    CSKavellStringRef loginName) noexcept;
 
-/// Brings the committed side up to what the data file says. False on a real error, after its message. The directory is
-/// the file's, where that is open.
-bool ReadAccountData(CSKavellAccount &account, int directory = AT_FDCWD) noexcept;
+/// Brings the committed side up to what the data file says. False on a real error, after its message.
+bool ReadAccountData(CSKavellAccount &account, FoundFile found = {}) noexcept;
 
 /// Replaces the committed side of every service by what the file's "Services" dictionary (may be none) says, taking its
 /// dictionaries over.
