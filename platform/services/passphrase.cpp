@@ -33,6 +33,21 @@ bool isPrivate(const struct stat &status)
            (status.st_mode & (S_IRWXG | S_IRWXO)) == 0;
 }
 
+/// Reads to the end of the file or of the room; -1 when that fails part way: a part of a passphrase is another one.
+ssize_t readToEnd(int file, char *bytes, size_t room)
+{
+    size_t length = 0;
+    while (length < room) {
+        const ssize_t count = withoutInterruption([&] { return ::read(file, bytes + length, room - length); });
+        if (count < 0)
+            return -1;
+        if (count == 0)
+            break;
+        length += static_cast<size_t>(count);
+    }
+    return static_cast<ssize_t>(length);
+}
+
 /// A terminal that hands over each key as it is typed, shows none, and makes no signal of any: the process must not end
 /// with the echo still off. Restored on every way out.
 class SilentTerminal {
@@ -150,12 +165,12 @@ bool hasPassphraseFile()
 CredentialStatus readPassphraseFile(Secret &passphrase)
 {
     // Not blocking: what stands there may be a pipe.
-    const FileDescriptor file(::open(std::getenv(kFileVariable), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY));
+    const FileDescriptor file = openFile(std::getenv(kFileVariable), O_RDONLY | O_NONBLOCK | O_NOCTTY);
     struct stat status {};
     if (!file || fstat(file.get(), &status) != 0 || !isPrivate(status))
         return CredentialStatus::locked;
     char buffer[kMostBytes + 1];
-    const ssize_t count = ::read(file.get(), buffer, sizeof buffer);
+    const ssize_t count = readToEnd(file.get(), buffer, sizeof buffer);
     std::string_view text(buffer, count > 0 ? static_cast<size_t>(count) : 0);
     const bool isTooLong = text.size() > kMostBytes;
     if (text.ends_with('\n'))
