@@ -20,7 +20,6 @@ namespace kavell::test {
 
 namespace {
 
-constexpr std::array kErrors = {ENOSPC, EIO, EDQUOT, EACCES, EMFILE, EINTR};
 // After so many unlike outcomes the rest says nothing new.
 constexpr int kMostFailures = 10;
 
@@ -63,10 +62,10 @@ bool isElsewhere(std::string_view path)
     return path.starts_with(std::getenv("XDG_RUNTIME_DIR"));
 }
 
-std::vector<Fault> faultsOf(size_t number, CallKind kind)
+std::vector<Fault> faultsOf(size_t number, CallKind kind, const FaultRuns &runs)
 {
     std::vector<Fault> faults;
-    for (const int error : kErrors)
+    for (const int error : runs.errors)
         faults.push_back({number, Fault::Form::Error, error});
     if (movesBytes(kind)) {
         faults.push_back({number, Fault::Form::Half});
@@ -190,7 +189,7 @@ void forEachFault(const FaultRuns &runs, const std::function<void(FaultInjector 
         // Without its directory a poster makes one outside of the scratch home.
         if (call.kind == CallKind::Status && isElsewhere(call.path))
             continue;
-        for (const Fault &fault : faultsOf(number, call.kind)) {
+        for (const Fault &fault : faultsOf(number, call.kind, runs)) {
             FaultInjector injector(fault, runs.canRenameWithoutReplacing);
             const int failures = result->total_part_count();
             run(injector);

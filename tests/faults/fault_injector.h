@@ -14,6 +14,7 @@
 #ifndef KAVELL_TESTS_FAULTS_FAULT_INJECTOR_H
 #define KAVELL_TESTS_FAULTS_FAULT_INJECTOR_H
 
+#include <cerrno>
 #include <cstdint>
 #include <functional>
 #include <string>
@@ -83,6 +84,8 @@ private:
 struct FaultRuns {
     /// As on a file system that does not know how to rename a file unless the new name is taken.
     bool canRenameWithoutReplacing = true;
+    /// What a call that fails fails with.
+    std::vector<int> errors = {ENOSPC, EIO, EDQUOT, EACCES, EMFILE, EINTR};
 };
 
 /// Runs the action without a fault and then with each one; prints how many runs these were.
