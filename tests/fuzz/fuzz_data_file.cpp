@@ -28,12 +28,19 @@ public:
         setenv("HOME", m_directory.path().c_str(), 1);
         setenv("XDG_RUNTIME_DIR", m_directory.path().c_str(), 1);
         unsetenv("DBUS_SESSION_BUS_ADDRESS");
-        const std::string provider = m_directory.path() + "/Library/Kavell Accounts/V1/com.corvane.account.testing";
-        std::filesystem::create_directories(provider);
-        m_file = provider + "/ada.plist";
+        std::filesystem::create_directories(m_file.parent_path());
     }
 
-    void setDataFile(std::string_view bytes) const { std::ofstream(m_file, std::ios::binary) << bytes; }
+    /// The file keeps its inode, which its semaphore is found by, and loses what earlier inputs left beside it: of a
+    /// hundred damaged ones a second there are copies, and more are not replaced.
+    void setDataFile(std::string_view bytes) const
+    {
+        for (const auto &entry : std::filesystem::directory_iterator(m_file.parent_path())) {
+            if (entry.path() != m_file)
+                std::filesystem::remove(entry.path());
+        }
+        std::ofstream(m_file, std::ios::binary) << bytes;
+    }
 
     [[nodiscard]] static Account openAccount()
     {
@@ -44,7 +51,8 @@ public:
 
 private:
     const fuzz::ScratchDirectory m_directory;
-    std::string m_file;
+    const std::filesystem::path m_file =
+        m_directory.path() + "/Library/Kavell Accounts/V1/com.corvane.account.testing/ada.plist";
 };
 
 /// A member of a dictionary, when it is a dictionary as well.
