@@ -35,7 +35,7 @@ Ref<CSKavellStringRef> KeyMaker::key(std::string_view text) noexcept
         return adopt(makeValidString(nullptr, text));
     auto &slots = keyPool().slots;
     Ref<CSKavellStringRef> &slot = slots[hashOfText(text) % slots.size()];
-    if (slot && slot->view() == text)
+    if (slot && equalTexts(slot->view(), text))
         return slot;
     return slot = adopt(makeValidString(nullptr, text));
 }

@@ -28,21 +28,25 @@ namespace {
 /// How deep containers may stand in one another here. Each takes a frame of the stack; what is deeper is not plain.
 constexpr int kDeepestContainer = 32;
 
-/// What a byte of text means to the reader.
-enum class Byte : uint8_t { Plain, NotASCII, Reference, Markup, Unfit };
+/// What texts may hold beyond the characters of ASCII that stand for themselves.
+struct Contents {
+    bool areUnfit = false;  ///< control characters, which no text may hold; or a carriage return, which is not plain
+    bool haveReferences = false;
+    bool haveOtherThanASCII = false;
+};
 
-constexpr std::array<Byte, 256> makeByteTable()
+Contents contentsOf(std::string_view xml) noexcept
 {
-    std::array<Byte, 256> table{};
-    for (size_t byte = 0; byte < table.size(); ++byte)
-        table[byte] = byte < 0x20 ? Byte::Unfit : byte < 0x80 ? Byte::Plain : Byte::NotASCII;
-    table['\t'] = table['\n'] = Byte::Plain;
-    table['&'] = Byte::Reference;
-    table['<'] = Byte::Markup;
-    return table;
+    // Without an early end, and in bytes alone, the compiler looks at many bytes at a time.
+    uint8_t unfit = 0, references = 0, all = 0;
+    for (const char character : xml) {
+        const auto byte = static_cast<uint8_t>(character);
+        unfit |= static_cast<uint8_t>((byte < 0x20) & (byte != '\t') & (byte != '\n'));
+        references |= static_cast<uint8_t>(byte == '&');
+        all |= byte;
+    }
+    return {unfit != 0, references != 0, (all & 0x80) != 0};
 }
-
-constexpr std::array<Byte, 256> kBytes = makeByteTable();
 
 /// The references by name (XML 1.0, section 4.6).
 constexpr std::array<std::pair<std::string_view, char>, 5> kReferences{
@@ -71,11 +75,11 @@ constexpr int base64Digit(char character) noexcept
 /// answers false or none for what is not plain.
 class PlainReader {
 public:
-    explicit PlainReader(std::string_view xml) : m_rest(xml) { m_pairs.reserve(32); }
+    explicit PlainReader(std::string_view xml) : m_rest(xml), m_contents(contentsOf(xml)) { m_pairs.reserve(32); }
 
     [[nodiscard]] Ref<CSKavellMutableDictionaryRef> document()
     {
-        if (!passPrologue() || !pass("<dict>"))
+        if (m_contents.areUnfit || !passPrologue() || !pass("<dict>"))
             return nullptr;
         auto root = dictionary(0);
         passBlanks();
@@ -124,46 +128,39 @@ private:
     /// What stands up to the element's end; a view into the document or, where references stood in it, into m_decoded.
     bool text(std::string_view end, std::string_view &result)
     {
-        size_t length = 0;
-        bool isASCII = true;
-        for (;; ++length) {
-            if (length == m_rest.size())
-                return false;
-            const Byte byte = kBytes[static_cast<unsigned char>(m_rest[length])];
-            if (byte == Byte::Plain)
-                continue;
-            if (byte == Byte::Reference)
-                return decodedText(end, result);
-            if (byte != Byte::NotASCII)
-                break;
-            isASCII = false;
-        }
+        const size_t length = m_rest.find('<');
+        if (length == std::string_view::npos)
+            return false;
         result = m_rest.substr(0, length);
         m_rest.remove_prefix(length);
-        return pass(end) && (isASCII || isUTF8(result));
+        if (m_contents.haveReferences && !decode(result))
+            return false;
+        return pass(end) && (!m_contents.haveOtherThanASCII || isUTF8(result));
     }
 
-    bool decodedText(std::string_view end, std::string_view &result)
+    /// Puts what a text with references says in its place; false when one of them is not plain.
+    bool decode(std::string_view &encoded)
     {
+        if (encoded.find('&') == std::string_view::npos)
+            return true;
         m_decoded.clear();
-        while (!m_rest.empty() && m_rest.front() != '<') {
-            const Byte byte = kBytes[static_cast<unsigned char>(m_rest.front())];
-            if (byte == Byte::Unfit || (byte == Byte::Reference && !passReference()))
+        while (!encoded.empty()) {
+            const size_t length = std::min(encoded.find('&'), encoded.size());
+            m_decoded.append(encoded.substr(0, length));
+            encoded.remove_prefix(length);
+            if (!encoded.empty() && !decodeReference(encoded))
                 return false;
-            if (byte == Byte::Reference)
-                continue;
-            m_decoded += m_rest.front();
-            m_rest.remove_prefix(1);
         }
-        result = m_decoded;
-        return pass(end) && isUTF8(result);
+        encoded = m_decoded;
+        return true;
     }
 
-    bool passReference()
+    bool decodeReference(std::string_view &encoded)
     {
         for (const auto &[reference, character] : kReferences) {
-            if (pass(reference)) {
+            if (encoded.starts_with(reference)) {
                 m_decoded += character;
+                encoded.remove_prefix(reference.size());
                 return true;
             }
         }
@@ -288,6 +285,7 @@ private:
     }
 
     std::string_view m_rest;
+    Contents m_contents;
     std::string m_decoded;
     /// Those of all dictionaries that are not closed yet, so that each is made with exactly the room that it needs.
     std::vector<std::pair<Value, Value>> m_pairs;

@@ -60,14 +60,14 @@ template <typename Word> [[nodiscard]] bool equalEnds(const char *first, const c
     return ends[0] == ends[1] && ends[2] == ends[3];
 }
 
-/// Equality of two strings of which neither is none. Keys are short, and the call of a library function would cost more
-/// than comparing them.
-[[nodiscard]] inline bool equalStrings(const CSKavellString &first, const CSKavellString &second) noexcept
+/// Equality of texts. Most are keys, which are short, and the call of a library function would cost more than comparing
+/// them.
+[[nodiscard]] inline bool equalTexts(std::string_view first, std::string_view second) noexcept
 {
-    const size_t length = first.length;
-    if (length != second.length)
+    const size_t length = first.size();
+    if (length != second.size())
         return false;
-    const char *const one = first.text(), *const other = second.text();
+    const char *const one = first.data(), *const other = second.data();
     if (length > 16)
         return std::memcmp(one, other, length) == 0;
     if (length >= 8)
@@ -76,6 +76,12 @@ template <typename Word> [[nodiscard]] bool equalEnds(const char *first, const c
         return equalEnds<uint32_t>(one, other, length);
     return length == 0 ||
            (one[0] == other[0] && one[length / 2] == other[length / 2] && one[length - 1] == other[length - 1]);
+}
+
+/// Equality of two strings of which neither is none.
+[[nodiscard]] inline bool equalStrings(const CSKavellString &first, const CSKavellString &second) noexcept
+{
+    return equalTexts(first.view(), second.view());
 }
 
 }  // namespace kavell

@@ -71,10 +71,11 @@ Ref<CSKavellStringRef> emptyString()
     return makeString("");
 }
 
-OwnedCString makeDataFilePath(CSKavellStringRef providerType, CSKavellStringRef loginName)
+OwnedCString makeDataFilePath(std::string_view directory, std::string_view loginName)
 {
-    std::string path = dataRootPath();
-    path.append("/").append(providerType->view()).append("/").append(loginName->view()).append(".plist");
+    std::string path;
+    path.reserve(directory.size() + loginName.size() + std::size("/.plist"));
+    path.append(directory).append("/").append(loginName).append(".plist");
     // A name with a NUL in it cannot be a path; the account then lives without a file.
     return path.find('\0') == std::string::npos ? OwnedCString(strdup(path.c_str())) : nullptr;
 }
@@ -109,6 +110,11 @@ std::string dataRootPath()
     return home.append(kDataRoot);
 }
 
+std::string providerDirectoryPath(CSKavellStringRef providerType)
+{
+    return dataRootPath().append("/").append(providerType->view());
+}
+
 }  // namespace kavell
 
 CSKavellTypeID _CSKavellAccountGetTypeID(void)
@@ -119,11 +125,12 @@ CSKavellTypeID _CSKavellAccountGetTypeID(void)
 CSKavellAccountRef _CSKavellAccountCreate(const CSKavellAllocator *allocator, CSKavellStringRef providerType,
                                           CSKavellStringRef loginName)
 {
-    return createFoundAccount({}, allocator, providerType, loginName);
+    return createFoundAccount({}, {}, allocator, providerType, loginName);
 }
 
-CSKavellAccountRef kavell::createFoundAccount(FoundFile found, const CSKavellAllocator *allocator,
-                                              CSKavellStringRef providerType, CSKavellStringRef loginName) noexcept
+CSKavellAccountRef kavell::createFoundAccount(FoundFile found, std::string_view directory,
+                                              const CSKavellAllocator *allocator, CSKavellStringRef providerType,
+                                              CSKavellStringRef loginName) noexcept
 {
     if (CSKavellStringGetLength(providerType) == 0) {
         writeError("Error: No service provider specified in CSKavellAccountCreate\n");
@@ -143,7 +150,9 @@ CSKavellAccountRef kavell::createFoundAccount(FoundFile found, const CSKavellAll
         account->accountSettings = adopt(CSKavellAccountSettingsCreate(allocator));
         if (!account->providerType || !account->loginName || !account->services || !account->accountSettings)
             return nullptr;
-        account->dataFilePath = makeDataFilePath(providerType, loginName);
+        account->dataFilePath = directory.empty()
+                                    ? makeDataFilePath(providerDirectoryPath(providerType), loginName->view())
+                                    : makeDataFilePath(directory, loginName->view());
         const Guard guard(account->lock);
         ReadAccountData(*account.get(), std::move(found));
         if (!account->uuidString) {

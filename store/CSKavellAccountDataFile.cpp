@@ -88,13 +88,14 @@ void dropServicesWithoutAttributes(CSKavellAccount &account) noexcept
 {
     // Identifiers are distinct as they are; to look for each in the list would let a file of very many useless services
     // hold up its reader for half an hour.
-    const ArraySlot withoutAttributes = NewMutableArray();
+    ArraySlot withoutAttributes;
     forEachService(account, [&](CSKavellStringRef serviceID, CSKavellAccountSettingsRef settings) {
-        if (!CSKavellAccountSettingsHasAttributes(settings))
-            CSKavellArrayAppendValue(withoutAttributes.get(), serviceID);
+        if (CSKavellAccountSettingsHasAttributes(settings))
+            return;
+        if (!withoutAttributes)
+            withoutAttributes = NewMutableArray();
+        CSKavellArrayAppendValue(withoutAttributes.get(), serviceID);
     });
-    if (CSKavellArrayGetCount(withoutAttributes.get()) == 0)
-        return;
     RemoveDictKeys(account.services, withoutAttributes.get());
 }
 
@@ -201,13 +202,14 @@ bool ReadAccountData(CSKavellAccount &account, FoundFile found) noexcept
 
 void UpdateServiceAttributes(CSKavellAccount &account, CSKavellDictionaryRef fileServices) noexcept
 {
-    const DictionarySlot working =
-        fileServices ? adopt(CSKavellDictionaryCreateMutableCopy(fileServices)) : NewMutableDictionary();
+    // A record that knows no service yet takes nothing out of the working copy, and needs none.
+    const bool knowsServices = CSKavellDictionaryGetCount(account.services.get()) > 0;
+    const DictionarySlot working = knowsServices ? adopt(CSKavellDictionaryCreateMutableCopy(fileServices)) : nullptr;
     forEachService(account, [&](CSKavellStringRef serviceID, CSKavellAccountSettingsRef settings) {
         UpdateServiceAttributesAux(serviceID, settings, working.get());
     });
-    if (working) {
-        working->forEach([&](CSKavellTypeRef serviceID, CSKavellTypeRef attributes) {
+    if (const CSKavellDictionaryRef added = knowsServices ? working.get() : fileServices) {
+        added->forEach([&](CSKavellTypeRef serviceID, CSKavellTypeRef attributes) {
             const auto settings = adopt(CSKavellAccountSettingsCreate(nullptr));
             if (!settings)
                 return;

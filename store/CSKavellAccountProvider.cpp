@@ -74,11 +74,13 @@ void appendAccount(CSKavellAccountProvider &provider, CSKavellAccountRef account
     SetDictKey(provider.accountsByLoginName, loginName, account);
 }
 
-/// Makes an account record and lists it. None, with nothing listed, when that fails.
-CSKavellAccountRef addNewAccount(CSKavellAccountProvider &provider, CSKavellStringRef loginName,
-                                 FoundFile found) noexcept
+/// Makes an account record and lists it. None, with nothing listed, when that fails. For the file and the directory, see
+/// createFoundAccount.
+CSKavellAccountRef addNewAccount(CSKavellAccountProvider &provider, CSKavellStringRef loginName, FoundFile found = {},
+                                 std::string_view directory = {}) noexcept
 {
-    const auto account = adopt(createFoundAccount(std::move(found), nullptr, provider.providerType.get(), loginName));
+    const auto account =
+        adopt(createFoundAccount(std::move(found), directory, nullptr, provider.providerType.get(), loginName));
     if (account)
         appendAccount(provider, account.get(), loginName);
     return account.get();
@@ -126,7 +128,7 @@ bool isRegularFile(int directory, const dirent &entry) noexcept
 /// Makes a record for each data file of the provider's directory, in the directory's own order.
 void CSKavellAccountProviderLoadAccountData(CSKavellAccountProvider &provider)
 {
-    const std::string path = dataRootPath().append("/").append(provider.providerType->view());
+    const std::string path = providerDirectoryPath(provider.providerType.get());
     if (path.find('\0') != std::string::npos)
         return;
     const std::unique_ptr<DIR, DirectoryCloser> directory(opendir(path.c_str()));
@@ -140,7 +142,7 @@ void CSKavellAccountProviderLoadAccountData(CSKavellAccountProvider &provider)
         // A name that is not UTF-8 cannot be a login name, and answers none here.
         const auto loginName = makeString(name.substr(0, name.size() - kDataFileSuffix.size()));
         if (loginName && !accountOf(provider, loginName.get()))
-            addNewAccount(provider, loginName.get(), FoundFile::open(dirfd(directory.get()), entry->d_name));
+            addNewAccount(provider, loginName.get(), FoundFile::open(dirfd(directory.get()), entry->d_name), path);
     }
 }
 
@@ -193,7 +195,7 @@ CSKavellAccountRef _CSKavellAccountProviderGetAccount(CSKavellAccountProviderRef
     if (!provider)
         return nullptr;
     CSKavellAccountRef existing = accountOf(*provider, loginName);
-    return existing || !create ? existing : addNewAccount(*provider, loginName, {});
+    return existing || !create ? existing : addNewAccount(*provider, loginName);
 }
 
 CSKavellAccountRef _CSKavellAccountProviderCopyAccount(CSKavellAccountProviderRef provider, CSKavellStringRef loginName,

@@ -72,9 +72,13 @@ template <typename Body> void forEachService(const CSKavellAccount &account, Bod
 /// The absolute path of the directory that holds all accounts, without a closing "/".
 [[nodiscard]] std::string dataRootPath();
 
-/// _CSKavellAccountCreate for an account whose data file was found in a listing of its directory.
-[[nodiscard]] CSKavellAccountRef createFoundAccount(FoundFile found, const CSKavellAllocator *allocator,
-                                                    CSKavellStringRef providerType,
+/// The absolute path of the directory that holds the accounts of a provider, without a closing "/".
+[[nodiscard]] std::string providerDirectoryPath(CSKavellStringRef providerType);
+
+/// _CSKavellAccountCreate for an account whose data file was found in a listing of its directory, with that directory's
+/// path; both empty for any other.
+[[nodiscard]] CSKavellAccountRef createFoundAccount(FoundFile found, std::string_view directory,
+                                                    const CSKavellAllocator *allocator, CSKavellStringRef providerType,
                                                     CSKavellStringRef loginName) noexcept;
 
 /// Brings the committed side up to what the data file says. False on a real error, after its message.
