@@ -17,6 +17,7 @@
 //     checkKills                    the program dies at any moment, and the system lives on
 //     checkPowerCutsWhileRecovering the power fails again while what the first cut left is put in order
 //     checkPowerCutsAfterKills      a program dies, another one saves over what it left, and then the power fails
+//     checkPowerCutsAfterFaults     a system call fails, whatever the program makes of it, and the power fails too
 //
 // How many states: CRASH_STATES=number in the environment is the most that are tried for one moment and one outcome of
 // the directories before they are picked at random (default below); CRASH_SEED=number repeats a run. Both are printed.
@@ -58,6 +59,8 @@ public:
     void checkKills();
     void checkPowerCutsWhileRecovering();
     void checkPowerCutsAfterKills();
+    /// Does something else from the start on, after which `found` is to be found or what was there before.
+    void checkPowerCutsAfterFaults(const std::function<void()> &act, const std::string &found);
 
 private:
     struct Step {
@@ -78,7 +81,7 @@ private:
     void forEachKill(const std::function<void(const Moment &, const Disk &)> &visit);
     void checkRecovery(const Moment &moment, const DiskState &state);
     void checkCutsOf(Disk disk, const std::vector<DiskOperation> &operations, bool isAtEndOnly,
-                     const std::string &found, const std::string &what);
+                     const std::vector<std::string> &allowed, const std::string &what);
     [[nodiscard]] bool isNew(const DiskState &state, const std::vector<std::string> &allowed);
     [[nodiscard]] std::string observeState(const DiskState &state);
     void check(const Moment &moment, const DiskState &state, const std::string &what);

@@ -242,7 +242,7 @@ long Recorder::onCall(SystemCall &call, const std::function<long()> &make)
     const Node node = nodeAt(call.path);
     const off_t offset =
         call.kind == CallKind::Write && call.offset < 0 ? lseek(call.descriptor, 0, SEEK_CUR) : call.offset;
-    const long result = make();
+    const long result = m_maker ? m_maker->onCall(call, make) : make();
     const int error = errno;
     require(call.kind != CallKind::Open || (call.flags & (O_TRUNC | O_APPEND)) == 0 || !m_directory.relative(call.path),
             "follow a file that is emptied or appended to when it is opened");

@@ -72,6 +72,12 @@ public:
     {
     }
 
+    /// Has the calls made by another observer, who may let them fail.
+    Recorder(WatchedDirectory &directory, SystemCallObserver &maker)
+        : m_directory(directory), m_refusal(Refusal::Nothing), m_maker(&maker)
+    {
+    }
+
     long onCall(SystemCall &call, const std::function<long()> &make) override;
 
     [[nodiscard]] const std::vector<DiskOperation> &operations() const { return m_operations; }
@@ -83,6 +89,7 @@ private:
 
     WatchedDirectory &m_directory;
     const Refusal m_refusal;
+    SystemCallObserver *const m_maker = nullptr;
     std::vector<DiskOperation> m_operations;
 };
 
