@@ -12,6 +12,7 @@
 #include <fcntl.h>
 #include <filesystem>
 #include <iostream>
+#include <malloc.h>
 #include <sys/stat.h>
 
 #include <gtest/gtest.h>
@@ -22,6 +23,14 @@ namespace {
 
 // After so many unlike outcomes the rest says nothing new.
 constexpr int kMostFailures = 10;
+// The allocator keeps about half of this at hand.
+constexpr size_t kMostKeptBytes = 8192;
+
+size_t memoryInUse()
+{
+    const struct mallinfo2 information = mallinfo2();
+    return information.uordblks + information.hblkhd;
+}
 
 bool movesBytes(CallKind kind)
 {
@@ -183,6 +192,7 @@ void forEachFault(const FaultRuns &runs, const std::function<void(FaultInjector 
     ASSERT_FALSE(counting.calls().empty());
     ASSERT_FALSE(testing::Test::HasFailure()) << "without a fault";
     size_t count = 0, struck = 0;
+    const size_t memory = memoryInUse();
     const auto *result = testing::UnitTest::GetInstance()->current_test_info()->result();
     for (size_t number = 0; number < counting.calls().size(); ++number) {
         const auto &call = counting.calls()[number];
@@ -201,6 +211,8 @@ void forEachFault(const FaultRuns &runs, const std::function<void(FaultInjector 
         }
     }
     EXPECT_GT(struck, count / 2);
+    // A leak in each run, or in each of a kind, comes to more; one in a single run is the sanitizer's to find.
+    EXPECT_LT(memoryInUse(), memory + kMostKeptBytes);
     std::cout << "[   FAULTS ] " << counting.calls().size() << " calls, " << count << " runs\n";
 }
 
