@@ -266,7 +266,7 @@ void CrashScenario::checkPowerCutsAfterFaults(const std::function<void()> &act, 
 {
     m_seen.clear();
     // What a call fails with matters to the messages, not to the disk.
-    forEachFault({.errors = {EIO}}, [&](FaultInjector &injector) {
+    forEachFault({.errors = {EIO}, .leaveNothing = false}, [&](FaultInjector &injector) {
         m_directory.make(m_start);
         Recorder recorder(m_directory, injector);
         {
