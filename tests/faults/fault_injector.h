@@ -84,7 +84,8 @@ private:
 struct FaultRuns {
     /// As on a file system that does not know how to rename a file unless the new name is taken.
     bool canRenameWithoutReplacing = true;
-    /// What a call that fails fails with.    std::vector<int> errors = {ENOSPC, EIO, EDQUOT, EACCES, EMFILE, EINTR};
+    /// What a call that fails fails with.
+    std::vector<int> errors = {ENOSPC, EIO, EDQUOT, EACCES, EMFILE, EINTR};
     /// Whether the runs leave no memory behind them, which is then looked at.
     bool leaveNothing = true;
 };
