@@ -9,6 +9,13 @@
 
 namespace kavell::test {
 
+const char *loadEventName(LoadEvent event)
+{
+    constexpr std::array kNames = {"unused",  "forgot", "will save", "will remove", "done",    "seen",     "status",
+                                   "missing", "take",   "release",   "creating",    "created", "removing", "removed"};
+    return kNames.at(static_cast<size_t>(event));
+}
+
 LoadLog *mapLoadLog(const char *path)
 {
     const int file = path ? open(path, O_RDWR | O_CREAT | O_CLOEXEC, 0600) : -1;

@@ -57,6 +57,8 @@ enum class LoadEvent : uint32_t {
     Removed,     ///< it is gone
 };
 
+[[nodiscard]] const char *loadEventName(LoadEvent event);
+
 struct LoadEntry {
     LoadEvent event = LoadEvent::Unused;
     bool flag = false;

@@ -125,6 +125,29 @@ protected:
         return outcome;
     }
 
+    /// The latest events of an account up to one of them, for a person who has to find out what went wrong.
+    std::string historyBefore(uint64_t last) const
+    {
+        constexpr size_t kMost = 60;
+        std::vector<std::string> lines;
+        for (uint64_t number = last + 1; number-- > 0 && lines.size() < kMost;) {
+            const LoadEntry &entry = m_log->entries[number];
+            if (entry.account != m_log->entries[last].account)
+                continue;
+            std::string line = std::to_string(number) + " process " + std::to_string(entry.process) + " worker " +
+                               std::to_string(entry.worker) + " " + loadEventName(entry.event) +
+                               (entry.flag ? "! " : " ") + std::to_string(entry.number) + " inode " +
+                               std::to_string(entry.inode) + ":";
+            for (uint32_t value : entry.values)
+                line += " " + std::to_string(value);
+            lines.push_back(std::move(line));
+        }
+        std::string history;
+        for (auto line = lines.rbegin(); line != lines.rend(); ++line)
+            history += *line + "\n";
+        return history;
+    }
+
     LoadLog *const m_log;
 
 private:
@@ -153,7 +176,7 @@ TEST_F(Load, SixteenProcessesAndTheirKillsLeaveWhatTheirHoldsAllow)
     const uint64_t count = m_log->count;
     ASSERT_LT(count, kMostLoadEntries);
     for (uint64_t number = 0; number < count; ++number)
-        ASSERT_EQ(judge.follow(m_log->entries[number]), "") << "event " << number;
+        ASSERT_EQ(judge.follow(m_log->entries[number]), "") << historyBefore(number);
 
     for (size_t account = 0; account < kLoadAccounts; ++account) {
         SCOPED_TRACE(loadLoginName(account));
