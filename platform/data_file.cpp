@@ -15,7 +15,6 @@
 #include <sys/stat.h>
 #include <thread>
 
-#include "platform/checksum.h"
 #include "platform/damaged_copy.h"
 #include "platform/file_io.h"
 #include "platform/redo_record.h"
@@ -199,7 +198,15 @@ bool reserveRoom(int file, size_t size) noexcept
     return result == 0 || errno == EOPNOTSUPP;
 }
 
-bool replaceInPlace(int file, const char *path, std::string_view contents, IntactCheck isIntact)
+/// Notes the modification time of a file while its flock is held.
+void noteTime(int file, FileTime *written) noexcept
+{
+    struct stat status;
+    if (written && fstat(file, &status) == 0)
+        *written = {status.st_mtim.tv_sec, status.st_mtim.tv_nsec};
+}
+
+bool replaceInPlace(int file, const char *path, std::string_view contents, IntactCheck isIntact, FileTime *written)
 {
     const std::string recordPath = siblingPath(path, kRedoRecordPrefix);
     struct stat status;
@@ -223,8 +230,10 @@ bool replaceInPlace(int file, const char *path, std::string_view contents, Intac
         return false;
     }
     if (overwrite(file, contents, status.st_size) && stampFile(file) &&
-        makeDurable(file, (status.st_mode & 07777) == 0600))
+        makeDurable(file, (status.st_mode & 07777) == 0600)) {
+        noteTime(file, written);
         return unlink(recordPath.c_str()) == 0 || errno == ENOENT;
+    }
     // Back to the old contents where they are known and can be put back; else the record stays and is finished later.
     if (record.oldContents && overwrite(file, oldContents, static_cast<off_t>(contents.size())) && syncData(file))
         unlink(recordPath.c_str());
@@ -248,7 +257,7 @@ Creation publish(const char *newPath, const char *path) noexcept
     return exists ? Creation::Exists : Creation::Failed;
 }
 
-Creation createWhole(const char *path, std::string_view contents)
+Creation createWhole(const char *path, std::string_view contents, FileTime *written)
 {
     static std::atomic<unsigned> counter{0};
     const std::string newPath = siblingPath(path, kNewFilePrefix) + "-" + std::to_string(getpid()) + "-" +
@@ -265,6 +274,7 @@ Creation createWhole(const char *path, std::string_view contents)
     }
     const Creation creation = publish(newPath.c_str(), path);
     if (creation == Creation::Done) {
+        noteTime(file.get(), written);
         // Whoever has the flock is the only one who may make a record; one that is there was left by an earlier file.
         unlink(siblingPath(path, kRedoRecordPrefix).c_str());
         if (!syncDirectoryOf(path))
@@ -318,20 +328,6 @@ FileRead readWithRecord(const char *path, FileContents &contents)
 
 }  // namespace
 
-std::string siblingPath(std::string_view path, std::string_view prefix)
-{
-    constexpr char kDigits[] = "0123456789abcdef";
-    const size_t nameStart = path.rfind('/') + 1;
-    const uint64_t hash = checksumOf(path.substr(nameStart));
-    std::string sibling;
-    // Room for what callers append.
-    sibling.reserve(nameStart + prefix.size() + 48);
-    sibling.append(path.substr(0, nameStart)).append(prefix);
-    for (int shift = 60; shift >= 0; shift -= 4)
-        sibling += kDigits[(hash >> shift) & 15];
-    return sibling;
-}
-
 FoundFile FoundFile::open(int directory, const char *name) noexcept
 {
     return {directory, openFile(name, O_RDONLY | kOpenFlags, 0, directory)};
@@ -346,17 +342,17 @@ FileRead readDataFile(const char *path, FileContents &contents, FoundFile found)
     });
 }
 
-bool writeDataFile(const char *path, std::string_view contents, IntactCheck isIntact) noexcept
+bool writeDataFile(const char *path, std::string_view contents, IntactCheck isIntact, FileTime *written) noexcept
 {
     if (!path || contents.size() > kLargestDataFile)
         return false;
     return guarded(false, [&] {
         for (int attempt = 0; attempt < kMostAttempts; ++attempt) {
             if (const LockedFile file(path, O_RDWR); file)
-                return replaceInPlace(file.get(), path, contents, isIntact);
+                return replaceInPlace(file.get(), path, contents, isIntact, written);
             if (errno != ENOENT)
                 return false;
-            const Creation creation = createWhole(path, contents);
+            const Creation creation = createWhole(path, contents, written);
             if (creation != Creation::Exists)
                 return creation == Creation::Done;
         }

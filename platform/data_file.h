@@ -19,6 +19,7 @@
 
 #include "platform/file_io.h"
 #include "platform/property_list_guard.h"
+#include "platform/sibling_path.h"
 
 namespace kavell {
 
@@ -57,20 +58,13 @@ using IntactCheck = bool (*)(std::string_view contents) noexcept;
 /// Makes `contents` the file's whole contents, durably, with permissions 0600; creates the file if need be, but not its
 /// directory. A file that `isIntact` does not accept is first kept beside it (damagedCopyPath); when that fails, or
 /// anything else, the file is as before and the result is false.
-[[nodiscard]] bool writeDataFile(const char *path, std::string_view contents, IntactCheck isIntact) noexcept;
+/// On success `*written`, unless null, is the modification time that this call gave the file; asked for later, it could be
+/// that of another program's save.
+[[nodiscard]] bool writeDataFile(const char *path, std::string_view contents, IntactCheck isIntact,
+                                 FileTime *written = nullptr) noexcept;
 
 /// Deletes the file, durably; false when it could not be deleted.
 [[nodiscard]] bool removeDataFile(const char *path) noexcept;
-
-/// What the names begin with that this code gives to files beside a data file; none of them ends in ".plist". Each is
-/// followed by 16 hexadecimal digits, the hash of the data file's name.
-inline constexpr std::string_view kRedoRecordPrefix = ".redo-";
-inline constexpr std::string_view kNewFilePrefix = ".new-";
-/// Followed by the hash, "-", and the time of keeping, as in damaged-0123456789abcdef-20260131T100000Z.
-inline constexpr std::string_view kDamagedCopyPrefix = "damaged-";
-
-/// The path beside a data file that consists of the prefix and the hash of the file's name.
-[[nodiscard]] std::string siblingPath(std::string_view path, std::string_view prefix);
 
 }  // namespace kavell
 

@@ -145,9 +145,8 @@ void writeUnderSemaphore(CSKavellAccount &account, std::string_view contents) no
     struct stat status;
     if (!LockDatafileAccess(account, queryStatus(account, status) ? &status : nullptr))
         return;
-    if (writeDataFile(account.dataFilePath.get(), contents, isPropertyList)) {
-        if (queryStatus(account, status))
-            account.dataFileModTime = modificationTime(status);
+    // The time is taken while nobody else can write: records of one account may hold different semaphores.
+    if (writeDataFile(account.dataFilePath.get(), contents, isPropertyList, &account.dataFileModTime)) {
         account.hasChanges = false;
     } else {
         writeError("Error: failed to save Kavell Settings datafile\n");

@@ -82,7 +82,7 @@ ExitCode runDoctor(const Words &words)
     line.expectNoMore();
     const std::vector<Address> accounts = accountsOnDisk();
     examineLocks(accounts, findings);
-    examineDirectories(accounts, findings);
+    examineDirectories(findings);
     examineContents(accounts, findings);
     examineSecrets(accounts, findings);
     const auto count = [&](auto holds) {

@@ -51,7 +51,7 @@ void examineLocks(const std::vector<Address> &accounts, Findings &findings);
 [[nodiscard]] std::optional<OpenedAccount> openForExamination(const Address &address, Findings &findings);
 
 /// Permissions of directories and files, files left over or kept, and entries that are no accounts but look like it.
-void examineDirectories(const std::vector<Address> &accounts, Findings &findings);
+void examineDirectories(Findings &findings);
 
 /// Data files that cannot be read or understood. Opening an account finishes its interrupted save.
 void examineContents(const std::vector<Address> &accounts, Findings &findings);

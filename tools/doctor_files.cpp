@@ -7,10 +7,10 @@
 #include <chrono>
 #include <cstring>
 #include <ctime>
-#include <endian.h>
 #include <fcntl.h>
 #include <filesystem>
-#include <map>
+#include <optional>
+#include <string_view>
 #include <sys/file.h>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -31,8 +31,28 @@ constexpr mode_t fileMode = 0600;
 /// A new file exists under its temporary name for milliseconds; one older than this was left over.
 constexpr time_t longestCreation = 60;
 
-/// Where a redo record names the inode of its data file (platform/redo_record.h).
-constexpr off_t redoInodeOffset = 8;
+constexpr std::string_view kDataFileSuffix = ".plist";
+
+std::vector<std::string> namesIn(const std::string &directory)
+{
+    std::vector<std::string> names;
+    std::error_code error;
+    for (std::filesystem::directory_iterator entry(directory, error), end; !error && entry != end;
+         entry.increment(error))
+        names.push_back(entry->path().filename().string());
+    std::sort(names.begin(), names.end());
+    return names;
+}
+
+bool isDataFileName(std::string_view name)
+{
+    return name.size() > kDataFileSuffix.size() && name.ends_with(kDataFileSuffix);
+}
+
+std::string loginOf(const std::string &dataFileName)
+{
+    return dataFileName.substr(0, dataFileName.size() - kDataFileSuffix.size());
+}
 
 std::string octal(mode_t mode)
 {
@@ -52,15 +72,23 @@ void examineMode(const std::string &path, const struct stat &status, mode_t want
                           [&] { return chmod(path.c_str(), wanted) == 0; });
 }
 
-/// The account whose data file the redo record was made for; none when that file is gone.
-const Address *accountOfRedoRecord(const std::string &path, const std::map<ino_t, Address> &accountsByInode)
+/// The inode of a file, 0 when there is none.
+ino_t inodeOf(const std::string &path)
 {
-    uint64_t inode = 0;
-    const FileDescriptor file(open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NOFOLLOW));
-    if (file.get() < 0 || pread(file.get(), &inode, sizeof inode, redoInodeOffset) != sizeof inode)
-        return nullptr;
-    const auto found = accountsByInode.find(static_cast<ino_t>(le64toh(inode)));
-    return found == accountsByInode.end() ? nullptr : &found->second;
+    struct stat status;
+    return lstat(path.c_str(), &status) == 0 ? status.st_ino : 0;
+}
+
+/// The account whose data file the redo record bears the name of; none when there is no such file. Looked for anew: an
+/// account may have been added since the accounts were listed, and its record be in use.
+std::optional<Address> accountOfRedoRecord(const std::string &path)
+{
+    const std::filesystem::path directory = std::filesystem::path(path).parent_path();
+    for (const std::string &name : namesIn(directory.string())) {
+        if (isDataFileName(name) && siblingPath((directory / name).string(), kRedoRecordPrefix) == path)
+            return Address{directory.filename().string(), loginOf(name)};
+    }
+    return std::nullopt;
 }
 
 /// Waits, for a bounded time, until nobody is inside the data file: a redo record that is still there then belongs to nobody.
@@ -71,22 +99,21 @@ void waitForWriters(const Address &address)
         (void)lockWithinBound(file.get(), LOCK_SH);
 }
 
-bool exists(const std::string &path)
+void examineRedoRecord(const std::string &path, Findings &findings)
 {
-    struct stat status;
-    return lstat(path.c_str(), &status) == 0;
-}
-
-void examineRedoRecord(const std::string &path, const std::map<ino_t, Address> &accountsByInode, Findings &findings)
-{
-    const Address *account = accountOfRedoRecord(path, accountsByInode);
+    const ino_t record = inodeOf(path);
+    const std::optional<Address> account = accountOfRedoRecord(path);
     if (account && !findings.untouchable.contains(*account))
         waitForWriters(*account);
-    if (!exists(path))
+    // What is gone by now belonged to a save that has come to its end, and another one's record is that one's own.
+    const auto isStillThere = [&] {
+        return record != 0 && inodeOf(path) == record;
+    };
+    if (!isStillThere())
         return;
     if (!account) {
         findings.mendable("left-over-record", path, escaped(path) + " is the record of a save whose file is gone",
-                          [&] { return unlink(path.c_str()) == 0; });
+                          [&] { return !isStillThere() || unlink(path.c_str()) == 0; });
         return;
     }
     const bool canOpen = !findings.untouchable.contains(*account);
@@ -94,7 +121,7 @@ void examineRedoRecord(const std::string &path, const std::map<ino_t, Address> &
                       [&] {
                           if (canOpen)
                               (void)openForExamination(*account, findings);
-                          return !exists(path);
+                          return !isStillThere();
                       });
     if (!findings.all.back().mended)
         findings.untouchable.insert(*account);
@@ -109,7 +136,7 @@ void examineTemporaryFile(const std::string &path, const struct stat &status, Fi
 
 void examineDataFile(const std::string &path, const std::string &name, const struct stat &status, Findings &findings)
 {
-    const std::string login = name.substr(0, name.size() - strlen(".plist"));
+    const std::string login = loginOf(name);
     if (!S_ISREG(status.st_mode))
         findings.problem("no-regular-file", path,
                          escaped(path) + " is no regular file, so it is not read as an account; move it away");
@@ -120,17 +147,16 @@ void examineDataFile(const std::string &path, const std::string &name, const str
         examineMode(path, status, fileMode, findings);
 }
 
-void examineEntry(const std::string &directory, const std::string &name,
-                  const std::map<ino_t, Address> &accountsByInode, Findings &findings)
+void examineEntry(const std::string &directory, const std::string &name, Findings &findings)
 {
     const std::string path = directory + "/" + name;
     struct stat status;
     if (lstat(path.c_str(), &status) != 0)
         return;
-    if (name.size() > strlen(".plist") && name.ends_with(".plist"))
+    if (isDataFileName(name))
         examineDataFile(path, name, status, findings);
     else if (name.starts_with(kRedoRecordPrefix))
-        examineRedoRecord(path, accountsByInode, findings);
+        examineRedoRecord(path, findings);
     else if (name.starts_with(kNewFilePrefix))
         examineTemporaryFile(path, status, findings);
     else if (name.starts_with(kDamagedCopyPrefix))
@@ -146,38 +172,15 @@ void examineDirectory(const std::string &path, Findings &findings)
         examineMode(path, status, directoryMode, findings);
 }
 
-std::vector<std::string> namesIn(const std::string &directory)
-{
-    std::vector<std::string> names;
-    std::error_code error;
-    for (std::filesystem::directory_iterator entry(directory, error), end; !error && entry != end;
-         entry.increment(error))
-        names.push_back(entry->path().filename().string());
-    std::sort(names.begin(), names.end());
-    return names;
-}
-
 void notExamined(const Address &address, Findings &findings)
 {
     findings.note("not-examined", dataFileOf(address), address.text() + " was not opened because of the problem above");
 }
 
-std::map<ino_t, Address> inodesOf(const std::vector<Address> &accounts)
-{
-    std::map<ino_t, Address> inodes;
-    for (const Address &address : accounts) {
-        struct stat status;
-        if (lstat(dataFileOf(address).c_str(), &status) == 0)
-            inodes[status.st_ino] = address;
-    }
-    return inodes;
-}
-
 }  // namespace
 
-void examineDirectories(const std::vector<Address> &accounts, Findings &findings)
+void examineDirectories(Findings &findings)
 {
-    const std::map<ino_t, Address> accountsByInode = inodesOf(accounts);
     const std::string root = dataRoot();
     examineDirectory(std::filesystem::path(root).parent_path().string(), findings);
     examineDirectory(root, findings);
@@ -187,7 +190,7 @@ void examineDirectories(const std::vector<Address> &accounts, Findings &findings
             continue;
         examineDirectory(directory, findings);
         for (const std::string &name : namesIn(directory))
-            examineEntry(directory, name, accountsByInode, findings);
+            examineEntry(directory, name, findings);
     }
 }
 

@@ -202,7 +202,9 @@ std::string LoadJudge::judgeSave(const LoadEntry &entry, Process &process, Accou
 std::string LoadJudge::release(const LoadEntry &entry, Process &process, Account &account)
 {
     if (entry.inode != account.inode) {
-        // The moment before is as good for reading.
+        // The moment before is as good for reading. Who wants to write lets go of it and looks anew.
+        if (!entry.isForReading)
+            return {};
         const auto deleted = account.deleted.find(entry.inode);
         if (deleted == account.deleted.end())
             return "a file that nobody made was released";

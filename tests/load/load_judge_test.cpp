@@ -49,6 +49,7 @@ protected:
         entry.worker = static_cast<uint16_t>(process - 1);
         entry.process = process;
         entry.number = number;
+        entry.isForReading = isReading;
         entry.inode = inode;
         entry.values = values;
         return judge.follow(entry);
@@ -64,6 +65,7 @@ protected:
     }
     std::string done(int32_t process) { return event(process, LoadEvent::Done, {}, 0, true); }
 
+    bool isReading = true;  ///< whether files are opened for nothing else from now on
     LoadJudge judge;
 };
 
@@ -180,6 +182,22 @@ TEST_F(LoadJudgeTest, WhoWaitedForAFileThatIsDeletedReadsTheMomentBefore)
                 hold(kBob, values(0), values(0)), event(kBob, LoadEvent::Seen, values(0), 0, true)}),
         "");
     EXPECT_EQ(event(kBob, LoadEvent::Take, values(4)), "a deleted file changed");
+}
+
+TEST_F(LoadJudgeTest, WhoWantsToWriteADeletedFileLearnsNothingFromIt)
+{
+    EXPECT_EQ(inTurn({willSave(kBob, 6), hold(kBob, values(0), values(0))}), "");
+    EXPECT_EQ(
+        inTurn({willSave(kAda, 5), hold(kAda, values(0), values(0)), hold(kAda, values(0), values(5)), done(kAda)}),
+        "");
+    EXPECT_EQ(inTurn({event(kAda, LoadEvent::WillRemove), event(kAda, LoadEvent::Take, values(5)),
+                      event(kAda, LoadEvent::Removing, values(5)), event(kAda, LoadEvent::Removed, values(5)),
+                      event(kAda, LoadEvent::Release, values(5)), done(kAda)}),
+              "");
+    isReading = false;
+    EXPECT_EQ(inTurn({hold(kBob, values(5), values(5)), event(kBob, LoadEvent::Creating, values(0, 6), kNewInode),
+                      event(kBob, LoadEvent::Created, values(0, 6), kNewInode), done(kBob)}),
+              "");
 }
 
 TEST_F(LoadJudgeTest, NoticesAFileMadeOverAnother)

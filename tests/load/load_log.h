@@ -2,7 +2,7 @@
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
 // What many processes did to many accounts, in the order in which it happened. Written by load_worker, whose own flock,
-// fstatat, unlink and renameat2 stand before the system's; read by the judge (load_judge.h) when all is over.
+// close, stat, unlink and renameat2 stand before the system's; read by the judge (load_judge.h) when all is over.
 //
 // Every event draws its number from one counter in memory that all processes share. What says that something begins is
 // drawn before it begins, and what says that it is over is drawn after it: two holds of one file never interleave, and a
@@ -62,6 +62,7 @@ enum class LoadEvent : uint32_t {
 struct LoadEntry {
     LoadEvent event = LoadEvent::Unused;
     bool flag = false;
+    bool isForReading = false;  ///< of a take or a release: the file was opened for nothing else
     uint16_t worker = 0;
     uint32_t account = 0;
     int32_t process = 0;

@@ -15,18 +15,20 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
-#include "platform/checksum.h"
+#include "platform/sibling_path.h"
 
 namespace kavell::test {
 
 namespace {
+
+constexpr std::string_view kSuffix = ".plist";
 
 std::optional<size_t> thisWorker;
 
 /// The account whose data file has the path, also after it was deleted.
 std::optional<size_t> accountOfPath(std::string_view path)
 {
-    constexpr std::string_view kPrefix = "account ", kSuffix = ".plist";
+    constexpr std::string_view kPrefix = "account ";
     const size_t name = path.rfind('/') + 1;
     if (!thisWorker || !path.substr(name).starts_with(kPrefix) || path.find(kSuffix, name) == std::string_view::npos)
         return std::nullopt;
@@ -58,12 +60,9 @@ LoadValues valuesIn(int file)
 
 bool hasRedoRecord(std::string_view path)
 {
-    const size_t name = path.rfind('/') + 1;
-    const std::string_view rest = path.substr(name);
-    std::array<char, 17> hash;
-    std::snprintf(hash.data(), hash.size(), "%016llx",
-                  static_cast<unsigned long long>(checksumOf(rest.substr(0, rest.find(".plist") + 6))));
-    return access((std::string(path.substr(0, name)) + ".redo-" + hash.data()).c_str(), F_OK) == 0;
+    // The path of a file that was deleted is followed by a remark.
+    const std::string_view dataFile = path.substr(0, path.rfind(kSuffix) + kSuffix.size());
+    return access(siblingPath(dataFile, kRedoRecordPrefix).c_str(), F_OK) == 0;
 }
 
 /// What stands in an open file.
@@ -86,6 +85,41 @@ std::optional<LoadEntry> entryAt(const char *path)
     const LoadEntry entry = entryOf(file);
     close(file);
     return entry;
+}
+
+/// What an open file says, and whether a redo record stands beside it.
+void recordHold(LoadEvent event, int file, const std::string &path, size_t account)
+{
+    LoadEntry entry = entryOf(file);
+    entry.flag = hasRedoRecord(path);
+    entry.isForReading = (fcntl(file, F_GETFL) & O_ACCMODE) == O_RDONLY;
+    recordLoad(event, account, entry);
+}
+
+/// The data file whose flock this process has. It never has two.
+struct {
+    int file = -1;
+    size_t account = 0;
+    std::string path;
+} held;
+
+void recordTake(int file)
+{
+    std::string path = pathOf(file);
+    const auto account = accountOfPath(path);
+    if (!account)
+        return;
+    held = {file, *account, std::move(path)};
+    recordHold(LoadEvent::Take, held.file, held.path, held.account);
+}
+
+/// Closing a file gives its flock back, too.
+void recordRelease(int file)
+{
+    if (file < 0 || file != held.file)
+        return;
+    held.file = -1;
+    recordHold(LoadEvent::Release, file, held.path, held.account);
 }
 
 template <typename Function> Function *systemFunction(const char *name)
@@ -133,31 +167,30 @@ extern "C" {
 [[gnu::visibility("default")]] int flock(int file, int operation) noexcept
 {
     static auto *const system = systemFunction<int(int, int)>("flock");
-    const std::string path = pathOf(file);
-    const auto account = accountOfPath(path);
-    const auto record = [&](LoadEvent event) {
-        LoadEntry entry = entryOf(file);
-        entry.flag = hasRedoRecord(path);
-        recordLoad(event, *account, entry);
-    };
-    if (account && operation == LOCK_UN)
-        record(LoadEvent::Release);
+    if (operation == LOCK_UN)
+        recordRelease(file);
     const int result = system(file, operation);
     const int error = errno;
-    if (account && result == 0 && operation != LOCK_UN)
-        record(LoadEvent::Take);
+    if (result == 0 && operation != LOCK_UN)
+        recordTake(file);
     errno = error;
     return result;
 }
 
-[[gnu::visibility("default")]] int fstatat(int directory, const char *path, struct stat *status, int flags) noexcept
+[[gnu::visibility("default")]] int close(int file)
 {
-    static auto *const system = systemFunction<int(int, const char *, struct stat *, int)>("fstatat");
-    // The scan of a directory asks without following links; a record asks for its own file.
-    const auto account = flags == 0 ? accountOfPath(path) : std::nullopt;
+    static auto *const system = systemFunction<int(int)>("close");
+    recordRelease(file);
+    return system(file);
+}
+
+[[gnu::visibility("default")]] int stat(const char *path, struct stat *status) noexcept
+{
+    static auto *const system = systemFunction<int(const char *, struct stat *)>("stat");
+    const auto account = accountOfPath(path);
     if (account)
         recordLoad(LoadEvent::Status, *account);
-    const int result = system(directory, path, status, flags);
+    const int result = system(path, status);
     const int error = errno;
     if (account && result != 0 && error == ENOENT)
         recordLoad(LoadEvent::Missing, *account);

@@ -60,6 +60,25 @@ protected:
     std::string m_recordPath = siblingPath(m_path, kRedoRecordPrefix);
 };
 
+TEST_F(DataFile, SaysWhichModificationTimeAReplacementGaveTheFile)
+{
+    writeFile(m_path, kOld);
+    FileTime written;
+    EXPECT_TRUE(writeDataFile(m_path.c_str(), kNew, isIntactAlways, &written));
+    struct stat status {};
+    ASSERT_EQ(stat(m_path.c_str(), &status), 0);
+    EXPECT_EQ(written, (FileTime{status.st_mtim.tv_sec, status.st_mtim.tv_nsec}));
+}
+
+TEST_F(DataFile, SaysWhichModificationTimeANewFileHas)
+{
+    FileTime written;
+    EXPECT_TRUE(writeDataFile(m_path.c_str(), kNew, isIntactAlways, &written));
+    struct stat status {};
+    ASSERT_EQ(stat(m_path.c_str(), &status), 0);
+    EXPECT_EQ(written, (FileTime{status.st_mtim.tv_sec, status.st_mtim.tv_nsec}));
+}
+
 TEST_F(DataFile, AReplacementThatHadNotBegunIsFinished)
 {
     writeFile(m_path, kOld);

@@ -258,6 +258,18 @@ TEST_F(DoctorCommand, FinishesAnInterruptedSave)
     EXPECT_EQ(readFile(m_path), newContents);
 }
 
+TEST_F(DoctorCommand, LeavesAFileWhoseRecordIsOfAnEarlierOne)
+{
+    const std::string contents = readFile(m_path);
+    const std::string record = siblingPath(m_path, kRedoRecordPrefix);
+    writeFile(record, encodeRedoRecord({1, contents, "new"}));
+
+    expectMended("unfinished-save");
+
+    EXPECT_FALSE(std::filesystem::exists(record));
+    EXPECT_EQ(readFile(m_path), contents);
+}
+
 TEST_F(DoctorCommand, RemovesTheRecordOfASaveWhoseFileIsGone)
 {
     const std::string record = siblingPath(dataFilePath(googleType, "gone"), kRedoRecordPrefix);
