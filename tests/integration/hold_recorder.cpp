@@ -9,7 +9,6 @@
 #include <dlfcn.h>
 #include <fcntl.h>
 #include <string>
-#include <string_view>
 #include <sys/mman.h>
 #include <sys/sem.h>
 #include <sys/stat.h>
@@ -96,15 +95,11 @@ extern "C" {
     return result;
 }
 
-[[gnu::visibility("default")]] int fstatat(int directory, const char *path, struct stat *status, int flags) noexcept
+[[gnu::visibility("default")]] int stat(const char *path, struct stat *status) noexcept
 {
-    static auto *const system = systemFunction<int(int, const char *, struct stat *, int)>("fstatat");
-    // The file may be asked for by its path, or by its name in the open directory.
-    const auto nameOf = [](std::string_view file) {
-        return file.substr(file.rfind('/') + 1);
-    };
-    if (sharedLog() && flags == 0 && nameOf(path) == nameOf(dataFile()))
+    static auto *const system = systemFunction<int(const char *, struct stat *)>("stat");
+    if (sharedLog() && std::strcmp(path, dataFile()) == 0)
         record(HoldEvent::Status, {});
-    return system(directory, path, status, flags);
+    return system(path, status);
 }
 }

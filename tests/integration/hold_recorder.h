@@ -2,7 +2,7 @@
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
 // The record of who held a data file's semaphore when, and what the file said. Written by store_probe, whose own semop
-// and fstatat stand before the system's, and judged by the tests.
+// and stat stand before the system's, and judged by the tests.
 //
 // Every event draws a number from one counter in memory that all processes share. A take draws it when the semaphore
 // has been taken and a release before it is given back, so the numbers of two holds never interleave. A status query
