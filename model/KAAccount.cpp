@@ -185,7 +185,7 @@ bool KAAccount::setPassword(const QString &password)
     // What is no whole text would be stored as another password than the one given.
     if (!password.isValidUtf16())
         return false;
-    return static_cast<bool>(adopt(_CSKavellAccountSetPassword(accountRef(), toStoreString(password).get())));
+    return static_cast<bool>(adopt(_CSKavellAccountSetPassword(accountRef(), toSecretString(password).get())));
 }
 
 void KAAccount::removePassword()

@@ -7,6 +7,7 @@
 #include <string_view>
 
 #include "runtime/object_p.h"
+#include "runtime/secret_memory.h"
 #include "runtime/string_p.h"
 
 /// The bytes follow the structure.
@@ -61,14 +62,24 @@ CSKavellTypeID CSKavellDataGetTypeID(void)
     return kTypeData;
 }
 
-CSKavellDataRef CSKavellDataCreate(const void *bytes, size_t length)
+static CSKavellDataRef makeData(const CSKavellAllocator *allocator, const void *bytes, size_t length) noexcept
 {
     if ((!bytes && length > 0) || length > SIZE_MAX / 2)
         return nullptr;
-    auto *data = makeObject<CSKavellData>(nullptr, kTypeData, length, length);
+    auto *data = makeObject<CSKavellData>(allocator, kTypeData, length, length);
     if (data && length > 0)
         std::memcpy(const_cast<uint8_t *>(data->bytes()), bytes, length);
     return data;
+}
+
+CSKavellDataRef CSKavellDataCreate(const void *bytes, size_t length)
+{
+    return makeData(nullptr, bytes, length);
+}
+
+CSKavellDataRef CSKavellDataCreateSecret(const void *bytes, size_t length)
+{
+    return makeData(&secretAllocator, bytes, length);
 }
 
 const uint8_t *CSKavellDataGetBytes(CSKavellDataRef data)

@@ -4,6 +4,7 @@
 #include <kavellaccounts/CSKavellString.h>
 #include <kavellaccounts/CSKavellType.h>
 
+#include "runtime/secret_memory.h"
 #include "runtime/string_p.h"
 #include "runtime/utf8.h"
 
@@ -107,6 +108,13 @@ CSKavellStringRef CSKavellStringCreateWithBytes(const char *bytes, size_t length
     if (!bytes || !isUTF8({bytes, length}))
         return nullptr;
     return makeValidString(nullptr, {bytes, length});
+}
+
+CSKavellStringRef CSKavellStringCreateSecret(const char *bytes, size_t length)
+{
+    if (!bytes || !isUTF8({bytes, length}))
+        return nullptr;
+    return makeValidString(&secretAllocator, {bytes, length});
 }
 
 CSKavellStringRef CSKavellStringCreateCopy(const CSKavellAllocator *allocator, CSKavellStringRef string)

@@ -416,7 +416,7 @@ bool KAAccountCreator::_enableBrondelService()
     const auto name = toStoreString(_corvaneID);
     const QString password = settingsText(KAMailPasswordKey);
     if (!NBSShimAccountIsLoggedIn(name.get()) && !password.isNull())
-        static_cast<void>(NBSShimAccountLogin(name.get(), toStoreString(password).get()));
+        static_cast<void>(NBSShimAccountLogin(name.get(), kavell::toSecretString(password).get()));
     if (serviceID)
         NBSShimServiceSetEnabled(name.get(), serviceID, true);
     return true;

@@ -181,7 +181,7 @@ CSKavellStringRef _CSKavellAccountCopyPassword(CSKavellAccountRef account)
         Secret secret;
         if (readPassword(account, Prompting::allowed, secret) != CredentialStatus::stored)
             return nullptr;
-        return CSKavellStringCreateWithBytes(secret.view().data(), secret.view().size());
+        return CSKavellStringCreateSecret(secret.view().data(), secret.view().size());
     });
 }
 

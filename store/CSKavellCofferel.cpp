@@ -262,7 +262,7 @@ CSKavellCofferelStatus CSKavellCofferelItemCopySecret(CSKavellCofferelItemRef it
         Secret bytes;
         const CredentialStatus status = readCofferelSecret(item->item, Prompting::allowed, bytes);
         if (status == CredentialStatus::stored && secret)
-            *secret = CSKavellDataCreate(bytes.view().data(), bytes.view().size());
+            *secret = CSKavellDataCreateSecret(bytes.view().data(), bytes.view().size());
         return status;
     });
 }

@@ -83,7 +83,8 @@ ExitCode setPassword(const CommandLine &line, const Address &address)
     const CSKavellCofferelStatus ready = CSKavellCofferelStoreUnlock();
     Ref<CSKavellCofferelItemRef> item;
     if (ready == kCSKavellCofferelStatusStored)
-        item = adopt(_CSKavellAccountSetPassword(account.record.get(), makeString(password).get()));
+        item = adopt(_CSKavellAccountSetPassword(
+            account.record.get(), adopt(CSKavellStringCreateSecret(password.data(), password.size())).get()));
     wipe(password);
     requireStored(ready, "the password of " + address.text() + " was not stored");
     if (!item)
@@ -108,11 +109,14 @@ ExitCode getPassword(const CommandLine &line, const Address &address)
     const Ref<CSKavellStringRef> password = adopt(_CSKavellAccountCopyPassword(account.record.get()));
     if (!password)
         throw Failure(ExitCode::Failed, what + ", or is not text");
-    std::string text = toStdString(password.get()) + "\n";
+    std::string text;
     if (line.json) {
         Json json = addressJson(address);
         json["password"] = std::string(toStringView(password.get()));
         text = textOf(json);
+    } else {
+        text.reserve(CSKavellStringGetLength(password.get()) + 1);
+        text.append(toStringView(password.get())).append("\n");
     }
     print(text);
     wipe(text);

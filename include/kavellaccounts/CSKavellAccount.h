@@ -151,7 +151,8 @@ CSKAVELL_EXPORT CSKavellCofferelItemRef _CSKavellAccountCopyCofferelItem(CSKavel
 /// Makes the account refer to an item, or to none. The change is pending until the account is committed.
 CSKAVELL_EXPORT void _CSKavellAccountSetCofferelItem(CSKavellAccountRef account, CSKavellCofferelItemRef item);
 
-/// The password (caller owns); none when there is no item, its secret cannot be read, or it is not UTF-8.
+/// The password (caller owns); none when there is no item, its secret cannot be read, or it is not UTF-8. Its memory is
+/// overwritten when the last reference goes.
 /// _CSKavellAccountGetPasswordStatus tells these apart.
 CSKAVELL_EXPORT CSKavellStringRef _CSKavellAccountCopyPassword(CSKavellAccountRef account) CSKAVELL_NODISCARD;
 

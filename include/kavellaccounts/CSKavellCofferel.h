@@ -85,7 +85,8 @@ CSKAVELL_EXPORT CSKavellDataRef CSKavellCofferelItemCopyPersistentReference(CSKa
 CSKAVELL_EXPORT CSKavellStringRef CSKavellCofferelItemCopyServiceName(CSKavellCofferelItemRef item) CSKAVELL_NODISCARD;
 CSKAVELL_EXPORT CSKavellStringRef CSKavellCofferelItemCopyAccountName(CSKavellCofferelItemRef item) CSKAVELL_NODISCARD;
 
-/// Reads the item's secret. On Stored `*secret` receives its bytes (caller owns).
+/// Reads the item's secret. On Stored `*secret` receives its bytes (caller owns), which are overwritten when the last
+/// reference goes.
 CSKAVELL_EXPORT CSKavellCofferelStatus CSKavellCofferelItemCopySecret(CSKavellCofferelItemRef item,
                                                                       CSKavellDataRef *secret);
 

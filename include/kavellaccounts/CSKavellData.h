@@ -17,6 +17,9 @@ CSKAVELL_EXPORT CSKavellTypeID CSKavellDataGetTypeID(void);
 /// Data (caller owns) with a copy of `length` bytes; none when `bytes` is NULL and `length` is not 0.
 CSKAVELL_EXPORT CSKavellDataRef CSKavellDataCreate(const void *bytes, size_t length) CSKAVELL_NODISCARD;
 
+/// The same for a secret: its memory is overwritten when the last reference goes.
+CSKAVELL_EXPORT CSKavellDataRef CSKavellDataCreateSecret(const void *bytes, size_t length) CSKAVELL_NODISCARD;
+
 /// The bytes, borrowed until the data is released; NULL for none. Never NULL for empty data.
 CSKAVELL_EXPORT const uint8_t *CSKavellDataGetBytes(CSKavellDataRef data);
 

@@ -21,6 +21,9 @@ CSKAVELL_EXPORT CSKavellStringRef CSKavellStringCreateWithUTF8(const char *text)
 /// UTF-8.
 CSKAVELL_EXPORT CSKavellStringRef CSKavellStringCreateWithBytes(const char *bytes, size_t length) CSKAVELL_NODISCARD;
 
+/// The same for a password: its memory is overwritten when the last reference goes.
+CSKAVELL_EXPORT CSKavellStringRef CSKavellStringCreateSecret(const char *bytes, size_t length) CSKAVELL_NODISCARD;
+
 /// A string (caller owns) equal to `string`, in memory of the allocator (NULL: malloc, and then the same object
 /// retained); none for none.
 CSKAVELL_EXPORT CSKavellStringRef CSKavellStringCreateCopy(const CSKavellAllocator *allocator,

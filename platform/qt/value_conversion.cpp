@@ -5,6 +5,7 @@
 
 #include <cmath>
 #include <limits>
+#include <string.h>
 #include <utility>
 #include <vector>
 
@@ -297,6 +298,16 @@ Ref<CSKavellStringRef> toStoreString(const QString &text)
         return nullptr;
     const QByteArray utf8 = text.toUtf8();
     return makeString({utf8.constData(), static_cast<size_t>(utf8.size())});
+}
+
+Ref<CSKavellStringRef> toSecretString(const QString &text)
+{
+    if (text.isNull())
+        return nullptr;
+    QByteArray utf8 = text.toUtf8();
+    auto secret = adopt(CSKavellStringCreateSecret(utf8.constData(), static_cast<size_t>(utf8.size())));
+    explicit_bzero(utf8.data(), static_cast<size_t>(utf8.size()));
+    return secret;
 }
 
 QVariant toVariant(CSKavellTypeRef object)

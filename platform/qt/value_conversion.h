@@ -41,6 +41,9 @@ namespace kavell {
 /// A string of the text, none for a null one. Halves of characters become U+FFFD.
 [[nodiscard]] Ref<CSKavellStringRef> toStoreString(const QString &text);
 
+/// The same of a password: overwritten when it is let go, and so is every copy that is made on the way.
+[[nodiscard]] Ref<CSKavellStringRef> toSecretString(const QString &text);
+
 /// The value of an object; invalid for none, for objects of other types than those above and URLs (which come out as
 /// QUrl), and for containers too deep for a property list. Whole numbers come out as qlonglong, or as qulonglong above
 /// its range. Members without a value are left out of their container.
