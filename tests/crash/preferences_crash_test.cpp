@@ -152,3 +152,17 @@ TEST_F(DamagedPreferencesCrash, KeepsWhatWasDamaged)
         foundAs(20001));
     checkEverything();
 }
+
+TEST_F(PreferencesCrash, LeavesPreferencesAsBeforeOrAsAfterWhereACallFailedToo)
+{
+    save(20001);
+    m_scenario->start(foundAs(20001));
+    const auto trySaving = [] {
+        const LogCapture log;
+        Preferences preferences(kDomain);
+        preferences.setObject(90002, kRound);
+        preferences.setObject(textOf(90002), kText);
+        static_cast<void>(preferences.synchronize());
+    };
+    m_scenario->checkPowerCutsAfterFaults(trySaving, foundAs(90002));
+}

@@ -122,6 +122,17 @@ TEST_F(VaultCrash, LeavesAChangedVaultAsBeforeOrAsAfter)
     checkEverything();
 }
 
+TEST_F(VaultCrash, LeavesAVaultAsBeforeOrAsAfterWhereACallFailedToo)
+{
+    add("ada", "one");
+    m_scenario->start("ada:one ");
+    const auto tryAdding = [this] {
+        CredentialItem item;
+        static_cast<void>(m_store->add(kService, "ben", std::string(900, 'b'), item));
+    };
+    m_scenario->checkPowerCutsAfterFaults(tryAdding, "ada:one ben:900xb ");
+}
+
 }  // namespace
 
 }  // namespace kavell::test
