@@ -257,15 +257,42 @@ Creation publish(const char *newPath, const char *path) noexcept
     return exists ? Creation::Exists : Creation::Failed;
 }
 
+/// Whether a record that an earlier file left could be taken for this file's: inodes' numbers are given out again.
+bool mayOwnRecord(int file, const std::string &recordPath)
+{
+    const FileDescriptor record = openFile(recordPath.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK);
+    FileContents bytes;
+    struct stat status;
+    if (!record)
+        return errno != ENOENT;
+    if (!bytes.read(record.get(), kLargestRedoRecord) || fstat(file, &status) != 0)
+        return true;
+    const auto decoded = decodeRedoRecord(bytes.view());
+    return decoded && decoded->inode == status.st_ino;
+}
+
+/// The file of a new account, before it has its name. A crash may leave it beside an earlier file's record, which must
+/// be void for it.
+FileDescriptor makeFirstFile(const std::string &newPath, const std::string &recordPath, std::string_view contents)
+{
+    FileDescriptor file = makeNewFile(newPath, contents);
+    // A process of this number may have died here before.
+    if (!file && errno == EEXIST && unlink(newPath.c_str()) == 0)
+        file = makeNewFile(newPath, contents);
+    if (!file || !mayOwnRecord(file.get(), recordPath))
+        return file;
+    // Its number stays taken while the next one is made.
+    const FileDescriptor taken = std::move(file);
+    return unlink(newPath.c_str()) == 0 ? makeNewFile(newPath, contents) : FileDescriptor();
+}
+
 Creation createWhole(const char *path, std::string_view contents, FileTime *written)
 {
     static std::atomic<unsigned> counter{0};
     const std::string newPath = siblingPath(path, kNewFilePrefix) + "-" + std::to_string(getpid()) + "-" +
                                 std::to_string(counter.fetch_add(1, std::memory_order_relaxed));
-    FileDescriptor file = makeNewFile(newPath, contents);
-    // A process of this number may have died here before.
-    if (!file && errno == EEXIST && unlink(newPath.c_str()) == 0)
-        file = makeNewFile(newPath, contents);
+    const std::string recordPath = siblingPath(path, kRedoRecordPrefix);
+    const FileDescriptor file = makeFirstFile(newPath, recordPath, contents);
     if (!file)
         return Creation::Failed;
     if (!lockFile(file.get())) {
@@ -276,7 +303,7 @@ Creation createWhole(const char *path, std::string_view contents, FileTime *writ
     if (creation == Creation::Done) {
         noteTime(file.get(), written);
         // Whoever has the flock is the only one who may make a record; one that is there was left by an earlier file.
-        unlink(siblingPath(path, kRedoRecordPrefix).c_str());
+        unlink(recordPath.c_str());
         if (!syncDirectoryOf(path))
             return Creation::Failed;
     }
