@@ -106,7 +106,11 @@ constinit DurableDirectories durableDirectories;
 bool makeDirectory(const std::string &path) noexcept
 {
     struct stat status;
-    const bool isMade = stat(path.c_str(), &status) != 0 && mkdir(path.c_str(), 0700) == 0;
+    const bool stands = stat(path.c_str(), &status) == 0;
+    // What the system or another user made is theirs to see to.
+    if (stands && status.st_uid != geteuid())
+        return true;
+    const bool isMade = !stands && mkdir(path.c_str(), 0700) == 0;
     // The process's file mode mask may have taken bits away.
     if (isMade)
         chmod(path.c_str(), 0700);
