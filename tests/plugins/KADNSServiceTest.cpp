@@ -6,6 +6,8 @@
 #include <atomic>
 #include <chrono>
 #include <cstdlib>
+#include <memory>
+#include <memory>
 #include <sys/socket.h>
 #include <sys/un.h>
 #include <thread>
@@ -176,6 +178,19 @@ TEST(KADNSServiceTest, AFloodOfGarbageDoesNotStretchTheTimeLimit)
     DnsServer server;
     server.flood("flood.example", 200000);
     EXPECT_LE(blockingTime("flood.example"), 550ms);
+}
+
+TEST(KADNSServiceTest, AServerThatDiesMeanwhileIsWaitedForNoLongerThanTheLimit)
+{
+    auto server = std::make_unique<DnsServer>();
+    server->neverAnswer("dies.example");
+    std::thread killer([&] {
+        while (server->queryCount("dies.example") == 0)
+            std::this_thread::sleep_for(1ms);
+        server.reset();
+    });
+    EXPECT_LE(blockingTime("dies.example"), 550ms);
+    killer.join();
 }
 
 TEST(KADNSServiceTest, ALateAnswerWithinTheLimitCounts)
