@@ -41,7 +41,11 @@ void configure(KADataPlugin *plugin, const QString &uid, QWidget *window)
     try {
         plugin->configureAccountUID(uid);
     } catch (const std::exception &error) {
-        QMessageBox::warning(window, qtTrId("PANE_TITLE"), pluginFailure(*plugin, error));
+        auto *const box = new QMessageBox(QMessageBox::Warning, qtTrId("PANE_TITLE"), pluginFailure(*plugin, error),
+                                          QMessageBox::Ok, window);
+        box->setAttribute(Qt::WA_DeleteOnClose);
+        box->setTextFormat(Qt::PlainText);  // the plug-in's words are no markup
+        box->open();
     }
 }
 

@@ -41,7 +41,7 @@ enum class Wish { automatic, secretService, vault, none };
 
 Wish wish()
 {
-    const char *variable = std::getenv("KAVELL_CREDENTIAL_STORE");
+    const char *variable = secure_getenv("KAVELL_CREDENTIAL_STORE");
     const std::string_view word = variable ? variable : "";
     if (word.empty() || word == "auto")
         return Wish::automatic;

@@ -63,10 +63,9 @@ bool isAllowedBehindPath(std::string_view text)
 
 std::vector<std::string> pluginDirectories()
 {
-    const char *const variable = std::getenv("VESK_FRAMEWORK_PATH");
-    std::string_view remaining = variable ? variable : "(null)";
+    const char *const variable = secure_getenv("VESK_FRAMEWORK_PATH");
     std::vector<std::string> directories;
-    for (;;) {
+    for (std::string_view remaining = variable ? variable : ""; variable;) {
         const size_t colon = remaining.find(':');
         directories.emplace_back(remaining.substr(0, colon));
         if (colon == std::string_view::npos)

@@ -72,7 +72,7 @@ bool ResolverQuery::makeChannel()
     }
     static constexpr ares_socket_functions functions = {openSocket, closeSocket, connectSocket, receive, send};
     ares_set_socket_functions(m_channel, &functions, this);
-    const char *servers = getenv("KAVELL_DNS_SERVERS");
+    const char *servers = secure_getenv("KAVELL_DNS_SERVERS");
     return !servers || ares_set_servers_ports_csv(m_channel, servers) == ARES_SUCCESS;
 }
 

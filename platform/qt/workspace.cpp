@@ -3,7 +3,10 @@
 
 #include "platform/qt/workspace.h"
 
+#include <cstdlib>
+
 #include <QtCore/QDir>
+#include <QtCore/QFile>
 #include <QtCore/QFileInfo>
 #include <QtCore/QSet>
 #include <QtCore/QStandardPaths>
@@ -37,7 +40,8 @@ QStringList entryDirectories()
 
 QStringList bundleDirectories()
 {
-    return qEnvironmentVariable("KAVELL_APPLICATION_PATH").split(u':', Qt::SkipEmptyParts) + entryDirectories();
+    const char *const named = secure_getenv("KAVELL_APPLICATION_PATH");
+    return QFile::decodeName(named).split(u':', Qt::SkipEmptyParts) + entryDirectories();
 }
 
 bool isEntry(const QString &path)

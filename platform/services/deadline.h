@@ -35,7 +35,7 @@ private:
 /// A number of milliseconds from the environment, within 1 ms and 10 minutes; the default when it is absent or not one.
 [[nodiscard]] inline std::chrono::milliseconds millisecondsFromEnvironment(const char *variable, int standard)
 {
-    const char *text = std::getenv(variable);
+    const char *text = secure_getenv(variable);
     char *end = nullptr;
     const long value = text ? std::strtol(text, &end, 10) : 0;
     return std::chrono::milliseconds(text && *text && *end == '\0' && value > 0 ? std::min(value, 600'000L) : standard);

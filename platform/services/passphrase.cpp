@@ -158,14 +158,14 @@ CredentialStatus readLine(int terminal, const Deadline &deadline, TypedLine &lin
 
 bool hasPassphraseFile()
 {
-    const char *path = std::getenv(kFileVariable);
+    const char *path = secure_getenv(kFileVariable);
     return path && *path;
 }
 
 CredentialStatus readPassphraseFile(Secret &passphrase)
 {
     // Not blocking: what stands there may be a pipe.
-    const FileDescriptor file = openFile(std::getenv(kFileVariable), O_RDONLY | O_NONBLOCK | O_NOCTTY);
+    const FileDescriptor file = openFile(secure_getenv(kFileVariable), O_RDONLY | O_NONBLOCK | O_NOCTTY);
     struct stat status {};
     if (!file || fstat(file.get(), &status) != 0 || !isPrivate(status))
         return CredentialStatus::locked;

@@ -17,11 +17,11 @@ namespace kavell {
 /// nobody and stay behind.
 [[nodiscard]] inline std::string sessionBusAddress()
 {
-    if (const char *address = std::getenv("DBUS_SESSION_BUS_ADDRESS"); address && *address) {
+    if (const char *address = secure_getenv("DBUS_SESSION_BUS_ADDRESS"); address && *address) {
         // "autolaunch:" would start a bus; it names none that stands.
         return std::string(address).starts_with("autolaunch:") ? std::string() : address;
     }
-    const char *directory = std::getenv("XDG_RUNTIME_DIR");
+    const char *directory = secure_getenv("XDG_RUNTIME_DIR");
     if (!directory || directory[0] != '/')
         return {};
     const std::string path = std::string(directory) + "/bus";

@@ -19,7 +19,7 @@ namespace {
 std::string dataDirectory()
 {
     // A relative path there is to be ignored, as the base directory rules say.
-    const char *data = std::getenv("XDG_DATA_HOME");
+    const char *data = secure_getenv("XDG_DATA_HOME");
     return data && data[0] == '/' ? std::string(data) : homeDirectory() + "/.local/share";
 }
 

@@ -10,6 +10,7 @@
 #include <sys/inotify.h>
 #include <unistd.h>
 
+#include <QtCore/QDir>
 #include <gmock/gmock.h>
 
 #include <kavellaccounts/KABundle.h>
@@ -59,6 +60,17 @@ protected:
         return fresh.pluginWithIdentifier(kExampleID) != nullptr;
     }
 };
+
+TEST_F(Searching, WithoutTheVariableNothingOfTheWorkingDirectoryIsLoaded)
+{
+    link("good/ExampleList.kaplugin", directory("(null)") + "/ExampleList.kaplugin");
+    const QString before = QDir::currentPath();
+    ASSERT_TRUE(QDir::setCurrent(scratch.path()));
+    unsetenv("VESK_FRAMEWORK_PATH");
+    KAPluginManager fresh;
+    EXPECT_FALSE(fresh.pluginWithIdentifier(kExampleID));
+    QDir::setCurrent(before);
+}
 
 TEST_F(Searching, PercentEscapesNameTheDecodedDirectory)
 {
