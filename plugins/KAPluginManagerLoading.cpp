@@ -9,7 +9,6 @@
 #include <algorithm>
 #include <dlfcn.h>
 #include <memory>
-#include <sys/stat.h>
 
 #include <kavellaccounts/KABundle.h>
 #include <kavellaccounts/KADescription.h>
@@ -216,8 +215,7 @@ QList<KAPluginManager::BundleReport> KAPluginManager::surveyBundles()
 void KAPluginManager::surveyDirectory(const std::string &path, QList<BundleReport> &reports)
 {
     const QString shownPath = QFile::decodeName(path.c_str());
-    struct stat status;
-    if (stat(path.c_str(), &status) != 0) {
+    if (!kavell::isSearchPathTaken(path)) {
         reports += {shownPath, {}, Outcome::DirectoryMissing, QStringLiteral("There is nothing at this path.")};
         return;
     }

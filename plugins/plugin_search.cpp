@@ -15,6 +15,7 @@ namespace kavell {
 
 namespace {
 
+constexpr std::string_view kUnsetVariable = "(null)";
 constexpr std::string_view kExtension = ".kaplugin";
 constexpr std::string_view kInformation = "/Contents/Info.plist";
 
@@ -64,8 +65,9 @@ bool isAllowedBehindPath(std::string_view text)
 std::vector<std::string> pluginDirectories()
 {
     const char *const variable = secure_getenv("VESK_FRAMEWORK_PATH");
+    std::string_view remaining = variable ? variable : kUnsetVariable;
     std::vector<std::string> directories;
-    for (std::string_view remaining = variable ? variable : ""; variable;) {
+    for (;;) {
         const size_t colon = remaining.find(':');
         directories.emplace_back(remaining.substr(0, colon));
         if (colon == std::string_view::npos)
@@ -74,6 +76,11 @@ std::vector<std::string> pluginDirectories()
     }
     directories.push_back(configuration::kSystemPluginDirectory.toStdString());
     return directories;
+}
+
+bool isSearchPathTaken(const std::string &path)
+{
+    return path != kUnsetVariable && access(path.c_str(), F_OK) == 0;
 }
 
 std::optional<std::string> listedDirectory(const std::string &path)
@@ -110,7 +117,7 @@ PluginDirectory::PluginDirectory(std::string path) : m_path(std::move(path)), m_
 
 void PluginDirectory::forEachUnsettledBundle(const std::function<bool(const std::string &)> &examine)
 {
-    if (!m_listed || access(m_path.c_str(), F_OK) != 0)
+    if (!m_listed || !isSearchPathTaken(m_path))
         return;
     const OpenDirectory directory(opendir(m_listed->c_str()));
     if (!directory)

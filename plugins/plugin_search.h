@@ -23,6 +23,10 @@ namespace kavell {
 /// counts as the text "(null)", which names no directory.
 [[nodiscard]] std::vector<std::string> pluginDirectories();
 
+/// Whether something is at a search path. Nothing ever is at "(null)": a directory of that name, wherever a program happens
+/// to be started, must not bring code into it.
+[[nodiscard]] bool isSearchPathTaken(const std::string &path);
+
 /// The directory that is listed for a search path. The path is taken as the path of a URL as it stands: percent escapes
 /// are decoded, "?" and "#" end it, and one with a character that a URL does not allow, such as a blank, lists nothing.
 [[nodiscard]] std::optional<std::string> listedDirectory(const std::string &path);
