@@ -143,7 +143,8 @@ void deleteDataFile(const CSKavellAccount &account) noexcept
 void writeUnderSemaphore(CSKavellAccount &account, std::string_view contents) noexcept
 {
     struct stat status;
-    if (!LockDatafileAccess(account, queryStatus(account, status) ? &status : nullptr))
+    const bool isNeeded = account.semaphoreID == 0;
+    if (!LockDatafileAccess(account, isNeeded && queryStatus(account, status) ? &status : nullptr))
         return;
     // The time is taken while nobody else can write: records of one account may hold different semaphores.
     if (writeDataFile(account.dataFilePath.get(), contents, isPropertyList, &account.dataFileModTime)) {

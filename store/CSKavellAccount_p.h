@@ -89,7 +89,7 @@ bool ReadAccountData(CSKavellAccount &account, FoundFile found = {}) noexcept;
 void UpdateServiceAttributes(CSKavellAccount &account, CSKavellDictionaryRef fileServices) noexcept;
 
 /// Takes the semaphore of the data file, waiting for as long as it takes; false when it cannot be taken. The status is the
-/// file's, from just before, or null when there is no file.
+/// file's, from just before, or null when there is no file; it is looked at only when the record has no semaphore yet.
 [[nodiscard]] bool LockDatafileAccess(CSKavellAccount &account, const struct stat *status) noexcept;
 
 /// Gives the semaphore back.
