@@ -283,6 +283,17 @@ PlistNode parsedTree(std::string_view xml) noexcept
     return tree && plist_get_node_type(tree.get()) == PLIST_DICT ? std::move(tree) : nullptr;
 }
 
+/// The document of an empty dictionary, written once.
+const std::string &emptyDocument()
+{
+    static const std::string document = [] {
+        std::string xml;
+        const auto empty = adopt(CSKavellDictionaryCreateMutable());
+        return empty && writeAnyPropertyList(empty.get(), xml) ? xml : std::string();
+    }();
+    return document;
+}
+
 }  // namespace
 
 Ref<CSKavellMutableDictionaryRef> parsePropertyList(std::string_view xml) noexcept
@@ -306,7 +317,16 @@ bool isPropertyList(std::string_view xml) noexcept
 
 bool writePropertyList(CSKavellDictionaryRef dictionary, std::string &xml) noexcept
 {
-    const PlistNode tree = dictionary ? NodeMaker().dictionary(dictionary, kRootDepth) : nullptr;
+    if (!dictionary)
+        return false;
+    return guarded(false, [&] {
+        return writePlainPropertyList(dictionary, emptyDocument(), xml) || writeAnyPropertyList(dictionary, xml);
+    });
+}
+
+bool writeAnyPropertyList(CSKavellDictionaryRef dictionary, std::string &xml)
+{
+    const PlistNode tree = NodeMaker().dictionary(dictionary, kRootDepth);
     if (!tree)
         return false;
     const CLocaleScope locale;
@@ -316,10 +336,8 @@ bool writePropertyList(CSKavellDictionaryRef dictionary, std::string &xml) noexc
     const std::unique_ptr<char, XMLDeleter> text(rawText);
     if (!text || length > kLargestDataFile)
         return false;
-    return guarded(false, [&] {
-        xml.assign(text.get(), length);
-        return true;
-    });
+    xml.assign(text.get(), length);
+    return true;
 }
 
 }  // namespace kavell

@@ -32,6 +32,9 @@ namespace kavell {
 /// allows, or more than the largest file.
 [[nodiscard]] bool writePropertyList(CSKavellDictionaryRef dictionary, std::string &xml) noexcept;
 
+/// The same without the quicker writer, whose text must be equal. May throw std::bad_alloc.
+[[nodiscard]] bool writeAnyPropertyList(CSKavellDictionaryRef dictionary, std::string &xml);
+
 }  // namespace kavell
 
 #endif

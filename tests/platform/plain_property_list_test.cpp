@@ -54,8 +54,16 @@ Ref<CSKavellMutableDictionaryRef> sample()
 std::string written(CSKavellDictionaryRef dictionary)
 {
     std::string xml;
-    EXPECT_TRUE(writePropertyList(dictionary, xml));
+    EXPECT_TRUE(writeAnyPropertyList(dictionary, xml));
     return xml;
+}
+
+/// What the quick writer writes; "(not plain)" when it does not.
+std::string writtenPlain(CSKavellDictionaryRef dictionary)
+{
+    static const std::string frame = written(adopt(CSKavellDictionaryCreateMutable()).get());
+    std::string xml = "(not plain)";
+    return writePlainPropertyList(dictionary, frame, xml) ? xml : "(not plain)";
 }
 
 /// The sample with its innermost text and nothing else that is long, so that all its neighbours can be tried.
@@ -206,6 +214,53 @@ TEST(PlainPropertyList, IsRightAboutEveryTextWithAPieceMoved)
                 isPlainAndRight(whole.substr(0, to) + piece + whole.substr(to));
         }
     }
+}
+
+/// A dictionary with the value as its only one.
+Ref<CSKavellMutableDictionaryRef> holding(CSKavellTypeRef value)
+{
+    const auto result = adopt(CSKavellDictionaryCreateMutable());
+    set(result, "k", value);
+    return result;
+}
+
+TEST(PlainPropertyList, IsWrittenAsTheGeneralWriterWritesIt)
+{
+    const auto inner = adopt(CSKavellDictionaryCreateMutable());
+    for (const char *each :
+         {"", "a", "<&>\"'", "]]>", " two  blanks ", "tab\tline\nreturn\r", "caf\xC3\xA9", "&amp;"}) {
+        set(inner, each, text(each).get());
+        EXPECT_EQ(writtenPlain(inner.get()), written(inner.get()));
+    }
+    const auto list = adopt(CSKavellArrayCreateMutable());
+    const auto all = holding(list.get());
+    set(all, "inner", inner.get());
+    for (const int64_t number : {int64_t{0}, int64_t{-7}, int64_t{993}, INT64_MIN, INT64_MAX})
+        CSKavellArrayAppendValue(list.get(), adopt(CSKavellNumberCreateWithInt64(number)).get());
+    CSKavellArrayAppendValue(list.get(), CSKavellBooleanGetShared(true));
+    CSKavellArrayAppendValue(list.get(), CSKavellBooleanGetShared(false));
+    CSKavellArrayAppendValue(list.get(), adopt(CSKavellArrayCreateMutable()).get());
+    CSKavellArrayAppendValue(list.get(), adopt(CSKavellDictionaryCreateMutable()).get());
+    CSKavellArrayAppendValue(list.get(), inner.get());
+    EXPECT_EQ(writtenPlain(all.get()), written(all.get()));
+}
+
+TEST(PlainPropertyList, LeavesWhatIsNotPlainToTheGeneralWriter)
+{
+    const auto circle = adopt(CSKavellDictionaryCreateMutable());
+    set(circle, "self", circle.get());
+    EXPECT_EQ(writtenPlain(circle.get()), "(not plain)");
+    CSKavellDictionaryRemoveValue(circle.get(), text("self").get());
+    EXPECT_EQ(writtenPlain(holding(adopt(CSKavellNumberCreateWithDouble(1.5)).get()).get()), "(not plain)");
+    EXPECT_EQ(writtenPlain(holding(adopt(CSKavellNumberCreateWithUInt64(UINT64_MAX)).get()).get()), "(not plain)");
+    EXPECT_EQ(writtenPlain(holding(adopt(CSKavellDateCreate(0)).get()).get()), "(not plain)");
+    EXPECT_EQ(writtenPlain(holding(adopt(CSKavellDataCreate("a", 1)).get()).get()), "(not plain)");
+    EXPECT_EQ(writtenPlain(holding(adopt(CSKavellUUIDCreate()).get()).get()), "(not plain)");
+    EXPECT_EQ(writtenPlain(holding(text("a\x01").get()).get()), "(not plain)");
+    EXPECT_EQ(writtenPlain(holding(text("\xEF\xBF\xBF").get()).get()), "(not plain)");
+    const auto numbered = adopt(CSKavellDictionaryCreateMutable());
+    CSKavellDictionarySetValue(numbered.get(), CSKavellBooleanGetShared(true), text("a").get());
+    EXPECT_EQ(writtenPlain(numbered.get()), "(not plain)");
 }
 
 }  // namespace
