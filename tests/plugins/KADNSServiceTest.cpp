@@ -7,7 +7,6 @@
 #include <chrono>
 #include <cstdlib>
 #include <memory>
-#include <memory>
 #include <sys/socket.h>
 #include <sys/un.h>
 #include <thread>
