@@ -4,6 +4,7 @@
 #include "platform/qt/desktop_entry.h"
 
 #include <QtCore/QFile>
+#include <QtCore/QFileInfo>
 #include <QtCore/QLocale>
 #include <QtCore/QStringList>
 
@@ -58,8 +59,9 @@ QStringList localizedNameKeys()
 
 std::optional<DesktopEntry> readDesktopEntry(const QString &path)
 {
+    // To open a pipe would wait for somebody who writes to it.
     QFile file(path);
-    if (!file.open(QIODevice::ReadOnly) || file.isSequential() || file.size() > kLargestEntry)
+    if (!QFileInfo(path).isFile() || !file.open(QIODevice::ReadOnly) || file.size() > kLargestEntry)
         return std::nullopt;
     const QStringList lines = QString::fromUtf8(file.readAll()).split(u'\n');
     QMap<QString, QString> values;
