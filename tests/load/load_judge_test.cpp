@@ -36,7 +36,7 @@ std::string inTurn(std::initializer_list<std::string> complaints)
 
 class LoadJudgeTest : public testing::Test {
 protected:
-    LoadJudgeTest() : LoadJudgeTest({}) {}
+    LoadJudgeTest() : LoadJudgeTest(std::set<int32_t>()) {}
     explicit LoadJudgeTest(std::set<int32_t> killed) : judge(std::move(killed)) { judge.begin(0, kInode); }
 
     /// Follows an event of a process, which is the worker of the number before its own.

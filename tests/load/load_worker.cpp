@@ -33,10 +33,7 @@ constexpr size_t kBusyAccounts = 20;
 
 class Worker {
 public:
-    explicit Worker(size_t worker)
-        : m_worker(worker), m_key(makeString(loadKey(worker))), m_random(std::random_device()())
-    {
-    }
+    explicit Worker(size_t worker) : m_key(makeString(loadKey(worker))), m_random(std::random_device()()) {}
 
     void workUntilOver()
     {
@@ -128,7 +125,6 @@ private:
         }
     }
 
-    const size_t m_worker;
     const Ref<CSKavellStringRef> m_key;
     std::mt19937 m_random;
     std::map<size_t, Account> m_records;
