@@ -25,9 +25,6 @@ namespace kavell {
 
 namespace {
 
-/// How deep containers may stand in one another here. Each takes a frame of the stack; what is deeper is not plain.
-constexpr int kDeepestContainer = 32;
-
 /// What texts may hold beyond the characters of ASCII that stand for themselves.
 struct Contents {
     bool areUnfit = false;  ///< control characters, which no text may hold; or a carriage return, which is not plain
@@ -241,19 +238,19 @@ private:
     [[nodiscard]] Value array(int depth)
     {
         const auto result = adopt(CSKavellArrayCreateMutable());
-        for (passBlanks(); result && depth < kDeepestContainer && !pass("</array>"); passBlanks()) {
+        for (passBlanks(); result && depth < kDeepestPlainContainer && !pass("</array>"); passBlanks()) {
             const Value element = value(depth);
             if (!element)
                 return nullptr;
             CSKavellArrayAppendValue(result.get(), element.get());
         }
-        return depth < kDeepestContainer ? Value(result) : nullptr;
+        return depth < kDeepestPlainContainer ? Value(result) : nullptr;
     }
 
     [[nodiscard]] Ref<CSKavellMutableDictionaryRef> dictionary(int depth)
     {
         const size_t first = m_pairs.size();
-        if (depth >= kDeepestContainer || !pairs(depth))
+        if (depth >= kDeepestPlainContainer || !pairs(depth))
             return nullptr;
         auto result = adopt(CSKavellDictionaryCreateMutable());
         const size_t count = m_pairs.size() - first;

@@ -18,6 +18,10 @@
 
 namespace kavell {
 
+/// How deep containers may stand in one another in the plain form. Each takes a frame of the stack; what is deeper, or
+/// goes in circles, is not plain.
+inline constexpr int kDeepestPlainContainer = 32;
+
 /// The dictionary that the general way would read from the text; none when the text is not of the plain form, which does
 /// not make it wrong. May throw std::bad_alloc.
 [[nodiscard]] Ref<CSKavellMutableDictionaryRef> parsePlainPropertyList(std::string_view xml);

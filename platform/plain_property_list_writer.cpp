@@ -20,9 +20,6 @@ namespace kavell {
 
 namespace {
 
-/// How deep containers may stand in one another here; what is deeper, or goes in circles, is not plain.
-constexpr int kDeepestContainer = 32;
-
 /// Adds objects to a text as the general way writes them. Each member answers false for what is not plain.
 class PlainWriter {
 public:
@@ -31,7 +28,7 @@ public:
     [[nodiscard]] bool dictionary(CSKavellDictionaryRef dictionary, int depth)
     {
         m_keys += dictionary->count;
-        if (depth >= kDeepestContainer || m_keys > kMostKeys || m_xml.size() > kLargestDataFile)
+        if (depth >= kDeepestPlainContainer || m_keys > kMostKeys || m_xml.size() > kLargestDataFile)
             return false;
         if (dictionary->count == 0)
             return line(depth, "<dict/>");
@@ -66,7 +63,7 @@ private:
     [[nodiscard]] bool array(CSKavellArrayRef array, int depth)
     {
         const size_t count = CSKavellArrayGetCount(array);
-        if (depth >= kDeepestContainer || m_xml.size() > kLargestDataFile)
+        if (depth >= kDeepestPlainContainer || m_xml.size() > kLargestDataFile)
             return false;
         if (count == 0)
             return line(depth, "<array/>");

@@ -31,6 +31,7 @@
 #include "platform/qt/main_thread.h"
 #include "platform/qt/value_conversion.h"
 
+using kavell::toSecretString;
 using kavell::toStoreString;
 
 namespace {
@@ -416,7 +417,7 @@ bool KAAccountCreator::_enableBrondelService()
     const auto name = toStoreString(_corvaneID);
     const QString password = settingsText(KAMailPasswordKey);
     if (!NBSShimAccountIsLoggedIn(name.get()) && !password.isNull())
-        static_cast<void>(NBSShimAccountLogin(name.get(), kavell::toSecretString(password).get()));
+        static_cast<void>(NBSShimAccountLogin(name.get(), toSecretString(password).get()));
     if (serviceID)
         NBSShimServiceSetEnabled(name.get(), serviceID, true);
     return true;

@@ -12,6 +12,7 @@
 #include <memory>
 #include <sys/stat.h>
 #include <unistd.h>
+#include <utility>
 
 #include <kavellaccounts/CSKavellDictionary.h>
 #include <kavellaccounts/CSKavellURL.h>
@@ -118,6 +119,13 @@ std::string dataFileOf(const Address &address)
     return providerDirectory(address.providerType) + "/" + address.login + std::string(dataFileSuffix);
 }
 
+std::optional<std::string> loginOfDataFile(std::string_view name)
+{
+    if (name.size() <= dataFileSuffix.size() || !name.ends_with(dataFileSuffix))
+        return std::nullopt;
+    return std::string(name.substr(0, name.size() - dataFileSuffix.size()));
+}
+
 std::vector<Address> accountsOnDisk(const std::optional<std::string> &providerType)
 {
     std::vector<Address> found;
@@ -125,8 +133,8 @@ std::vector<Address> accountsOnDisk(const std::optional<std::string> &providerTy
         providerType ? std::vector<std::string>{*providerType} : entriesOf(dataRoot(), S_IFDIR);
     for (const std::string &type : types)
         for (const std::string &name : entriesOf(providerDirectory(type), S_IFREG))
-            if (name.size() > dataFileSuffix.size() && name.ends_with(dataFileSuffix) && isUTF8(name) && isUTF8(type))
-                found.push_back({type, name.substr(0, name.size() - dataFileSuffix.size())});
+            if (auto login = loginOfDataFile(name); login && isUTF8(name) && isUTF8(type))
+                found.push_back({type, std::move(*login)});
     std::sort(found.begin(), found.end());
     return found;
 }

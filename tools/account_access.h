@@ -49,6 +49,9 @@ struct Address {
 /// Whether something stands in the data file's place.
 [[nodiscard]] bool isOnDisk(const Address &address);
 
+/// The login name that a directory entry of this name is the data file of; none when it is not named like one.
+[[nodiscard]] std::optional<std::string> loginOfDataFile(std::string_view name);
+
 /// Whether it is a file, and no directory or device.
 [[nodiscard]] bool isRegularFile(const Address &address);
 

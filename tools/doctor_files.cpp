@@ -10,10 +10,10 @@
 #include <fcntl.h>
 #include <filesystem>
 #include <optional>
-#include <string_view>
 #include <sys/file.h>
 #include <sys/stat.h>
 #include <unistd.h>
+#include <utility>
 
 #include "platform/data_file.h"
 #include "tools/doctor.h"
@@ -31,8 +31,6 @@ constexpr mode_t fileMode = 0600;
 /// A new file exists under its temporary name for milliseconds; one older than this was left over.
 constexpr time_t longestCreation = 60;
 
-constexpr std::string_view kDataFileSuffix = ".plist";
-
 std::vector<std::string> namesIn(const std::string &directory)
 {
     std::vector<std::string> names;
@@ -42,16 +40,6 @@ std::vector<std::string> namesIn(const std::string &directory)
         names.push_back(entry->path().filename().string());
     std::sort(names.begin(), names.end());
     return names;
-}
-
-bool isDataFileName(std::string_view name)
-{
-    return name.size() > kDataFileSuffix.size() && name.ends_with(kDataFileSuffix);
-}
-
-std::string loginOf(const std::string &dataFileName)
-{
-    return dataFileName.substr(0, dataFileName.size() - kDataFileSuffix.size());
 }
 
 std::string octal(mode_t mode)
@@ -85,8 +73,9 @@ std::optional<Address> accountOfRedoRecord(const std::string &path)
 {
     const std::filesystem::path directory = std::filesystem::path(path).parent_path();
     for (const std::string &name : namesIn(directory.string())) {
-        if (isDataFileName(name) && siblingPath((directory / name).string(), kRedoRecordPrefix) == path)
-            return Address{directory.filename().string(), loginOf(name)};
+        if (auto login = loginOfDataFile(name);
+            login && siblingPath((directory / name).string(), kRedoRecordPrefix) == path)
+            return Address{directory.filename().string(), std::move(*login)};
     }
     return std::nullopt;
 }
@@ -134,9 +123,8 @@ void examineTemporaryFile(const std::string &path, const struct stat &status, Fi
                           [&] { return unlink(path.c_str()) == 0; });
 }
 
-void examineDataFile(const std::string &path, const std::string &name, const struct stat &status, Findings &findings)
+void examineDataFile(const std::string &path, const std::string &login, const struct stat &status, Findings &findings)
 {
-    const std::string login = loginOf(name);
     if (!S_ISREG(status.st_mode))
         findings.problem("no-regular-file", path,
                          escaped(path) + " is no regular file, so it is not read as an account; move it away");
@@ -153,8 +141,8 @@ void examineEntry(const std::string &directory, const std::string &name, Finding
     struct stat status;
     if (lstat(path.c_str(), &status) != 0)
         return;
-    if (isDataFileName(name))
-        examineDataFile(path, name, status, findings);
+    if (const auto login = loginOfDataFile(name))
+        examineDataFile(path, *login, status, findings);
     else if (name.starts_with(kRedoRecordPrefix))
         examineRedoRecord(path, findings);
     else if (name.starts_with(kNewFilePrefix))

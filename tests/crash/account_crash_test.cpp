@@ -146,14 +146,6 @@ protected:
             name, [round] { save(round); }, foundAs(round), refusal);
     }
 
-    void checkEverything()
-    {
-        m_scenario->checkPowerCuts();
-        m_scenario->checkKills();
-        m_scenario->checkPowerCutsWhileRecovering();
-        m_scenario->checkPowerCutsAfterKills();
-    }
-
     StandardErrorCapture m_errors;
     std::unique_ptr<WatchedDirectory> m_watched;
     std::unique_ptr<CrashScenario> m_scenario;
@@ -193,7 +185,7 @@ TEST_F(AccountCrash, LeavesANewAccountWholeOrNotThere)
 {
     m_scenario->start(std::string(kNothing));
     saveStep("create", 300001);
-    checkEverything();
+    m_scenario->checkEverything();
 }
 
 TEST_F(AccountCrash, LeavesAChangedAccountAsBeforeOrAsAfter)
@@ -202,7 +194,7 @@ TEST_F(AccountCrash, LeavesAChangedAccountAsBeforeOrAsAfter)
     m_scenario->start(foundAs(300001));
     saveStep("change", 300002);
     saveStep("change again", 300003);
-    checkEverything();
+    m_scenario->checkEverything();
 }
 
 TEST_F(AccountCrash, LeavesAGrowingAccountAsBeforeOrAsAfter)
@@ -212,7 +204,7 @@ TEST_F(AccountCrash, LeavesAGrowingAccountAsBeforeOrAsAfter)
     saveStep("grow within a sector", 6002);
     saveStep("grow over sectors", 120003);
     saveStep("grow over pages", 900004);
-    checkEverything();
+    m_scenario->checkEverything();
 }
 
 TEST_F(AccountCrash, LeavesAShrinkingAccountAsBeforeOrAsAfter)
@@ -222,7 +214,7 @@ TEST_F(AccountCrash, LeavesAShrinkingAccountAsBeforeOrAsAfter)
     saveStep("shrink over pages", 420002);
     saveStep("shrink over sectors", 110003);
     saveStep("shrink within a sector", 104);
-    checkEverything();
+    m_scenario->checkEverything();
 }
 
 TEST_F(AccountCrash, LeavesARemovedAccountWholeOrGone)
@@ -230,7 +222,7 @@ TEST_F(AccountCrash, LeavesARemovedAccountWholeOrGone)
     save(200001);
     m_scenario->start(foundAs(200001));
     m_scenario->step("remove", remove, std::string(kNothing));
-    checkEverything();
+    m_scenario->checkEverything();
 }
 
 TEST_F(AccountCrash, LeavesARemovedAccountWholeOrGoneWhereAReplacementHadBeenCutOff)
@@ -238,7 +230,7 @@ TEST_F(AccountCrash, LeavesARemovedAccountWholeOrGoneWhereAReplacementHadBeenCut
     putTornAccount(200001, 160002);
     m_scenario->start(foundAs(160002));
     m_scenario->step("remove", remove, std::string(kNothing));
-    checkEverything();
+    m_scenario->checkEverything();
 }
 
 TEST_F(AccountCrash, LeavesARemovedAccountWholeOrGoneWhereAReplacementCannotBeFinished)
@@ -246,7 +238,7 @@ TEST_F(AccountCrash, LeavesARemovedAccountWholeOrGoneWhereAReplacementCannotBeFi
     putTornAccount(200001, 160002);
     m_scenario->start(foundAs(160002));
     m_scenario->step("remove", remove, std::string(kNothing), Refusal::Writes);
-    checkEverything();
+    m_scenario->checkEverything();
 }
 
 TEST_F(AccountCrash, MakesAnAccountsPermissionsThoseOfItsOwnerAlone)
@@ -255,7 +247,7 @@ TEST_F(AccountCrash, MakesAnAccountsPermissionsThoseOfItsOwnerAlone)
     chmod(fileOf().c_str(), 0644);
     m_scenario->start(foundAs(30001) + ", open to others");
     saveStep("change", 30002);
-    checkEverything();
+    m_scenario->checkEverything();
 }
 
 TEST_F(AccountCrash, LeavesANewAccountWholeOrNotThereWhereItIsNamedByALink)
@@ -264,14 +256,14 @@ TEST_F(AccountCrash, LeavesANewAccountWholeOrNotThereWhereItIsNamedByALink)
     saveStep("create", 100001, Refusal::NewNames);
     saveStep("change", 90002);
     m_scenario->step("remove", remove, std::string(kNothing));
-    checkEverything();
+    m_scenario->checkEverything();
 }
 
 TEST_F(DamagedAccountCrash, KeepsWhatWasDamaged)
 {
     m_scenario->start(std::string(kDamaged));
     saveStep("save over it", 20001);
-    checkEverything();
+    m_scenario->checkEverything();
 }
 
 TEST_F(AccountCrash, TakesNothingOfAnEarlierLifeIntoALaterOne)
@@ -283,7 +275,7 @@ TEST_F(AccountCrash, TakesNothingOfAnEarlierLifeIntoALaterOne)
     saveStep("create anew", 60001);
     saveStep("shrink", 20003);
     m_scenario->step("remove again", remove, std::string(kNothing));
-    checkEverything();
+    m_scenario->checkEverything();
 }
 
 TEST_F(AccountCrash, LeavesAChangedAccountAsBeforeOrAsAfterWhereACallFailedToo)

@@ -187,6 +187,14 @@ void CrashScenario::check(const Moment &moment, const DiskState &state, const st
         report({moment.operations, {next}}, state, what + ", and one more save,", later);
 }
 
+void CrashScenario::checkEverything()
+{
+    checkPowerCuts();
+    checkKills();
+    checkPowerCutsWhileRecovering();
+    checkPowerCutsAfterKills();
+}
+
 void CrashScenario::checkPowerCuts()
 {
     m_seen.clear();

@@ -55,6 +55,8 @@ public:
     void step(const std::string &name, const std::function<void()> &act, const std::string &found,
               Refusal refusal = Refusal::Nothing);
 
+    /// The four that follow.
+    void checkEverything();
     void checkPowerCuts();
     void checkKills();
     void checkPowerCutsWhileRecovering();

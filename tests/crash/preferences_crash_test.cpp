@@ -80,14 +80,6 @@ protected:
             name, [round] { save(round); }, foundAs(round));
     }
 
-    void checkEverything()
-    {
-        m_scenario->checkPowerCuts();
-        m_scenario->checkKills();
-        m_scenario->checkPowerCutsWhileRecovering();
-        m_scenario->checkPowerCutsAfterKills();
-    }
-
     std::unique_ptr<WatchedDirectory> m_watched;
     std::unique_ptr<CrashScenario> m_scenario;
 };
@@ -127,7 +119,7 @@ TEST_F(PreferencesCrash, LeavesTheFirstPreferencesWholeOrNotThere)
 {
     m_scenario->start("nothing");
     saveStep("create", 200001);
-    checkEverything();
+    m_scenario->checkEverything();
 }
 
 TEST_F(PreferencesCrash, LeavesPreferencesAsBeforeOrAsAfter)
@@ -137,7 +129,7 @@ TEST_F(PreferencesCrash, LeavesPreferencesAsBeforeOrAsAfter)
     saveStep("change", 200002);
     saveStep("grow", 400003);
     saveStep("shrink", 50004);
-    checkEverything();
+    m_scenario->checkEverything();
 }
 
 TEST_F(DamagedPreferencesCrash, KeepsWhatWasDamaged)
@@ -150,7 +142,7 @@ TEST_F(DamagedPreferencesCrash, KeepsWhatWasDamaged)
             save(20001);
         },
         foundAs(20001));
-    checkEverything();
+    m_scenario->checkEverything();
 }
 
 TEST_F(PreferencesCrash, LeavesPreferencesAsBeforeOrAsAfterWhereACallFailedToo)

@@ -45,6 +45,25 @@ protected:
         ASSERT_NE(m_store, nullptr);
     }
 
+    /// Reads an item while a call fails: its secret whole or not at all, with nothing left open and nothing changed.
+    CredentialStatus readWhileFailing(FaultInjector &injector)
+    {
+        const size_t descriptors = countOpenDescriptors();
+        CredentialStatus status = CredentialStatus::absent;
+        Secret secret;
+        {
+            const Observation observation(injector);
+            status = m_store->readSecret(m_ben, secret);
+        }
+        EXPECT_EQ(secret.view(), status == CredentialStatus::stored ? "b" : "");
+        if (status != CredentialStatus::stored) {
+            EXPECT_FALSE(injector.fault().isPassing(injector.failed()->kind));
+        }
+        EXPECT_EQ(countOpenDescriptors(), descriptors);
+        EXPECT_EQ(readFile(vaultPath()), m_before);
+        return status;
+    }
+
     /// Every item with the length of its secret.
     std::string observe()
     {
@@ -124,20 +143,9 @@ TEST_F(VaultFaults, ARemovalIsDoneOrSaysThatItFailed)
 TEST_F(VaultFaults, ASecretIsReadWholeOrNotAtAll)
 {
     forEachFault({}, [&](FaultInjector &injector) {
-        const size_t descriptors = countOpenDescriptors();
-        CredentialStatus status = CredentialStatus::absent;
-        Secret secret;
-        {
-            const Observation observation(injector);
-            status = m_store->readSecret(m_ben, secret);
-        }
-        EXPECT_EQ(secret.view(), status == CredentialStatus::stored ? "b" : "");
-        if (status != CredentialStatus::stored) {
-            EXPECT_EQ(status, CredentialStatus::failed);
-            EXPECT_FALSE(injector.fault().isPassing(injector.failed()->kind));
-        }
-        EXPECT_EQ(countOpenDescriptors(), descriptors);
-        EXPECT_EQ(readFile(vaultPath()), m_before);
+        const CredentialStatus status = readWhileFailing(injector);
+        EXPECT_TRUE(status == CredentialStatus::stored || status == CredentialStatus::failed)
+            << credentialStatusName(status);
     });
 }
 
@@ -145,21 +153,10 @@ TEST_F(VaultFaults, APassphraseThatCannotBeReadLeavesTheVaultClosed)
 {
     forEachFault({}, [&](FaultInjector &injector) {
         openStore();
-        const size_t descriptors = countOpenDescriptors();
-        CredentialStatus status = CredentialStatus::absent;
-        Secret secret;
-        {
-            const Observation observation(injector);
-            status = m_store->readSecret(m_ben, secret);
-        }
-        EXPECT_EQ(secret.view(), status == CredentialStatus::stored ? "b" : "");
-        if (status != CredentialStatus::stored) {
-            EXPECT_TRUE(status == CredentialStatus::failed || status == CredentialStatus::locked)
-                << credentialStatusName(status);
-            EXPECT_FALSE(injector.fault().isPassing(injector.failed()->kind));
-        }
-        EXPECT_EQ(countOpenDescriptors(), descriptors);
-        EXPECT_EQ(readFile(vaultPath()), m_before);
+        const CredentialStatus status = readWhileFailing(injector);
+        EXPECT_TRUE(status == CredentialStatus::stored || status == CredentialStatus::failed ||
+                    status == CredentialStatus::locked)
+            << credentialStatusName(status);
     });
 }
 
