@@ -27,7 +27,7 @@ namespace {
 
 /// What texts may hold beyond the characters of ASCII that stand for themselves.
 struct Contents {
-    bool areUnfit = false;  ///< control characters, which no text may hold; or a carriage return, which is not plain
+    bool areUnfit = false;  ///< what no text may hold (isXMLText); or a carriage return, which is not plain
     bool haveReferences = false;
     bool haveOtherThanASCII = false;
 };
@@ -42,7 +42,8 @@ Contents contentsOf(std::string_view xml) noexcept
         references |= static_cast<uint8_t>(byte == '&');
         all |= byte;
     }
-    return {unfit != 0, references != 0, (all & 0x80) != 0};
+    const bool haveOtherThanASCII = (all & 0x80) != 0;
+    return {unfit != 0 || (haveOtherThanASCII && !isXMLText(xml)), references != 0, haveOtherThanASCII};
 }
 
 /// The references by name (XML 1.0, section 4.6).

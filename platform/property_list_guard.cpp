@@ -250,7 +250,7 @@ bool hasControlCharacter(std::string_view text) noexcept
 
 bool isSafePropertyList(std::string_view xml) noexcept
 {
-    return !hasControlCharacter(xml) && isUTF8(xml) && MarkupWalk(xml).isSafe();
+    return isXMLText(xml) && isUTF8(xml) && MarkupWalk(xml).isSafe();
 }
 
 bool isXMLText(std::string_view text) noexcept

@@ -30,9 +30,9 @@ inline constexpr int64_t kPropertyListEpoch = 978307200;
 inline constexpr int64_t kEarliestDate = kPropertyListEpoch + INT32_MIN;
 inline constexpr int64_t kLatestDate = kPropertyListEpoch + INT32_MAX;
 
-/// Whether the text may be handed to the parser: UTF-8 without control characters, written out or as references, elements
-/// that are all closed and no deeper than kDeepestPropertyList, at most kMostKeys keys, no document-type subset, and only
-/// well-formed references, numbers, dates and data within their ranges.
+/// Whether the text may be handed to the parser: UTF-8 of characters that can be written again (isXMLText), be they
+/// written out or references, elements that are all closed and no deeper than kDeepestPropertyList, at most kMostKeys keys,
+/// no document-type subset, and only well-formed references, numbers, dates and data within their ranges.
 [[nodiscard]] bool isSafePropertyList(std::string_view xml) noexcept;
 
 /// Whether a string can stand in an XML document: without control characters but for tab, line feed and carriage

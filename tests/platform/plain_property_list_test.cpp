@@ -148,11 +148,18 @@ TEST(PlainPropertyList, LeavesWhatIsNotPlainToTheGeneralReader)
         "<dict><string>a</string></dict>",
         "<string>\xC3</string>",
         "<string>a\x01</string>",
+        "<string>a\xEF\xBF\xBE</string>",
+        "<string>a\xEF\xBF\xBF</string>",
         "<unknown/>",
         "<string>a</string",
     };
     for (const char *value : values)
         EXPECT_FALSE(isPlainAndRight(document(value))) << value;
+}
+
+TEST(PlainPropertyList, ReadsTheNeighboursOfCharactersThatNoDocumentMayHave)
+{
+    EXPECT_TRUE(isPlainAndRight(document("<string>\xEF\xBF\xBD \xEF\xBE\xBF \xF0\x90\x80\x80</string>")));
 }
 
 TEST(PlainPropertyList, LeavesOtherHeadsAndTailsToTheGeneralReader)

@@ -78,6 +78,13 @@ TEST(KABundle, WithoutReadableInformationIsNone)
     EXPECT_FALSE(KABundle::bundleWithPath(directory.path()));
 }
 
+TEST(KABundle, InformationThatCouldNotBeWrittenAgainIsNone)
+{
+    const QTemporaryDir directory;
+    writeInformation(directory.path(), informationWithIdentifier("<string>first\xEF\xBF\xBF</string>"));  // U+FFFF
+    EXPECT_FALSE(KABundle::bundleWithPath(directory.path()));
+}
+
 TEST(KABundle, IdentifierThatIsNoTextIsNull)
 {
     const QTemporaryDir directory;

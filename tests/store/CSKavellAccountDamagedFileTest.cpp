@@ -174,6 +174,29 @@ TEST_F(DamagedFile, AReferenceToACharacterThatCouldNotBeWrittenAgainIsRefused)
     }
 }
 
+TEST_F(DamagedFile, ACharacterThatCouldNotBeWrittenAgainIsRefused)
+{
+    for (const char *character : {"\xEF\xBF\xBE", "\xEF\xBF\xBF"}) {  // U+FFFE and U+FFFF, which XML does not have
+        SCOPED_TRACE(character);
+        expectRefused(accountFile("<key>a</key><string>x" + std::string(character) + "</string>"));
+        expectRefused(accountFile("<key>a" + std::string(character) + "</key><string>x</string>"));
+        expectRefused(accountFile("<key>a</key><string><![CDATA[" + std::string(character) + "]]></string>"));
+    }
+}
+
+TEST_F(DamagedFile, ItsNeighboursAreReadAndWrittenAgain)
+{
+    // U+FFFD, U+10000, and U+1FFFE, which means nothing but which XML allows.
+    constexpr std::string_view kNeighbours = "\xEF\xBF\xBD\xF0\x90\x80\x80\xF0\x9F\xBF\xBE";
+    writeFile(fileOf("ada"), accountFile("<key>a</key><string>" + std::string(kNeighbours) + "</string>"));
+    ASSERT_TRUE(CSKavellAccountLoadData(m_account.get()));
+    EXPECT_TRUE(same(attribute(m_account, "a"), text(kNeighbours)));
+    setAttribute(m_account, "b", integer(4));
+    commit(m_account);
+    EXPECT_FALSE(hasPendingChanges(m_account));
+    EXPECT_TRUE(same(attribute(openAccount("ada"), "a"), text(kNeighbours)));
+}
+
 TEST_F(DamagedFile, OtherReferencesAndTextThatOnlyLooksLikeOneAreRead)
 {
     writeFile(fileOf("ada"), accountFile("<!-- &#16; --><key>a</key><string>&#65;&#x9;&#x1F600;&#127;</string>"
