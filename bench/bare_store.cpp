@@ -91,6 +91,9 @@ int readDirectoryBare(const std::string &directory)
     return count;
 }
 
+/// What a record is cut off to when it is void.
+constexpr off_t kVoidRecord = 8;
+
 void replaceFileBare(const char *path, std::string_view contents, const BareSemaphore &semaphore)
 {
     const std::string old = readFileBare(path, semaphore);
@@ -100,19 +103,16 @@ void replaceFileBare(const char *path, std::string_view contents, const BareSema
     const int file = open(path, O_RDWR | O_CLOEXEC);
     std::string record(contents.size() + old.size() + 40, 'r');
     const ssize_t oldLength = pread(file, record.data(), record.size(), 0);
-    const int recordFile = open(recordPath.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0600);
-    require(oldLength >= 0 && write(recordFile, record.data(), record.size()) > 0 && fdatasync(recordFile) == 0,
+    const int recordFile = open(recordPath.c_str(), O_WRONLY | O_CREAT | O_CLOEXEC, 0600);
+    require(oldLength >= 0 && pwrite(recordFile, record.data(), record.size(), 0) > 0 && fdatasync(recordFile) == 0,
             "record");
-    close(recordFile);
-    const int directoryFile = open(directory.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
-    require(fsync(directoryFile) == 0, "fsync");
-    close(directoryFile);
     timespec times[2] = {{0, UTIME_OMIT}, {0, UTIME_NOW}};
     require(pwrite(file, contents.data(), contents.size(), 0) > 0 &&
                 ftruncate(file, static_cast<off_t>(contents.size())) == 0 && fchmod(file, 0600) == 0 &&
                 futimens(file, times) == 0 && fdatasync(file) == 0,
             "replace");
-    unlink(recordPath.c_str());
+    require(ftruncate(recordFile, kVoidRecord) == 0, "void record");
+    close(recordFile);
     close(file);
     struct stat status;
     require(stat(path, &status) == 0, "stat");

@@ -30,8 +30,8 @@ int readDirectoryBare(const std::string &directory);
 /// Reads one file under its semaphore.
 std::string readFileBare(const char *path, const BareSemaphore &semaphore);
 
-/// Replaces a file's contents in place as durably as the store does: a record beside it, written and synced with its
-/// directory; the contents, permissions and time, synced; the record deleted.
+/// Replaces a file's contents in place as durably as the store does where it did so before: a record beside it, written and
+/// synced; the contents, permissions and time, synced; the record cut off.
 void replaceFileBare(const char *path, std::string_view contents, const BareSemaphore &semaphore);
 
 /// Lists the directory of the observers' sockets and leaves one message with each.

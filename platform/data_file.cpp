@@ -144,29 +144,51 @@ std::optional<FoundRecord> findRecord(int file, const std::string &recordPath)
     return found;
 }
 
-/// Whether there is a record; none when that cannot be told, and the file may be torn.
-std::optional<bool> hasRecord(const std::string &recordPath, int directory = AT_FDCWD) noexcept
+/// What stands under a redo record's name.
+enum class RecordState {
+    None,
+    Void,
+    Pending,  ///< it is to be settled
+    Unknown,  ///< that cannot be told, and the file may be torn
+};
+
+RecordState stateOfRecord(const std::string &recordPath, int directory = AT_FDCWD) noexcept
 {
-    if (faccessat(directory, recordPath.c_str(), F_OK, 0) == 0)
-        return true;
-    return errno == ENOENT ? std::optional(false) : std::nullopt;
+    struct stat status;
+    if (fstatat(directory, recordPath.c_str(), &status, AT_SYMLINK_NOFOLLOW) != 0)
+        return errno == ENOENT ? RecordState::None : RecordState::Unknown;
+    return isVoidRecord(status) ? RecordState::Void : RecordState::Pending;
 }
 
-/// Settles a redo record, if there is one, on a file that is open for writing. False when that could not be done.
-bool settleRecord(int file, const std::string &recordPath)
+/// The same for a data file of a directory that was listed.
+RecordState stateOfRecord(const DataDirectory &directory, const char *name)
 {
-    const auto isThere = hasRecord(recordPath);
-    if (!isThere || !*isThere)
-        return isThere.has_value();
+    return directory.hasNoRecordOf(name) ? RecordState::None
+                                         : stateOfRecord(siblingPath(name, kRedoRecordPrefix), directory.descriptor());
+}
+
+/// Settles a pending redo record, if there is one, on a file that is open for writing. What stands there then: none, a
+/// void one, or what could not be settled.
+RecordState settleRecord(int file, const std::string &recordPath)
+{
+    const RecordState state = stateOfRecord(recordPath);
+    if (state != RecordState::Pending)
+        return state;
     const auto found = findRecord(file, recordPath);
     if (!found)
-        return false;
+        return RecordState::Unknown;
     struct stat status;
     if (found->verdict == RedoVerdict::Finish &&
         (fstat(file, &status) != 0 || !overwrite(file, found->newContents, status.st_size) ||
          !makeDurable(file, false)))
-        return false;
-    return unlink(recordPath.c_str()) == 0;
+        return RecordState::Pending;
+    // Whoever made it may have died before its name was durable, so it cannot become a void one.
+    return unlink(recordPath.c_str()) == 0 ? RecordState::None : RecordState::Pending;
+}
+
+bool isSettled(RecordState state) noexcept
+{
+    return state == RecordState::None || state == RecordState::Void;
 }
 
 /// Makes a file that must not exist yet; it has its contents durably, but not its name. None, with errno, on failure.
@@ -206,13 +228,50 @@ void noteTime(int file, FileTime *written) noexcept
         *written = {status.st_mtim.tv_sec, status.st_mtim.tv_nsec};
 }
 
+/// Makes a record void, or deletes it where that fails; false when neither could be done.
+bool voidRecord(int record, const std::string &recordPath) noexcept
+{
+    return withoutInterruption([&] { return ftruncate(record, kVoidRecordLength); }) == 0 ||
+           unlink(recordPath.c_str()) == 0 || errno == ENOENT;
+}
+
+/// Opens a void record for writing; it is its owner's alone then. None when that fails.
+FileDescriptor openVoidRecord(const std::string &recordPath) noexcept
+{
+    FileDescriptor record = openFile(recordPath.c_str(), O_WRONLY | O_NOFOLLOW | O_NONBLOCK);
+    struct stat status;
+    const bool isPrivate = record && fstat(record.get(), &status) == 0 &&
+                           ((status.st_mode & 07777) == 0600 || fchmod(record.get(), 0600) == 0);
+    return isPrivate ? std::move(record) : FileDescriptor();
+}
+
+/// Makes a record durable, in the place of a void one if there is one. None when that fails; there is no record then, or
+/// a void one.
+FileDescriptor makeRecord(const std::string &recordPath, std::string_view bytes, RecordState state) noexcept
+{
+    if (FileDescriptor record = state == RecordState::Void ? openVoidRecord(recordPath) : FileDescriptor()) {
+        if (writeWhole(record.get(), bytes) && syncData(record.get()))
+            return record;
+        voidRecord(record.get(), recordPath);
+        return FileDescriptor();
+    }
+    if (state == RecordState::Void && unlink(recordPath.c_str()) != 0)
+        return FileDescriptor();
+    FileDescriptor record = makeNewFile(recordPath, bytes);
+    if (!record || syncDirectoryOf(recordPath.c_str()))
+        return record;
+    unlink(recordPath.c_str());
+    return FileDescriptor();
+}
+
 bool replaceInPlace(int file, const char *path, std::string_view contents, IntactCheck isIntact, FileTime *written)
 {
     const std::string recordPath = siblingPath(path, kRedoRecordPrefix);
+    const RecordState state = settleRecord(file, recordPath);
     struct stat status;
     FileContents old;
-    if (!settleRecord(file, recordPath) || fstat(file, &status) != 0 || !S_ISREG(status.st_mode) ||
-        !old.read(file, kLargestDataFile))
+    if (!isSettled(state) || fstat(file, &status) != 0 || !S_ISREG(status.st_mode) ||
+        !old.read(file, kLargestDataFile, status.st_size))
         return false;
     const std::string_view oldContents = old.view();
     RedoRecord record;
@@ -222,21 +281,19 @@ bool replaceInPlace(int file, const char *path, std::string_view contents, Intac
         record.oldContents = oldContents;
     if ((!record.oldContents || !isIntact(oldContents)) && !keepDamagedCopy(file, path))
         return false;
-    if ((contents.size() > oldContents.size() && !reserveRoom(file, contents.size())) ||
-        !makeNewFile(recordPath, encodeRedoRecord(record)))
+    if (contents.size() > oldContents.size() && !reserveRoom(file, contents.size()))
         return false;
-    if (!syncDirectoryOf(path)) {
-        unlink(recordPath.c_str());
+    const FileDescriptor recordFile = makeRecord(recordPath, encodeRedoRecord(record), state);
+    if (!recordFile)
         return false;
-    }
     if (overwrite(file, contents, status.st_size) && stampFile(file) &&
         makeDurable(file, (status.st_mode & 07777) == 0600)) {
         noteTime(file, written);
-        return unlink(recordPath.c_str()) == 0 || errno == ENOENT;
+        return voidRecord(recordFile.get(), recordPath);
     }
     // Back to the old contents where they are known and can be put back; else the record stays and is finished later.
     if (record.oldContents && overwrite(file, oldContents, static_cast<off_t>(contents.size())) && syncData(file))
-        unlink(recordPath.c_str());
+        voidRecord(recordFile.get(), recordPath);
     return false;
 }
 
@@ -310,27 +367,20 @@ Creation createWhole(const char *path, std::string_view contents, FileTime *writ
     return creation;
 }
 
-/// The contents of an open file that has no redo record; none when it has one.
-std::optional<FileRead> readWithoutRecord(const LockedFile &file, const std::string &recordPath, FileContents &contents,
-                                          int directory = AT_FDCWD)
+/// The contents of a file whose flock is taken; none when it has a pending redo record. `size` is the one that it may
+/// have, the directory the one in which it was found.
+std::optional<FileRead> readSettled(const LockedFile &file, const char *path, FileContents &contents, off_t size,
+                                    const DataDirectory *directory)
 {
     if (!file)
         return FileRead::Failed;
-    const auto isThere = hasRecord(recordPath, directory);
-    if (!isThere)
-        return FileRead::Failed;
-    if (*isThere)
+    const RecordState state = directory ? stateOfRecord(*directory, std::strrchr(path, '/') + 1)
+                                        : stateOfRecord(siblingPath(path, kRedoRecordPrefix));
+    if (state == RecordState::Pending)
         return std::nullopt;
-    return contents.read(file.get(), kLargestDataFile) ? FileRead::Done : FileRead::Failed;
-}
-
-std::optional<FileRead> readUnhindered(const char *path, FileContents &contents, FoundFile found)
-{
-    if (!found.file)
-        return readWithoutRecord(LockedFile(path, O_RDONLY), siblingPath(path, kRedoRecordPrefix), contents);
-    const char *const name = std::strrchr(path, '/') + 1;
-    return readWithoutRecord(LockedFile(std::move(found.file)), siblingPath(name, kRedoRecordPrefix), contents,
-                             found.directory);
+    if (state == RecordState::Unknown)
+        return FileRead::Failed;
+    return contents.read(file.get(), kLargestDataFile, size) ? FileRead::Done : FileRead::Failed;
 }
 
 /// The contents of a file that has a redo record, settling the record where this process may write.
@@ -338,7 +388,7 @@ FileRead readWithRecord(const char *path, FileContents &contents)
 {
     const std::string recordPath = siblingPath(path, kRedoRecordPrefix);
     if (const LockedFile writable(path, O_RDWR); writable) {
-        if (!settleRecord(writable.get(), recordPath))
+        if (!isSettled(settleRecord(writable.get(), recordPath)))
             return FileRead::Failed;
         return contents.read(writable.get(), kLargestDataFile) ? FileRead::Done : FileRead::Failed;
     }
@@ -355,16 +405,18 @@ FileRead readWithRecord(const char *path, FileContents &contents)
 
 }  // namespace
 
-FoundFile FoundFile::open(int directory, const char *name) noexcept
+FoundFile FoundFile::open(const DataDirectory &directory, const char *name) noexcept
 {
-    return {directory, openFile(name, O_RDONLY | kOpenFlags, 0, directory)};
+    return {&directory, openFile(name, O_RDONLY | kOpenFlags, 0, directory.descriptor())};
 }
 
-FileRead readDataFile(const char *path, FileContents &contents, FoundFile found) noexcept
+FileRead readDataFile(const char *path, FileContents &contents, off_t size, FoundFile found) noexcept
 {
     return guarded(FileRead::Failed, [&] {
-        const auto unhindered = readUnhindered(path, contents, std::move(found));
-        const FileRead result = unhindered ? *unhindered : readWithRecord(path, contents);
+        const auto settled = found.file
+                                 ? readSettled(LockedFile(std::move(found.file)), path, contents, size, found.directory)
+                                 : readSettled(LockedFile(path, O_RDONLY), path, contents, size, nullptr);
+        const FileRead result = settled ? *settled : readWithRecord(path, contents);
         return result == FileRead::Done && contents.view().size() > kLargestDataFile ? FileRead::TooLarge : result;
     });
 }
@@ -396,12 +448,15 @@ bool removeDataFile(const char *path) noexcept
         // settled, not only deleted: a power cut may undo the deletion of the file and keep that of the record.
         const std::string recordPath = siblingPath(path, kRedoRecordPrefix);
         const LockedFile file(path, O_RDWR);
-        const bool isSettled = file && settleRecord(file.get(), recordPath);
+        const RecordState state = file ? settleRecord(file.get(), recordPath) : RecordState::Unknown;
+        // While the file has its name: what stands there after it may be a new file's.
+        if (state == RecordState::Void)
+            unlink(recordPath.c_str());
         if (unlink(path) != 0)
             return false;
         // The file is gone for every program; that a power cut may bring it back is no failure of the removal. But then
         // it is torn without its record, so a record that could not be settled goes only when it cannot come back.
-        if (syncDirectoryOf(path) && !isSettled)
+        if (syncDirectoryOf(path) && !isSettled(state))
             unlink(recordPath.c_str());
         return true;
     });

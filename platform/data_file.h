@@ -17,6 +17,7 @@
 #include <string>
 #include <string_view>
 
+#include "platform/data_directory.h"
 #include "platform/file_io.h"
 #include "platform/property_list_guard.h"
 #include "platform/sibling_path.h"
@@ -40,17 +41,19 @@ enum class FileRead {
     TooLarge,  ///< it is larger than kLargestDataFile and was not read
 };
 
-/// What whoever lists a directory has at hand of a file in it, so that it need not be looked up from the root again and
-/// again: the directory, open, and the file, opened for reading. Without a file it is of no use and harms nothing.
+/// A file that was found in a listing of its directory, opened for reading. Without a file it is of no use and harms
+/// nothing; the directory must stay as long.
 struct FoundFile {
-    int directory = -1;
+    const DataDirectory *directory = nullptr;
     FileDescriptor file{};
 
-    [[nodiscard]] static FoundFile open(int directory, const char *name) noexcept;
+    [[nodiscard]] static FoundFile open(const DataDirectory &directory, const char *name) noexcept;
 };
 
-/// Reads a whole regular file into `contents`, after finishing a replacement that somebody could not finish.
-[[nodiscard]] FileRead readDataFile(const char *path, FileContents &contents, FoundFile found = {}) noexcept;
+/// Reads a whole regular file into `contents`, after finishing a replacement that somebody could not finish. `size` is what
+/// the file had just before, if that is known; it saves a system call.
+[[nodiscard]] FileRead readDataFile(const char *path, FileContents &contents, off_t size = 0,
+                                    FoundFile found = {}) noexcept;
 
 /// Says whether bytes are what this kind of file should hold.
 using IntactCheck = bool (*)(std::string_view contents) noexcept;

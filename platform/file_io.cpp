@@ -36,21 +36,29 @@ ssize_t readAt(int descriptor, char *bytes, size_t length, size_t offset) noexce
     return withoutInterruption([&] { return pread(descriptor, bytes, length, static_cast<off_t>(offset)); });
 }
 
+/// Whether a read that came short certainly ended where the file ends, which has this size. Others end at the border of a
+/// sector.
+bool isEnd(size_t length, off_t size) noexcept
+{
+    constexpr size_t kSector = 512;
+    return length == static_cast<size_t>(size) && length % kSector != 0;
+}
+
 }  // namespace
 
-bool FileContents::read(int descriptor, size_t limit)
+bool FileContents::read(int descriptor, size_t limit, off_t size)
 {
     m_large.clear();
     m_smallLength = 0;
-    // Only a read of nothing has seen the end: one that comes short may have met a bad place of the disk.
-    while (m_smallLength < m_small.size()) {
+    // Else only a read of nothing has seen the end: one that comes short may have met a bad place of the disk.
+    while (m_smallLength < m_small.size() && !isEnd(m_smallLength, size)) {
         const ssize_t count =
             readAt(descriptor, m_small.data() + m_smallLength, m_small.size() - m_smallLength, m_smallLength);
         if (count <= 0)
             return count == 0;
         m_smallLength += static_cast<size_t>(count);
     }
-    return readLarge(descriptor, limit);
+    return m_smallLength < m_small.size() || readLarge(descriptor, limit);
 }
 
 /// Goes on where m_small is full.

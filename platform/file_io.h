@@ -61,8 +61,8 @@ template <typename Call> auto withoutInterruption(Call &&call) noexcept
 class FileContents {
 public:
     /// Reads from the start to the end of the file; false, with errno, on failure. Of a file longer than `limit` it
-    /// reads just more than that.
-    [[nodiscard]] bool read(int descriptor, size_t limit);
+    /// reads just more than that. With the size that the file had just before, it can do with fewer system calls.
+    [[nodiscard]] bool read(int descriptor, size_t limit, off_t size = 0);
 
     void assign(std::string_view bytes);
 

@@ -6,6 +6,7 @@
 #include <algorithm>
 
 #include "platform/checksum.h"
+#include "platform/sibling_path.h"
 
 namespace kavell {
 
@@ -14,6 +15,7 @@ namespace {
 constexpr std::string_view kMagic = "KAVREDO1";
 constexpr uint64_t kUnknownLength = UINT64_MAX;
 constexpr size_t kHeaderLength = 32, kChecksumLength = 8;
+static_assert(kMagic.size() == kVoidRecordLength, "a void record is one without its contents");
 
 void appendInteger(std::string &bytes, uint64_t value)
 {

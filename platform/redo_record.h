@@ -3,8 +3,8 @@
 //
 // The redo record: what lets a file be rewritten in place and yet survive a power cut. It is a small file beside the
 // data file that holds both the old and the new contents, complete and on disk before the first byte of the data file
-// changes, and is deleted when the new contents are on disk. Whoever finds one, holding the data file's flock, settles
-// it:
+// changes, and is void when the new contents are on disk. Whoever finds one that is not void, holding the data file's
+// flock, settles it:
 //
 //     record                                data file              is settled by
 //     torn, or of another inode             anything               deleting the record: the data file was not touched
@@ -23,6 +23,10 @@
 //         24  8   length of the new contents
 //         32  …   old contents, new contents
 //        end  8   checksum of everything before it (64-bit FNV-1a)
+//
+// A void record is cut off after its first field, and stays for the next replacement, which need not make its name
+// durable again: a third of what a replacement takes. A record is void only after its name was made durable, and is deleted
+// where that is not certain.
 //
 // Used by data_file.cpp only, by one process at a time (the flock).
 

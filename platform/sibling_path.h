@@ -2,13 +2,15 @@
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
 // The names of the files that stand beside a data file: redo records, new files before they have their name, and kept
-// damaged contents. None of them ends in ".plist". Safe from any thread.
+// damaged contents; and how a void redo record is told. None of the names ends in ".plist". Safe from any thread.
 
 #ifndef KAVELL_PLATFORM_SIBLING_PATH_H
 #define KAVELL_PLATFORM_SIBLING_PATH_H
 
 #include <string>
 #include <string_view>
+#include <sys/stat.h>
+#include <sys/types.h>
 
 #include "platform/checksum.h"
 
@@ -19,6 +21,15 @@ inline constexpr std::string_view kRedoRecordPrefix = ".redo-";
 inline constexpr std::string_view kNewFilePrefix = ".new-";
 /// Followed by the hash, "-", and the time of keeping, as in damaged-0123456789abcdef-20260131T100000Z.
 inline constexpr std::string_view kDamagedCopyPrefix = "damaged-";
+
+/// The length of a void redo record, in bytes.
+inline constexpr off_t kVoidRecordLength = 8;
+
+/// Whether this is the status of a void redo record, which stays after each replacement and says nothing.
+[[nodiscard]] inline bool isVoidRecord(const struct stat &status) noexcept
+{
+    return S_ISREG(status.st_mode) && status.st_size == kVoidRecordLength;
+}
 
 /// The path beside a data file that consists of the prefix and the hash of the file's name.
 [[nodiscard]] inline std::string siblingPath(std::string_view path, std::string_view prefix)

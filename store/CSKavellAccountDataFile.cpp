@@ -58,7 +58,7 @@ FileRead readUnderSemaphore(CSKavellAccount &account, FoundFile found, const str
         return FileRead::Failed;
     // A pipe or a device would never end; only files hold accounts.
     const FileRead result = S_ISREG(status.st_mode)
-                                ? readDataFile(account.dataFilePath.get(), contents, std::move(found))
+                                ? readDataFile(account.dataFilePath.get(), contents, status.st_size, std::move(found))
                                 : FileRead::Failed;
     UnlockDatafileAccess(account);
     return result;

@@ -5,11 +5,7 @@
 
 #include <kavellaccounts/CSKavellAccountProvider.h>
 
-#include <dirent.h>
-#include <fcntl.h>
-#include <memory>
 #include <mutex>
-#include <sys/stat.h>
 
 #include <kavellaccounts/CSKavellType.h>
 
@@ -31,8 +27,6 @@ struct CSKavellAccountProvider : kavell::Object {
 namespace {
 
 using Guard = std::lock_guard<RecordLock>;
-
-constexpr std::string_view kDataFileSuffix = ".plist";
 
 void finaliseProvider(Object *object)
 {
@@ -113,37 +107,19 @@ Ref<CSKavellAccountRef> takeAccount(CSKavellAccountProvider &provider, CSKavellS
     return account;
 }
 
-struct DirectoryCloser {
-    void operator()(DIR *directory) const noexcept { closedir(directory); }
-};
-
-bool isRegularFile(int directory, const dirent &entry) noexcept
-{
-    if (entry.d_type != DT_UNKNOWN)
-        return entry.d_type == DT_REG;
-    struct stat status;
-    return fstatat(directory, entry.d_name, &status, AT_SYMLINK_NOFOLLOW) == 0 && S_ISREG(status.st_mode);
-}
-
 /// Makes a record for each data file of the provider's directory, in the directory's own order.
 void CSKavellAccountProviderLoadAccountData(CSKavellAccountProvider &provider)
 {
     const std::string path = providerDirectoryPath(provider.providerType.get());
     if (path.find('\0') != std::string::npos)
         return;
-    const std::unique_ptr<DIR, DirectoryCloser> directory(opendir(path.c_str()));
-    if (!directory)
-        return;
-    while (const dirent *entry = readdir(directory.get())) {
-        const std::string_view name(entry->d_name);
-        if (name.size() <= kDataFileSuffix.size() || !name.ends_with(kDataFileSuffix) ||
-            !isRegularFile(dirfd(directory.get()), *entry))
-            continue;
+    const DataDirectory directory(path.c_str());
+    directory.forEachDataFile([&](std::string_view name) {
         // A name that is not UTF-8 cannot be a login name, and answers none here.
         const auto loginName = makeString(name.substr(0, name.size() - kDataFileSuffix.size()));
         if (loginName && !accountOf(provider, loginName.get()))
-            addNewAccount(provider, loginName.get(), FoundFile::open(dirfd(directory.get()), entry->d_name), path);
-    }
+            addNewAccount(provider, loginName.get(), FoundFile::open(directory, name.data()), path);
+    });
 }
 
 }  // namespace

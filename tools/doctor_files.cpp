@@ -80,37 +80,41 @@ std::optional<Address> accountOfRedoRecord(const std::string &path)
     return std::nullopt;
 }
 
-/// Waits, for a bounded time, until nobody is inside the data file: a redo record that is still there then belongs to nobody.
-void waitForWriters(const Address &address)
+/// Whether a redo record is to be settled; void ones stay after each save. Waits, for a bounded time, until nobody is inside
+/// the account's data file where that may be: a record that is not void then belongs to nobody.
+bool isToBeSettled(const std::string &path, const Address &account, const Findings &findings)
 {
-    const FileDescriptor file(open(dataFileOf(address).c_str(), O_RDONLY | O_CLOEXEC));
+    const bool canOpen = !findings.untouchable.contains(account);
+    const FileDescriptor file(canOpen ? open(dataFileOf(account).c_str(), O_RDONLY | O_CLOEXEC) : -1);
     if (file.get() >= 0)
         (void)lockWithinBound(file.get(), LOCK_SH);
+    struct stat status;
+    return lstat(path.c_str(), &status) == 0 && !isVoidRecord(status);
 }
 
 void examineRedoRecord(const std::string &path, Findings &findings)
 {
+    // Asked before the account is looked for: one that is added after that has a record of its own, which is another file.
     const ino_t record = inodeOf(path);
     const std::optional<Address> account = accountOfRedoRecord(path);
-    if (account && !findings.untouchable.contains(*account))
-        waitForWriters(*account);
-    // What is gone by now belonged to a save that has come to its end, and another one's record is that one's own.
-    const auto isStillThere = [&] {
-        return record != 0 && inodeOf(path) == record;
-    };
-    if (!isStillThere())
-        return;
     if (!account) {
-        findings.mendable("left-over-record", path, escaped(path) + " is the record of a save whose file is gone",
-                          [&] { return !isStillThere() || unlink(path.c_str()) == 0; });
+        const auto isStillThere = [&] {
+            return record != 0 && inodeOf(path) == record;
+        };
+        if (isStillThere())
+            findings.mendable("left-over-record", path, escaped(path) + " is the record of a save whose file is gone",
+                              [&] { return !isStillThere() || unlink(path.c_str()) == 0; });
         return;
     }
+    // What is gone or void by now belonged to a save that has come to its end.
+    if (!isToBeSettled(path, *account, findings))
+        return;
     const bool canOpen = !findings.untouchable.contains(*account);
     findings.mendable("unfinished-save", path, "a save of " + account->text() + " was interrupted and is not finished",
                       [&] {
                           if (canOpen)
                               (void)openForExamination(*account, findings);
-                          return !isStillThere();
+                          return !isToBeSettled(path, *account, findings);
                       });
     if (!findings.all.back().mended)
         findings.untouchable.insert(*account);

@@ -10,7 +10,7 @@
  *     SIDE open COUNT N    opening and reading everything, N times in one process
  *     SIDE walk COUNT N    listing and reading what is open, N times
  *     SIDE edit N          making, changing and removing N accounts while another process watches; from the start of each
- *                          change to that process's callback, too
+ *                          change to that process's callback, too; each account's first change is told from the others
  *     SIDE memory COUNT    resident memory in bytes with everything open and read
  *     SIDE observe         the watching process of edit: writes the time of each callback to standard output */
 
@@ -27,7 +27,7 @@
 
 extern char **environ;
 
-enum { kFirstEdited = 1000000, kLongestWait = 5000 };
+enum { kFirstEdited = 1000000, kLongestWait = 5000, kChanges = 3 };
 
 static int64_t now(void)
 {
@@ -182,16 +182,17 @@ static void edit(int count)
         report("create", now() - start);
         drain(pipes[0]);
     }
-    for (int index = 0; index < count; ++index) {
+    for (int index = 0; index < kChanges * count; ++index) {
+        const int change = index / count;
         char host[kTextSize];
-        makeHost(kFirstEdited + index, 1, host);
+        makeHost(kFirstEdited + index % count, 1 + change, host);
         const int64_t start = now();
-        changeAccount(registry, accounts[index], host);
-        report("change", now() - start);
+        changeAccount(registry, accounts[index % count], host);
+        report(change == 0 ? "first_change" : "change", now() - start);
         const int64_t when = nextTime(pipes[0], kLongestWait);
         if (when < start)
             fail("the watching process was not told of a change");
-        report("callback", when - start);
+        report(change == 0 ? "first_callback" : "callback", when - start);
         drain(pipes[0]);
     }
     for (int index = 0; index < count; ++index) {

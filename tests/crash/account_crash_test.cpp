@@ -109,7 +109,8 @@ protected:
         for (const auto &entry :
              std::filesystem::directory_iterator(std::filesystem::path(fileOf()).parent_path(), isMissing)) {
             const std::string name = entry.path().filename();
-            if (name.starts_with(kRedoRecordPrefix) || name.starts_with(kDamagedCopyPrefix))
+            if ((name.starts_with(kRedoRecordPrefix) && isPendingRecordAt(entry.path())) ||
+                name.starts_with(kDamagedCopyPrefix))
                 names += ", beside " + name;
         }
         return names;

@@ -81,6 +81,15 @@ protected:
                            "</string>");
     }
 
+    /// The same beside the void record of an earlier save.
+    static void putSavedAccount(int64_t round)
+    {
+        const std::string recordPath = siblingPath(fileOf("ada"), kRedoRecordPrefix);
+        putAccount(round);
+        writeFile(recordPath, "KAVREDO1");
+        chmod(recordPath.c_str(), 0600);
+    }
+
     /// An account whose replacement was cut off, with its redo record.
     static void putTornAccount(int64_t round, int64_t newRound)
     {
@@ -132,10 +141,10 @@ protected:
         expectSemaphoreFree(ftok(fileOf("ada").c_str(), 0));
     }
 
-    /// Nothing but the file stands there, and what could not be deleted because deleting failed too.
+    /// Nothing but the file stands there, with its void record, and what could not be deleted because deleting failed too.
     static void expectNothingBeside(const FaultInjector &injector)
     {
-        Names names = entriesBeginningWith("");
+        Names names = entriesBesideVoidRecords();
         const auto *failed = injector.failed();
         if (injector.fault().isLasting() || (failed && failed->kind == CallKind::Unlink))
             std::erase_if(names, [](const std::string &name) { return name.starts_with(kNewFilePrefix); });
@@ -325,6 +334,12 @@ TEST_F(AccountFaults, ASaveThatMakesTheFileLongerIsDoneOrSaysSo)
         {}, [] { putAccount(kOld); }, kLonger, foundAs(kOld, kOld), foundAs(kLonger, kOld), isLate);
 }
 
+TEST_F(AccountFaults, ASaveThatUsesTheRecordOfAnEarlierOneIsDoneOrSaysSo)
+{
+    checkSave(
+        {}, [] { putSavedAccount(kOld); }, kLonger, foundAs(kOld, kOld), foundAs(kLonger, kOld), isLate);
+}
+
 TEST_F(AccountFaults, ASaveOverACutOffReplacementIsDoneOrSaysSo)
 {
     forEachFault({}, [&](FaultInjector &injector) {
@@ -369,6 +384,14 @@ TEST_F(AccountFaults, ARemovalIsDoneOrLeavesTheAccount)
 {
     const auto put = [] {
         putAccount(kOld);
+    };
+    checkRemoval(put, foundAs(kOld, kOld));
+}
+
+TEST_F(AccountFaults, ARemovalAfterASaveIsDoneOrLeavesTheAccount)
+{
+    const auto put = [] {
+        putSavedAccount(kOld);
     };
     checkRemoval(put, foundAs(kOld, kOld));
 }

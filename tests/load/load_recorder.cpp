@@ -16,6 +16,7 @@
 #include <unistd.h>
 
 #include "platform/sibling_path.h"
+#include "tests/support/redo_records.h"
 
 namespace kavell::test {
 
@@ -58,11 +59,12 @@ LoadValues valuesIn(int file)
     return values;
 }
 
+/// Whether a redo record stands there that is to be settled.
 bool hasRedoRecord(std::string_view path)
 {
     // The path of a file that was deleted is followed by a remark.
     const std::string_view dataFile = path.substr(0, path.rfind(kSuffix) + kSuffix.size());
-    return access(siblingPath(dataFile, kRedoRecordPrefix).c_str(), F_OK) == 0;
+    return isPendingRecordAt(siblingPath(dataFile, kRedoRecordPrefix));
 }
 
 /// What stands in an open file.

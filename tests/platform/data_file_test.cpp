@@ -12,6 +12,7 @@
 
 #include "platform/redo_record.h"
 #include "tests/support/process.h"
+#include "tests/support/redo_records.h"
 
 using namespace kavell;
 using namespace kavell::test;
@@ -31,12 +32,14 @@ protected:
     DataFile() { std::filesystem::create_directories(m_directory); }
     ~DataFile() override { std::filesystem::remove_all(m_directory); }
 
-    [[nodiscard]] ino_t inode() const
+    [[nodiscard]] static ino_t inodeOf(const std::string &path)
     {
         struct stat status {};
-        stat(m_path.c_str(), &status);
+        stat(path.c_str(), &status);
         return status.st_ino;
     }
+
+    [[nodiscard]] ino_t inode() const { return inodeOf(m_path); }
 
     void leaveRecord(ino_t inodeInRecord, std::optional<std::string_view> oldContents = kOld)
     {
@@ -54,6 +57,7 @@ protected:
     }
 
     [[nodiscard]] bool hasRecord() const { return std::filesystem::exists(m_recordPath); }
+    [[nodiscard]] bool hasVoidRecord() const { return isVoidRecordAt(m_recordPath); }
 
     std::string m_directory = std::string(std::getenv("TMPDIR")) + "/data-file-test";
     std::string m_path = m_directory + "/ada.plist";
@@ -164,7 +168,7 @@ TEST_F(DataFile, ARecordCutOffAtAnyByteIsNotApplied)
     for (size_t length = 0; length < whole.size(); ++length) {
         writeFile(m_recordPath, whole.substr(0, length));
         EXPECT_EQ(read(), kOld) << length;
-        EXPECT_FALSE(hasRecord()) << length;
+        EXPECT_EQ(hasRecord(), length == 8) << length;
     }
 }
 
@@ -181,17 +185,56 @@ TEST_F(DataFile, AWriterFinishesALeftReplacementBeforeItsOwn)
     leaveRecord(inode());
     EXPECT_TRUE(writeDataFile(m_path.c_str(), "the newest", isIntactAlways));
     EXPECT_EQ(readFile(m_path), "the newest");
-    EXPECT_FALSE(hasRecord());
+    EXPECT_TRUE(hasVoidRecord());
 }
 
-TEST_F(DataFile, RewritingKeepsTheInodeAndLeavesNothingBeside)
+TEST_F(DataFile, RewritingKeepsTheInodeAndLeavesAVoidRecordBeside)
 {
     writeFile(m_path, kOld);
     const ino_t before = inode();
     EXPECT_TRUE(writeDataFile(m_path.c_str(), kNew, isIntactAlways));
     EXPECT_EQ(inode(), before);
     EXPECT_EQ(readFile(m_path), kNew);
-    EXPECT_EQ(std::distance(std::filesystem::directory_iterator(m_directory), {}), 1);
+    EXPECT_TRUE(hasVoidRecord());
+    EXPECT_EQ(std::filesystem::status(m_recordPath).permissions(), std::filesystem::perms(0600));
+    EXPECT_EQ(std::distance(std::filesystem::directory_iterator(m_directory), {}), 2);
+}
+
+TEST_F(DataFile, RewritingAgainUsesTheSameRecord)
+{
+    writeFile(m_path, kOld);
+    EXPECT_TRUE(writeDataFile(m_path.c_str(), kNew, isIntactAlways));
+    const ino_t before = inodeOf(m_recordPath);
+    EXPECT_TRUE(writeDataFile(m_path.c_str(), kOld, isIntactAlways));
+    EXPECT_EQ(inodeOf(m_recordPath), before);
+    EXPECT_TRUE(hasVoidRecord());
+    EXPECT_EQ(readFile(m_path), kOld);
+}
+
+TEST_F(DataFile, ARecordThatIsUsedAgainIsItsOwnersAlone)
+{
+    writeFile(m_path, kOld);
+    EXPECT_TRUE(writeDataFile(m_path.c_str(), kNew, isIntactAlways));
+    EXPECT_EQ(chmod(m_recordPath.c_str(), 0644), 0);
+    EXPECT_TRUE(writeDataFile(m_path.c_str(), kOld, isIntactAlways));
+    EXPECT_EQ(std::filesystem::status(m_recordPath).permissions(), std::filesystem::perms(0600));
+}
+
+TEST_F(DataFile, AVoidRecordSaysNothing)
+{
+    writeFile(m_path, kOld);
+    EXPECT_TRUE(writeDataFile(m_path.c_str(), kNew, isIntactAlways));
+    writeFile(m_path, "something else entirely, by an editor");
+    EXPECT_EQ(read(), "something else entirely, by an editor");
+    EXPECT_TRUE(hasVoidRecord());
+}
+
+TEST_F(DataFile, DeletingAfterARewriteLeavesNothing)
+{
+    writeFile(m_path, kOld);
+    EXPECT_TRUE(writeDataFile(m_path.c_str(), kNew, isIntactAlways));
+    EXPECT_TRUE(removeDataFile(m_path.c_str()));
+    EXPECT_TRUE(std::filesystem::is_empty(m_directory));
 }
 
 TEST_F(DataFile, ANewFileIsNotTakenForTheOneThatARecordWasLeftFor)

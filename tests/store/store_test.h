@@ -22,8 +22,10 @@
 #include <kavellaccounts/KavellStore.h>
 #include <kavellaccounts/Ref.h>
 
+#include "platform/sibling_path.h"
 #include "tests/runtime/values.h"
 #include "tests/support/process.h"
+#include "tests/support/redo_records.h"
 #include "tests/support/standard_error_capture.h"
 
 namespace kavell::test {
@@ -182,6 +184,16 @@ protected:
                 found.push_back(entry.path().filename());
         }
         return found;
+    }
+
+    /// All of them but the void redo records, which stay after a save.
+    [[nodiscard]] static Names entriesBesideVoidRecords()
+    {
+        Names names = entriesBeginningWith("");
+        std::erase_if(names, [](const std::string &name) {
+            return name.starts_with(kRedoRecordPrefix) && isVoidRecordAt(providerDirectory() + "/" + name);
+        });
+        return names;
     }
 };
 

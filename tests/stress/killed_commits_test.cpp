@@ -169,7 +169,7 @@ TEST_F(KilledCommits, LeaveAnExistingFileAsBeforeOrAsAfter)
     change(account, 5000);
     commit(account);
     EXPECT_EQ(stateOf(openAccount("ada")).round, 5000);
-    EXPECT_EQ(entriesBeginningWith(".redo-"), Names{});
+    EXPECT_EQ(entriesBesideVoidRecords(), Names{"ada.plist"});
 }
 
 TEST_F(KilledCommits, LeaveANewFileWholeOrNotThere)

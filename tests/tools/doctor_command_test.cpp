@@ -270,6 +270,23 @@ TEST_F(DoctorCommand, LeavesAFileWhoseRecordIsOfAnEarlierOne)
     EXPECT_EQ(readFile(m_path), contents);
 }
 
+TEST_F(DoctorCommand, SaysNothingOfTheVoidRecordThatASaveLeaves)
+{
+    writeFile(siblingPath(m_path, kRedoRecordPrefix), "KAVREDO1");
+
+    EXPECT_THAT(problems(client({"doctor", "--json"})), testing::IsEmpty());
+}
+
+TEST_F(DoctorCommand, RemovesTheVoidRecordOfAFileThatIsGone)
+{
+    const std::string record = siblingPath(dataFilePath(googleType, "gone"), kRedoRecordPrefix);
+    writeFile(record, "KAVREDO1");
+
+    expectMended("left-over-record");
+
+    EXPECT_FALSE(std::filesystem::exists(record));
+}
+
 TEST_F(DoctorCommand, RemovesTheRecordOfASaveWhoseFileIsGone)
 {
     const std::string record = siblingPath(dataFilePath(googleType, "gone"), kRedoRecordPrefix);
