@@ -31,6 +31,11 @@ bool isRegularFile(int directory, const dirent &entry) noexcept
 
 }  // namespace
 
+bool wouldChangeTell(const timespec &changed, const timespec &now) noexcept
+{
+    return changed.tv_nsec != 0 && nanosecondsBetween(changed, now) > kLongestTick;
+}
+
 DataDirectory::DataDirectory(const char *path) : m_directory(opendir(path))
 {
     if (!m_directory)
@@ -53,17 +58,19 @@ void DataDirectory::noteTime() noexcept
     if (fstat(descriptor(), &status) != 0 || clock_gettime(CLOCK_REALTIME_COARSE, &now) != 0)
         return;
     m_changed = status.st_ctim;
-    m_isTelling = nanosecondsBetween(m_changed, now) > kLongestTick;
+    m_isTelling = wouldChangeTell(m_changed, now);
 }
 
 void DataDirectory::add(const dirent &entry)
 {
     const std::string_view name(entry.d_name);
-    if (name.starts_with(kRedoRecordPrefix))
-        m_records.emplace(name);
-    else if (name.size() > kDataFileSuffix.size() && name.ends_with(kDataFileSuffix) &&
-             isRegularFile(descriptor(), entry))
+    // No record's name ends like a data file's, but a login name may begin like a record's.
+    if (!name.ends_with(kDataFileSuffix)) {
+        if (name.starts_with(kRedoRecordPrefix))
+            m_records.emplace(name);
+    } else if (name.size() > kDataFileSuffix.size() && isRegularFile(descriptor(), entry)) {
         m_names.append(name).push_back('\0');
+    }
 }
 
 bool DataDirectory::hasNoRecordOf(const char *name) const

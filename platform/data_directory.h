@@ -20,6 +20,10 @@ namespace kavell {
 /// What the name of a data file ends with; a login name stands before it.
 inline constexpr std::string_view kDataFileSuffix = ".plist";
 
+/// Whether the time of a directory would be another one after any change from now on: it is as coarse as the kernel's tick,
+/// and on some file systems has whole seconds only.
+[[nodiscard]] bool wouldChangeTell(const timespec &changed, const timespec &now) noexcept;
+
 class DataDirectory {
 public:
     /// Opens and lists a directory; there is nothing in it when that fails.
@@ -52,7 +56,7 @@ private:
     std::unique_ptr<DIR, Closer> m_directory;
     /// Nothing came into the directory since this time if it is still the directory's.
     timespec m_changed{};
-    /// Whether the directory's time would tell: it is as coarse as the kernel's tick.
+    /// Whether the directory's time would tell.
     bool m_isTelling = false;
     std::string m_names;  ///< of the data files, each with a NUL behind it
     std::unordered_set<std::string> m_records;

@@ -31,15 +31,23 @@ constexpr size_t kLargestRedoRecord = 2 * kLargestDataFile + 64;
 // How often a file may come and go under a writer before it gives up.
 constexpr int kMostAttempts = 16;
 
+/// Asks for the flock once. Over NFS, who may only read a file cannot have it alone (flock(2)); a shared one keeps writers
+/// out as well.
+int tryToLock(int file) noexcept
+{
+    const int result = flock(file, LOCK_EX | LOCK_NB);
+    return result != 0 && errno == EBADF ? flock(file, LOCK_SH | LOCK_NB) : result;
+}
+
 /// Waits for the flock for a bounded time. It is free nearly always: whoever holds it also holds the semaphore that the
 /// caller has just taken, unless their records found different ones.
 bool lockFile(int file) noexcept
 {
-    if (flock(file, LOCK_EX | LOCK_NB) == 0)
+    if (tryToLock(file) == 0)
         return true;
     const auto deadline = std::chrono::steady_clock::now() + kLongestFlockWait;
     auto pause = std::chrono::microseconds(50);
-    while (flock(file, LOCK_EX | LOCK_NB) != 0) {
+    while (tryToLock(file) != 0) {
         if ((errno != EWOULDBLOCK && errno != EINTR) || std::chrono::steady_clock::now() > deadline)
             return false;
         std::this_thread::sleep_for(pause);
@@ -112,13 +120,16 @@ bool syncData(int file) noexcept
     return withoutInterruption([&] { return fdatasync(file); }) == 0;
 }
 
-/// Makes what was written durable, and the file its owner's alone; `isPrivate` when it certainly is already.
-bool makeDurable(int file, bool isPrivate) noexcept
+/// Permissions, too, which syncing the data leaves out: the next save takes them to be on the disk.
+bool syncWhole(int file) noexcept
 {
-    if (isPrivate)
-        return syncData(file);
-    // Syncing the data leaves permissions out.
-    return fchmod(file, 0600) == 0 && withoutInterruption([&] { return fsync(file); }) == 0;
+    return withoutInterruption([&] { return fsync(file); }) == 0;
+}
+
+/// Makes what was written durable, and the file its owner's alone; `wasPrivate` when it certainly was before.
+bool makeDurable(int file, bool wasPrivate) noexcept
+{
+    return wasPrivate ? syncData(file) : fchmod(file, 0600) == 0 && syncWhole(file);
 }
 
 /// A redo record that was found, read and judged.
@@ -235,21 +246,31 @@ bool voidRecord(int record, const std::string &recordPath) noexcept
            unlink(recordPath.c_str()) == 0 || errno == ENOENT;
 }
 
-/// Opens a void record for writing; it is its owner's alone then. None when that fails.
-FileDescriptor openVoidRecord(const std::string &recordPath) noexcept
+bool isPrivate(const struct stat &status) noexcept
 {
-    FileDescriptor record = openFile(recordPath.c_str(), O_WRONLY | O_NOFOLLOW | O_NONBLOCK);
-    struct stat status;
-    const bool isPrivate = record && fstat(record.get(), &status) == 0 &&
-                           ((status.st_mode & 07777) == 0600 || fchmod(record.get(), 0600) == 0);
-    return isPrivate ? std::move(record) : FileDescriptor();
+    return (status.st_mode & 07777) == 0600;
 }
 
-/// Makes a record durable, in the place of a void one if there is one. None when that fails; there is no record then, or
-/// a void one.
-FileDescriptor makeRecord(const std::string &recordPath, std::string_view bytes, RecordState state) noexcept
+/// Opens the void record of the file with this inode for writing; it is its owner's alone then. None when that fails, or
+/// the record is another file's.
+FileDescriptor openVoidRecord(const std::string &recordPath, ino_t inode)
 {
-    if (FileDescriptor record = state == RecordState::Void ? openVoidRecord(recordPath) : FileDescriptor()) {
+    FileDescriptor record = openFile(recordPath.c_str(), O_RDWR | O_NOFOLLOW | O_NONBLOCK);
+    FileContents bytes;
+    struct stat status;
+    const bool isUsable = record && bytes.read(record.get(), kLargestRedoRecord, kVoidRecordLength) &&
+                          inodeOfRedoRecord(bytes.view()) == inode && fstat(record.get(), &status) == 0 &&
+                          (isPrivate(status) || fchmod(record.get(), 0600) == 0);
+    return isUsable ? std::move(record) : FileDescriptor();
+}
+
+/// Makes a record durable, in the place of the file's void one if there is one. None when that fails; there is no record
+/// then, or a void one.
+FileDescriptor makeRecord(const std::string &recordPath, const RedoRecord &contents, RecordState state)
+{
+    const std::string bytes = encodeRedoRecord(contents);
+    if (FileDescriptor record =
+            state == RecordState::Void ? openVoidRecord(recordPath, contents.inode) : FileDescriptor()) {
         if (writeWhole(record.get(), bytes) && syncData(record.get()))
             return record;
         voidRecord(record.get(), recordPath);
@@ -283,16 +304,16 @@ bool replaceInPlace(int file, const char *path, std::string_view contents, Intac
         return false;
     if (contents.size() > oldContents.size() && !reserveRoom(file, contents.size()))
         return false;
-    const FileDescriptor recordFile = makeRecord(recordPath, encodeRedoRecord(record), state);
+    const FileDescriptor recordFile = makeRecord(recordPath, record, state);
     if (!recordFile)
         return false;
-    if (overwrite(file, contents, status.st_size) && stampFile(file) &&
-        makeDurable(file, (status.st_mode & 07777) == 0600)) {
+    if (overwrite(file, contents, status.st_size) && stampFile(file) && makeDurable(file, isPrivate(status))) {
         noteTime(file, written);
         return voidRecord(recordFile.get(), recordPath);
     }
     // Back to the old contents where they are known and can be put back; else the record stays and is finished later.
-    if (record.oldContents && overwrite(file, oldContents, static_cast<off_t>(contents.size())) && syncData(file))
+    if (record.oldContents && overwrite(file, oldContents, static_cast<off_t>(contents.size())) &&
+        (isPrivate(status) ? syncData(file) : syncWhole(file)))
         voidRecord(recordFile.get(), recordPath);
     return false;
 }
@@ -324,8 +345,8 @@ bool mayOwnRecord(int file, const std::string &recordPath)
         return errno != ENOENT;
     if (!bytes.read(record.get(), kLargestRedoRecord) || fstat(file, &status) != 0)
         return true;
-    const auto decoded = decodeRedoRecord(bytes.view());
-    return decoded && decoded->inode == status.st_ino;
+    // Of a void one, too: that it is void may not be on the disk, nor is what it says of names true of this file.
+    return inodeOfRedoRecord(bytes.view()) == status.st_ino;
 }
 
 /// The file of a new account, before it has its name. A crash may leave it beside an earlier file's record, which must
@@ -352,7 +373,7 @@ Creation createWhole(const char *path, std::string_view contents, FileTime *writ
     const FileDescriptor file = makeFirstFile(newPath, recordPath, contents);
     if (!file)
         return Creation::Failed;
-    if (!lockFile(file.get())) {
+    if (!lockFile(file.get()) || !stampFile(file.get())) {
         unlink(newPath.c_str());
         return Creation::Failed;
     }
@@ -383,15 +404,13 @@ std::optional<FileRead> readSettled(const LockedFile &file, const char *path, Fi
     return contents.read(file.get(), kLargestDataFile, size) ? FileRead::Done : FileRead::Failed;
 }
 
-/// The contents of a file that has a redo record, settling the record where this process may write.
+/// The contents of a file that has a redo record, settling the record where that can be done.
 FileRead readWithRecord(const char *path, FileContents &contents)
 {
     const std::string recordPath = siblingPath(path, kRedoRecordPrefix);
-    if (const LockedFile writable(path, O_RDWR); writable) {
-        if (!isSettled(settleRecord(writable.get(), recordPath)))
-            return FileRead::Failed;
+    if (const LockedFile writable(path, O_RDWR); writable && isSettled(settleRecord(writable.get(), recordPath)))
         return contents.read(writable.get(), kLargestDataFile) ? FileRead::Done : FileRead::Failed;
-    }
+    // Who may not write, or finds the disk full, reads what the record would make of the file, and leaves it to others.
     const LockedFile file(path, O_RDONLY);
     if (!file)
         return FileRead::Failed;
@@ -400,6 +419,9 @@ FileRead readWithRecord(const char *path, FileContents &contents)
         contents.assign(found->newContents);
         return FileRead::Done;
     }
+    // A record that cannot be read may be of a torn file.
+    if (!found && !isSettled(stateOfRecord(recordPath)))
+        return FileRead::Failed;
     return contents.read(file.get(), kLargestDataFile) ? FileRead::Done : FileRead::Failed;
 }
 
@@ -455,8 +477,9 @@ bool removeDataFile(const char *path) noexcept
         if (unlink(path) != 0)
             return false;
         // The file is gone for every program; that a power cut may bring it back is no failure of the removal. But then
-        // it is torn without its record, so a record that could not be settled goes only when it cannot come back.
-        if (syncDirectoryOf(path) && !isSettled(state))
+        // it is torn without its record, so a record that could not be settled goes only when it cannot come back, and is
+        // not that of a file which was made meanwhile.
+        if (syncDirectoryOf(path) && !isSettled(state) && (!file || mayOwnRecord(file.get(), recordPath)))
             unlink(recordPath.c_str());
         return true;
     });

@@ -123,25 +123,26 @@ bool makeDirectory(const std::string &path) noexcept
     if (isMade)
         chmod(path.c_str(), 0700);
     // Also where it stood already: whoever made it may have died before this. Not every directory may be opened, though.
-    return syncDirectoryOf(path.c_str()) || !isMade;
+    return syncDirectoryOf(path.c_str()) || !isMade || errno == EACCES;
 }
 
 }  // namespace
 
-void createDirectoriesAbove(const char *path) noexcept
+bool createDirectoriesAbove(const char *path) noexcept
 try {
     const std::string_view view(path);
     const std::string directory(view.substr(0, view.rfind('/') + 1));
     struct stat status;
     if (stat(directory.c_str(), &status) == 0 && durableDirectories.contains(status))
-        return;
+        return true;
     bool isDurable = true;
     for (size_t slash = view.find('/', 1); slash != std::string_view::npos; slash = view.find('/', slash + 1))
         isDurable = makeDirectory(std::string(view.substr(0, slash))) && isDurable;
     if (isDurable && stat(directory.c_str(), &status) == 0)
         durableDirectories.add(status);
+    return isDurable;
 } catch (const std::bad_alloc &) {
-    // Without its directory the file cannot be made, which is reported then.
+    return false;
 }
 
 bool syncDirectoryOf(const char *path) noexcept

@@ -80,8 +80,9 @@ private:
 };
 
 /// Creates each missing directory above the path, with permissions 0700, and makes sure once in a process that their
-/// names are on the disk. Failures show when a file is made there.
-void createDirectoriesAbove(const char *path) noexcept;
+/// names are on the disk; false when one was made whose name may not be. That one could not be made at all shows when a file
+/// is made there.
+bool createDirectoriesAbove(const char *path) noexcept;
 
 /// Makes names created, renamed and deleted in the directory of a path durable.
 [[nodiscard]] bool syncDirectoryOf(const char *path) noexcept;

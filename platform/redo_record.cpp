@@ -14,8 +14,8 @@ namespace {
 
 constexpr std::string_view kMagic = "KAVREDO1";
 constexpr uint64_t kUnknownLength = UINT64_MAX;
-constexpr size_t kHeaderLength = 32, kChecksumLength = 8;
-static_assert(kMagic.size() == kVoidRecordLength, "a void record is one without its contents");
+constexpr size_t kInodeOffset = 8, kHeaderLength = 32, kChecksumLength = 8;
+static_assert(kInodeOffset + sizeof(uint64_t) == kVoidRecordLength, "a void record ends with the inode");
 
 void appendInteger(std::string &bytes, uint64_t value)
 {
@@ -78,11 +78,18 @@ std::optional<RedoRecord> decodeRedoRecord(std::string_view bytes) noexcept
     if (keptLength > contentsLength || newLength != contentsLength - keptLength)
         return std::nullopt;
     RedoRecord record;
-    record.inode = static_cast<ino_t>(integerAt(body, 8));
+    record.inode = static_cast<ino_t>(integerAt(body, kInodeOffset));
     if (oldLength != kUnknownLength)
         record.oldContents = body.substr(kHeaderLength, keptLength);
     record.newContents = body.substr(kHeaderLength + keptLength);
     return record;
+}
+
+std::optional<ino_t> inodeOfRedoRecord(std::string_view bytes) noexcept
+{
+    if (bytes.size() < kInodeOffset + sizeof(uint64_t) || !bytes.starts_with(kMagic))
+        return std::nullopt;
+    return static_cast<ino_t>(integerAt(bytes, kInodeOffset));
 }
 
 RedoVerdict judgeRedoRecord(const RedoRecord &record, ino_t inode, std::string_view contents) noexcept

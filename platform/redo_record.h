@@ -24,9 +24,10 @@
 //         32  …   old contents, new contents
 //        end  8   checksum of everything before it (64-bit FNV-1a)
 //
-// A void record is cut off after its first field, and stays for the next replacement, which need not make its name
-// durable again: a third of what a replacement takes. A record is void only after its name was made durable, and is deleted
-// where that is not certain.
+// A void record is cut off after its second field, and stays for the next replacement, which need not make its name
+// durable again: a third of what a replacement takes. It says that its own name and that of the file with this inode are on
+// the disk; where that is not certain, a record is deleted. Beside another file it says nothing: that one may have been
+// named, by whatever program, a moment ago.
 //
 // Used by data_file.cpp only, by one process at a time (the flock).
 
@@ -55,6 +56,10 @@ enum class RedoVerdict { Discard, Finish };
 
 /// The record in the bytes, with views into them; none when it is torn or no record.
 [[nodiscard]] std::optional<RedoRecord> decodeRedoRecord(std::string_view bytes) noexcept;
+
+/// The inode that a record is bound to, also a void one and one that is torn behind it; none when the bytes do not begin as
+/// a record does.
+[[nodiscard]] std::optional<ino_t> inodeOfRedoRecord(std::string_view bytes) noexcept;
 
 /// What to do with a whole record when its data file has this inode and these contents.
 [[nodiscard]] RedoVerdict judgeRedoRecord(const RedoRecord &record, ino_t inode, std::string_view contents) noexcept;

@@ -22,8 +22,8 @@ inline constexpr std::string_view kNewFilePrefix = ".new-";
 /// Followed by the hash, "-", and the time of keeping, as in damaged-0123456789abcdef-20260131T100000Z.
 inline constexpr std::string_view kDamagedCopyPrefix = "damaged-";
 
-/// The length of a void redo record, in bytes.
-inline constexpr off_t kVoidRecordLength = 8;
+/// The length of a void redo record, in bytes (redo_record.h).
+inline constexpr off_t kVoidRecordLength = 16;
 
 /// Whether this is the status of a void redo record, which stays after each replacement and says nothing.
 [[nodiscard]] inline bool isVoidRecord(const struct stat &status) noexcept

@@ -139,15 +139,16 @@ void deleteDataFile(const CSKavellAccount &account) noexcept
         NotifySendMsg(account);
 }
 
-/// Writes the file under the semaphore. When the semaphore cannot be taken nothing is written and nothing more is said.
-void writeUnderSemaphore(CSKavellAccount &account, std::string_view contents) noexcept
+/// Writes the file under the semaphore, where its directory is on the disk. When the semaphore cannot be taken nothing is
+/// written and nothing more is said.
+void writeUnderSemaphore(CSKavellAccount &account, std::string_view contents, bool hasDirectory) noexcept
 {
     struct stat status;
     const bool isNeeded = account.semaphoreID == 0;
     if (!LockDatafileAccess(account, isNeeded && queryStatus(account, status) ? &status : nullptr))
         return;
     // The time is taken while nobody else can write: records of one account may hold different semaphores.
-    if (writeDataFile(account.dataFilePath.get(), contents, isPropertyList, &account.dataFileModTime)) {
+    if (hasDirectory && writeDataFile(account.dataFilePath.get(), contents, isPropertyList, &account.dataFileModTime)) {
         account.hasChanges = false;
     } else {
         writeError("Error: failed to save Kavell Settings datafile\n");
@@ -158,11 +159,12 @@ void writeUnderSemaphore(CSKavellAccount &account, std::string_view contents) no
 void saveDataFile(CSKavellAccount &account, CSKavellDictionaryRef propertyList) noexcept
 {
     struct stat status;
+    bool hasDirectory = true;
     if (account.dataFilePath && !queryStatus(account, status))
-        createDirectoriesAbove(account.dataFilePath.get());
+        hasDirectory = createDirectoriesAbove(account.dataFilePath.get());
     std::string contents;
     if (writePropertyList(propertyList, contents))
-        writeUnderSemaphore(account, contents);
+        writeUnderSemaphore(account, contents, hasDirectory);
     else
         writeError("Error: unable to create XML property list for Kavell Accounts settings - save failed\n");
     // Announced after every attempt, also one that failed: observers reload, and find what there is.

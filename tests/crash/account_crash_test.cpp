@@ -189,6 +189,32 @@ TEST_F(AccountCrash, LeavesANewAccountWholeOrNotThere)
     m_scenario->checkEverything();
 }
 
+TEST_F(AccountCrash, LeavesANewAccountWholeOrNotThereBesideTheRecordOfOneThatIsGone)
+{
+    save(60001);
+    save(180002);
+    std::filesystem::remove(fileOf());
+    m_scenario->start(std::string(kNothing));
+    saveStep("create", 300003);
+    m_scenario->checkEverything();
+}
+
+TEST_F(AccountCrash, KeepsASaveOverAFileThatAnotherProgramHasJustPutInPlace)
+{
+    save(180001);
+    const std::string theirs = readFile(fileOf());
+    save(60002);
+    m_scenario->start(foundAs(60002));
+    const auto put = [&] {
+        const std::string path = fileOf() + ".theirs";
+        const FileDescriptor file = openFile(path.c_str(), O_WRONLY | O_CREAT | O_EXCL, 0600);
+        EXPECT_TRUE(writeWhole(file.get(), theirs) && fsync(file.get()) == 0);
+        EXPECT_EQ(std::rename(path.c_str(), fileOf().c_str()), 0);
+    };
+    m_scenario->step("put in place, without a sync of the directory", put, foundAs(180001));
+    m_scenario->checkPowerCutsAfterKills();
+}
+
 TEST_F(AccountCrash, LeavesAChangedAccountAsBeforeOrAsAfter)
 {
     save(300001);
@@ -285,6 +311,15 @@ TEST_F(AccountCrash, LeavesAChangedAccountAsBeforeOrAsAfterWhereACallFailedToo)
     m_scenario->start(foundAs(40001));
     m_scenario->checkPowerCutsAfterFaults([] { static_cast<void>(trySave(20002)); }, foundAs(20002));
     m_scenario->checkPowerCutsAfterFaults([] { static_cast<void>(trySave(90003)); }, foundAs(90003));
+    m_scenario->checkSavesAfterFaults([] { static_cast<void>(trySave(20002)); });
+}
+
+TEST_F(AccountCrash, MakesAnAccountsPermissionsThoseOfItsOwnerAloneWhereACallFailedBefore)
+{
+    save(30001);
+    chmod(fileOf().c_str(), 0644);
+    m_scenario->start(foundAs(30001) + ", open to others");
+    m_scenario->checkSavesAfterFaults([] { static_cast<void>(trySave(20002)); });
 }
 
 TEST_F(AccountCrash, LeavesACutOffReplacementWholeWhereACallFailedToo)
@@ -292,6 +327,7 @@ TEST_F(AccountCrash, LeavesACutOffReplacementWholeWhereACallFailedToo)
     putTornAccount(80001, 60002);
     m_scenario->start(foundAs(60002));
     m_scenario->checkPowerCutsAfterFaults([] { static_cast<void>(trySave(50003)); }, foundAs(50003));
+    m_scenario->checkSavesAfterFaults([] { static_cast<void>(trySave(50003)); });
 }
 
 TEST_F(AccountCrash, LeavesARemovedAccountWholeOrGoneWhereACallFailedToo)
@@ -299,10 +335,12 @@ TEST_F(AccountCrash, LeavesARemovedAccountWholeOrGoneWhereACallFailedToo)
     putTornAccount(80001, 60002);
     m_scenario->start(foundAs(60002));
     m_scenario->checkPowerCutsAfterFaults(remove, std::string(kNothing));
+    m_scenario->checkSavesAfterFaults(remove);
 }
 
 TEST_F(AccountCrash, LeavesANewAccountWholeOrNotThereWhereACallFailedToo)
 {
     m_scenario->start(std::string(kNothing));
     m_scenario->checkPowerCutsAfterFaults([] { static_cast<void>(trySave(50003)); }, foundAs(50003));
+    m_scenario->checkSavesAfterFaults([] { static_cast<void>(trySave(50003)); });
 }

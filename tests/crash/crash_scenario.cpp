@@ -10,7 +10,6 @@
 #include <gtest/gtest.h>
 
 #include "platform/checksum.h"
-#include "tests/faults/fault_injector.h"
 
 namespace kavell::test {
 
@@ -270,12 +269,13 @@ void CrashScenario::checkPowerCutsAfterKills()
     });
 }
 
-void CrashScenario::checkPowerCutsAfterFaults(const std::function<void()> &act, const std::string &found)
+void CrashScenario::forEachFaultOf(const std::function<void()> &act,
+                                   const std::function<void(const FaultInjector &, const Recorder &)> &visit)
 {
     m_seen.clear();
     // What a call fails with matters to the messages, not to the disk.
     forEachFault({.errors = {EIO}, .leaveNothing = false}, [&](FaultInjector &injector) {
-        m_directory.make(m_start);
+        m_directory.makeAnew(m_start);
         Recorder recorder(m_directory, injector);
         {
             const Observation observation(recorder);
@@ -283,8 +283,35 @@ void CrashScenario::checkPowerCutsAfterFaults(const std::function<void()> &act, 
         }
         // What was said meanwhile is not for the states that follow.
         static_cast<void>(m_observe());
+        visit(injector, recorder);
+    });
+}
+
+void CrashScenario::checkPowerCutsAfterFaults(const std::function<void()> &act, const std::string &found)
+{
+    forEachFaultOf(act, [&](const FaultInjector &injector, const Recorder &recorder) {
         checkCutsOf(Disk(m_start), recorder.operations(), false, {m_steps.front().found, found},
                     "After " + injector.description() + ", and a power cut,");
+    });
+}
+
+void CrashScenario::checkSavesAfterFaults(const std::function<void()> &act)
+{
+    forEachFaultOf(act, [&](const FaultInjector &injector, const Recorder &recorder) {
+        Disk disk(m_start);
+        for (const DiskOperation &operation : recorder.operations())
+            disk.apply(operation);
+        const std::string found = observeState(disk.latest());
+        // In the directories that the program knows: it may believe that their names are on the disk.
+        m_directory.make(disk.latest());
+        Recorder next(m_directory);
+        std::string later;
+        {
+            const Observation observation(next);
+            later = m_proceed(found);
+        }
+        checkCutsOf(disk, next.operations(), true, {later},
+                    "After " + injector.description() + ", a save, and a power cut,");
     });
 }
 

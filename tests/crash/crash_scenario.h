@@ -18,6 +18,7 @@
 //     checkPowerCutsWhileRecovering the power fails again while what the first cut left is put in order
 //     checkPowerCutsAfterKills      a program dies, another one saves over what it left, and then the power fails
 //     checkPowerCutsAfterFaults     a system call fails, whatever the program makes of it, and the power fails too
+//     checkSavesAfterFaults         the same, but the program saves once more, and then the power fails
 //
 // How many states: CRASH_STATES=number in the environment is the most that are tried for one moment and one outcome of
 // the directories before they are picked at random (default below); CRASH_SEED=number repeats a run. Both are printed.
@@ -33,6 +34,7 @@
 
 #include "tests/crash/disk.h"
 #include "tests/crash/recorder.h"
+#include "tests/faults/fault_injector.h"
 
 namespace kavell::test {
 
@@ -63,6 +65,7 @@ public:
     void checkPowerCutsAfterKills();
     /// Does something else from the start on, after which `found` is to be found or what was there before.
     void checkPowerCutsAfterFaults(const std::function<void()> &act, const std::string &found);
+    void checkSavesAfterFaults(const std::function<void()> &act);
 
 private:
     struct Step {
@@ -86,6 +89,8 @@ private:
                      const std::vector<std::string> &allowed, const std::string &what);
     [[nodiscard]] bool isNew(const DiskState &state, const std::vector<std::string> &allowed);
     [[nodiscard]] std::string observeState(const DiskState &state);
+    void forEachFaultOf(const std::function<void()> &act,
+                        const std::function<void(const FaultInjector &, const Recorder &)> &visit);
     void check(const Moment &moment, const DiskState &state, const std::string &what);
     void report(const Moment &moment, const DiskState &state, const std::string &what, const std::string &found);
 

@@ -157,4 +157,5 @@ TEST_F(PreferencesCrash, LeavesPreferencesAsBeforeOrAsAfterWhereACallFailedToo)
         static_cast<void>(preferences.synchronize());
     };
     m_scenario->checkPowerCutsAfterFaults(trySaving, foundAs(90002));
+    m_scenario->checkSavesAfterFaults(trySaving);
 }

@@ -131,6 +131,7 @@ TEST_F(VaultCrash, LeavesAVaultAsBeforeOrAsAfterWhereACallFailedToo)
         static_cast<void>(m_store->add(kService, "ben", std::string(900, 'b'), item));
     };
     m_scenario->checkPowerCutsAfterFaults(tryAdding, "ada:one ben:900xb ");
+    m_scenario->checkSavesAfterFaults(tryAdding);
 }
 
 }  // namespace

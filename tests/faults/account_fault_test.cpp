@@ -81,12 +81,24 @@ protected:
                            "</string>");
     }
 
+    static ino_t inodeOfAccount()
+    {
+        struct stat status {};
+        EXPECT_EQ(stat(fileOf("ada").c_str(), &status), 0);
+        return status.st_ino;
+    }
+
     /// The same beside the void record of an earlier save.
     static void putSavedAccount(int64_t round)
     {
-        const std::string recordPath = siblingPath(fileOf("ada"), kRedoRecordPrefix);
         putAccount(round);
-        writeFile(recordPath, "KAVREDO1");
+        putVoidRecord(inodeOfAccount());
+    }
+
+    static void putVoidRecord(ino_t inode)
+    {
+        const std::string recordPath = siblingPath(fileOf("ada"), kRedoRecordPrefix);
+        writeFile(recordPath, voidRecordOf(inode));
         chmod(recordPath.c_str(), 0600);
     }
 
@@ -96,10 +108,8 @@ protected:
         const std::string oldContents = contentsOf(round), newContents = contentsOf(newRound);
         putAccount(round);
         writeFile(fileOf("ada"), newContents.substr(0, kTorn) + oldContents.substr(kTorn));
-        struct stat status {};
-        ASSERT_EQ(stat(fileOf("ada").c_str(), &status), 0);
         writeFile(siblingPath(fileOf("ada"), kRedoRecordPrefix),
-                  encodeRedoRecord({status.st_ino, oldContents, newContents}));
+                  encodeRedoRecord({inodeOfAccount(), oldContents, newContents}));
     }
 
     static std::string describe(const Account &account)
@@ -338,6 +348,25 @@ TEST_F(AccountFaults, ASaveThatUsesTheRecordOfAnEarlierOneIsDoneOrSaysSo)
 {
     checkSave(
         {}, [] { putSavedAccount(kOld); }, kLonger, foundAs(kOld, kOld), foundAs(kLonger, kOld), isLate);
+}
+
+TEST_F(AccountFaults, ASaveBesideTheRecordOfAnotherFileIsDoneOrSaysSo)
+{
+    const auto put = [] {
+        putAccount(kOld);
+        putVoidRecord(inodeOfAccount() + 1);
+    };
+    checkSave({}, put, kLonger, foundAs(kOld, kOld), foundAs(kLonger, kOld), isLate);
+}
+
+TEST_F(AccountFaults, ASaveThatCreatesTheFileBesideTheRecordOfOneThatIsGoneIsDoneOrSaysSo)
+{
+    const auto put = [] {
+        putAccount(kOld);
+        putVoidRecord(inodeOfAccount());
+        std::filesystem::remove(fileOf("ada"));
+    };
+    checkSave({}, put, kNew, std::string(kNothing), foundAlone(kNew), isNamed);
 }
 
 TEST_F(AccountFaults, ASaveOverACutOffReplacementIsDoneOrSaysSo)

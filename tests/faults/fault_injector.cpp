@@ -37,9 +37,10 @@ bool movesBytes(CallKind kind)
     return kind == CallKind::Read || kind == CallKind::Write;
 }
 
-bool isOnSemaphores(CallKind kind)
+/// Those on semaphores and sockets stand behind all others.
+bool isOnFiles(CallKind kind)
 {
-    return kind == CallKind::MakeKey || kind == CallKind::GetSemaphore || kind == CallKind::OperateSemaphore;
+    return kind < CallKind::MakeKey;
 }
 
 bool changesDisk(const SystemCall &call)
@@ -102,9 +103,9 @@ bool Fault::isPassing(CallKind kind) const
     if (form == Form::Half || form == Form::OneByte)
         return true;
     // The others never end so, whatever the system.
-    static constexpr std::array kInterruptible = {CallKind::Open,     CallKind::Read,    CallKind::Write,
-                                                  CallKind::Truncate, CallKind::Reserve, CallKind::SyncFile,
-                                                  CallKind::SyncData, CallKind::Lock};
+    static constexpr std::array kInterruptible = {
+        CallKind::Open,     CallKind::Read,     CallKind::Write, CallKind::Truncate, CallKind::Reserve,
+        CallKind::SyncFile, CallKind::SyncData, CallKind::Lock,  CallKind::Connect,  CallKind::Send};
     return form == Form::Error && error == EINTR &&
            std::find(kInterruptible.begin(), kInterruptible.end(), kind) != kInterruptible.end();
 }
@@ -119,7 +120,7 @@ bool FaultInjector::strikes(const SystemCall &call, size_t number)
     case Fault::Form::ReadOnly:
         return number >= m_fault.number && changesDisk(call);
     case Fault::Form::Gone:
-        return number >= m_fault.number && !isOnSemaphores(call.kind) && call.kind != CallKind::ReadDirectory &&
+        return number >= m_fault.number && isOnFiles(call.kind) && call.kind != CallKind::ReadDirectory &&
                !(call.path && isElsewhere(call.path));
     default:
         return false;

@@ -11,6 +11,7 @@
 #include <dlfcn.h>
 #include <fcntl.h>
 #include <sys/sem.h>
+#include <sys/socket.h>
 #include <sys/stat.h>
 #include <sys/syscall.h>
 #include <unistd.h>
@@ -60,10 +61,10 @@ template <typename Function> Function *libraryFunction(const char *name)
 
 std::string_view nameOf(CallKind kind)
 {
-    static constexpr std::array<std::string_view, 22> kNames = {
-        "open",   "read",    "write",    "ftruncate", "fallocate", "fsync", "fdatasync", "stat",
-        "access", "chmod",   "futimens", "flock",     "rename",    "link",  "unlink",    "mkdir",
-        "rmdir",  "opendir", "readdir",  "ftok",      "semget",    "semop"};
+    static constexpr std::array<std::string_view, 25> kNames = {
+        "open",    "read",     "write",  "ftruncate", "fallocate", "fsync",   "fdatasync", "stat",  "access",
+        "chmod",   "futimens", "flock",  "rename",    "link",      "unlink",  "mkdir",     "rmdir", "opendir",
+        "readdir", "ftok",     "semget", "semop",     "socket",    "connect", "send"};
     return kNames[static_cast<size_t>(kind)];
 }
 
@@ -275,6 +276,23 @@ int semop(int set, struct sembuf *operations, size_t count) noexcept
     return static_cast<int>(
         observed({.kind = CallKind::OperateSemaphore, .descriptor = set, .change = operations->sem_op},
                  kernel(SYS_semop, set, operations, count)));
+}
+
+int socket(int domain, int type, int protocol) noexcept
+{
+    return static_cast<int>(observed({.kind = CallKind::MakeSocket}, kernel(SYS_socket, domain, type, protocol)));
+}
+
+int connect(int descriptor, const struct sockaddr *address, socklen_t length)
+{
+    return static_cast<int>(observed({.kind = CallKind::Connect, .descriptor = descriptor},
+                                     kernel(SYS_connect, descriptor, address, length)));
+}
+
+ssize_t send(int descriptor, const void *bytes, size_t length, int flags)
+{
+    return observed({.kind = CallKind::Send, .descriptor = descriptor},
+                    kernel(SYS_sendto, descriptor, bytes, length, flags, static_cast<const void *>(nullptr), 0));
 }
 
 key_t ftok(const char *path, int project) noexcept

@@ -1,8 +1,8 @@
 // SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
-// A program's own system calls, seen and changed by its tests: whoever observes is asked about every call on files and
-// semaphores that the observed thread makes, and makes it, refuses it, or writes it down.
+// A program's own system calls, seen and changed by its tests: whoever observes is asked about every call on files,
+// semaphores and sockets that the observed thread makes, and makes it, refuses it, or writes it down.
 //
 //     Observation observation(observer);
 //     … code whose calls are observed …
@@ -44,6 +44,9 @@ enum class CallKind {
     MakeKey,
     GetSemaphore,
     OperateSemaphore,
+    MakeSocket,
+    Connect,
+    Send,
 };
 
 /// The name of a kind as the system's call has it.

@@ -81,6 +81,13 @@ TEST_F(DataDirectoryTest, ListsTheRegularFilesThatAreNamedSo)
     EXPECT_EQ(namesIn(DataDirectory(m_path.c_str())), (Names{"ada.plist", "grace.plist"}));
 }
 
+TEST_F(DataDirectoryTest, ListsAFileWhoseNameBeginsLikeThatOfARecord)
+{
+    put(".redo-ada.plist");
+    put(".redo-0123456789abcdef");
+    EXPECT_EQ(namesIn(DataDirectory(m_path.c_str())), (Names{".redo-ada.plist", "ada.plist", "grace.plist"}));
+}
+
 TEST_F(DataDirectoryTest, HasNothingWhereThereIsNoDirectory)
 {
     const DataDirectory directory((m_path + "/missing").c_str());
@@ -131,6 +138,26 @@ TEST_F(DataDirectoryTest, IsNotSureWhereTheClockCouldNotTell)
         }
     }
     FAIL() << "the directory was never listed within a tick";
+}
+
+TEST(DataDirectoryTimes, TellOfAChangeOnlyOnceTheTickHasPassed)
+{
+    const timespec changed{100, 500'000'000};
+    EXPECT_FALSE(wouldChangeTell(changed, {100, 500'000'000}));
+    EXPECT_FALSE(wouldChangeTell(changed, {100, 510'000'000}));
+    EXPECT_TRUE(wouldChangeTell(changed, {100, 510'000'001}));
+    EXPECT_TRUE(wouldChangeTell(changed, {101, 0}));
+}
+
+TEST(DataDirectoryTimes, TellNothingWhereTheClockWasSetBack)
+{
+    EXPECT_FALSE(wouldChangeTell({100, 500'000'000}, {99, 900'000'000}));
+}
+
+TEST(DataDirectoryTimes, TellNothingWhereTheyHaveWholeSecondsOnly)
+{
+    EXPECT_FALSE(wouldChangeTell({100, 0}, {100, 900'000'000}));
+    EXPECT_FALSE(wouldChangeTell({100, 0}, {200, 0}));
 }
 
 TEST_F(DataDirectoryTest, AFoundFileThatWasTornSinceTheListingIsReadWhole)

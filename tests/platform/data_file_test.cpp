@@ -168,7 +168,7 @@ TEST_F(DataFile, ARecordCutOffAtAnyByteIsNotApplied)
     for (size_t length = 0; length < whole.size(); ++length) {
         writeFile(m_recordPath, whole.substr(0, length));
         EXPECT_EQ(read(), kOld) << length;
-        EXPECT_EQ(hasRecord(), length == 8) << length;
+        EXPECT_EQ(hasRecord(), length == 16) << length;
     }
 }
 
@@ -209,6 +209,26 @@ TEST_F(DataFile, RewritingAgainUsesTheSameRecord)
     EXPECT_EQ(inodeOf(m_recordPath), before);
     EXPECT_TRUE(hasVoidRecord());
     EXPECT_EQ(readFile(m_path), kOld);
+}
+
+TEST_F(DataFile, TheVoidRecordThatStaysIsTheFiles)
+{
+    writeFile(m_path, kOld);
+    EXPECT_TRUE(writeDataFile(m_path.c_str(), kNew, isIntactAlways));
+    EXPECT_EQ(readFile(m_recordPath), voidRecordOf(inode()));
+}
+
+TEST_F(DataFile, TheVoidRecordOfAnotherFileIsNotUsed)
+{
+    // Nobody knows whether the name of a file that was put in the other's place is on the disk.
+    const std::string another = m_directory + "/another";
+    writeFile(m_path, kOld);
+    writeFile(m_recordPath, voidRecordOf(inode() + 1));
+    std::filesystem::create_hard_link(m_recordPath, another);
+    EXPECT_TRUE(writeDataFile(m_path.c_str(), kNew, isIntactAlways));
+    EXPECT_NE(inodeOf(m_recordPath), inodeOf(another));
+    EXPECT_EQ(readFile(m_recordPath), voidRecordOf(inode()));
+    EXPECT_EQ(readFile(m_path), kNew);
 }
 
 TEST_F(DataFile, ARecordThatIsUsedAgainIsItsOwnersAlone)

@@ -11,6 +11,7 @@
 #include <sys/sem.h>
 #include <unistd.h>
 
+#include "platform/redo_record.h"
 #include "tests/store/store_test.h"
 
 using namespace kavell;
@@ -30,6 +31,21 @@ protected:
     }
 
     static void setPermissions(const std::string &path, mode_t mode) { ASSERT_EQ(chmod(path.c_str(), mode), 0); }
+
+    /// Leaves a replacement of 11 by 22 that was cut off in between, with its record. What stands in the file.
+    static std::string putTornFile()
+    {
+        const auto contentsOf = [](const std::string &number) {
+            return accountFile("<key>a</key><integer>" + number + "</integer>");
+        };
+        const std::string torn = contentsOf("21"), oldContents = contentsOf("11"), newContents = contentsOf("22");
+        writeFile(fileOf("ada"), torn);
+        struct stat status {};
+        EXPECT_EQ(stat(fileOf("ada").c_str(), &status), 0);
+        writeFile(siblingPath(fileOf("ada"), kRedoRecordPrefix),
+                  encodeRedoRecord({status.st_ino, oldContents, newContents}));
+        return torn;
+    }
 
     /// Commits a change that must fail with the save message, be announced and stay pending.
     static void expectSaveFails(const Account &account)
@@ -54,6 +70,40 @@ TEST_F(Permissions, AFileThatMayNotBeReadLeavesTheRecordSilently)
     EXPECT_TRUE(CSKavellAccountLoadData(account.get()));
     EXPECT_EQ(capture.take(), "");
     EXPECT_TRUE(same(attribute(account, "a"), integer(1)));
+}
+
+TEST_F(Permissions, AReplacementWhoseRecordMayNotBeDeletedIsReadWhole)
+{
+    putTornFile();
+    setPermissions(providerDirectory(), 0500);
+    StandardErrorCapture capture;
+    for (int time = 0; time < 2; ++time)
+        EXPECT_TRUE(same(attribute(openAccount("ada"), "a"), integer(22)));
+    EXPECT_EQ(capture.take(), "");
+}
+
+TEST_F(Permissions, AReplacementThatMayNotBeFinishedIsReadWhole)
+{
+    const std::string torn = putTornFile();
+    setPermissions(fileOf("ada"), 0400);
+    StandardErrorCapture capture;
+    EXPECT_TRUE(same(attribute(openAccount("ada"), "a"), integer(22)));
+    EXPECT_EQ(capture.take(), "");
+    EXPECT_EQ(readFile(fileOf("ada")), torn);
+}
+
+TEST_F(Permissions, AReplacementWhoseRecordMayNotBeReadLeavesTheRecordSilently)
+{
+    const Account account = openAccount("ada");
+    putTornFile();
+    setPermissions(siblingPath(fileOf("ada"), kRedoRecordPrefix), 0000);
+    StandardErrorCapture capture;
+    EXPECT_TRUE(CSKavellAccountLoadData(account.get()));
+    EXPECT_TRUE(same(attribute(account, "a"), integer(1)));
+    setPermissions(fileOf("ada"), 0400);
+    EXPECT_TRUE(CSKavellAccountLoadData(account.get()));
+    EXPECT_TRUE(same(attribute(account, "a"), integer(1)));
+    EXPECT_EQ(capture.take(), "");
 }
 
 TEST_F(Permissions, AFileThatMayNotBeWrittenFailsTheSave)

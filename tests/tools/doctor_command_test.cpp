@@ -10,6 +10,7 @@
 
 #include "platform/data_file.h"
 #include "platform/redo_record.h"
+#include "tests/support/redo_records.h"
 #include "tests/tools/client_fixture.h"
 #include "tests/tools/semaphore_holder.h"
 
@@ -272,7 +273,9 @@ TEST_F(DoctorCommand, LeavesAFileWhoseRecordIsOfAnEarlierOne)
 
 TEST_F(DoctorCommand, SaysNothingOfTheVoidRecordThatASaveLeaves)
 {
-    writeFile(siblingPath(m_path, kRedoRecordPrefix), "KAVREDO1");
+    struct stat status {};
+    ASSERT_EQ(stat(m_path.c_str(), &status), 0);
+    writeFile(siblingPath(m_path, kRedoRecordPrefix), voidRecordOf(status.st_ino));
 
     EXPECT_THAT(problems(client({"doctor", "--json"})), testing::IsEmpty());
 }
@@ -280,7 +283,7 @@ TEST_F(DoctorCommand, SaysNothingOfTheVoidRecordThatASaveLeaves)
 TEST_F(DoctorCommand, RemovesTheVoidRecordOfAFileThatIsGone)
 {
     const std::string record = siblingPath(dataFilePath(googleType, "gone"), kRedoRecordPrefix);
-    writeFile(record, "KAVREDO1");
+    writeFile(record, voidRecordOf(1));
 
     expectMended("left-over-record");
 
