@@ -196,8 +196,9 @@ void save(const OpenedAccount &account, const std::string &what)
         _CSKavellAccountCommitChanges(account.record.get());
     }
     if (_CSKavellAccountHasPendingChanges(account.record.get()))
-        throw Failure(ExitCode::Failed, what + " could not be saved in " + escaped(path) +
-                                            "; check the disk's space and the directory's permissions");
+        throw Failure(ExitCode::Failed,
+                      what + " could not be saved in " + escaped(path) +
+                          "; check the disk's space and the directory's permissions, and run 'kavell-accounts doctor'");
 }
 
 std::string textAttribute(CSKavellAccountRef account, std::string_view key)

@@ -60,11 +60,17 @@ void examineMode(const std::string &path, const struct stat &status, mode_t want
                           [&] { return chmod(path.c_str(), wanted) == 0; });
 }
 
-/// The inode of a file, 0 when there is none.
-ino_t inodeOf(const std::string &path)
+/// What tells a redo record from one that has come in its place, and from itself once a save uses it: inodes' numbers are
+/// given out again, and void records are used again.
+using RecordIdentity = std::pair<ino_t, FileTime>;
+
+/// None when there is no record.
+std::optional<RecordIdentity> recordAt(const std::string &path)
 {
     struct stat status;
-    return lstat(path.c_str(), &status) == 0 ? status.st_ino : 0;
+    if (lstat(path.c_str(), &status) != 0)
+        return std::nullopt;
+    return RecordIdentity{status.st_ino, {status.st_ctim.tv_sec, status.st_ctim.tv_nsec}};
 }
 
 /// The account whose data file the redo record bears the name of; none when there is no such file. Looked for anew: an
@@ -85,7 +91,8 @@ std::optional<Address> accountOfRedoRecord(const std::string &path)
 bool isToBeSettled(const std::string &path, const Address &account, const Findings &findings)
 {
     const bool canOpen = !findings.untouchable.contains(account);
-    const FileDescriptor file(canOpen ? open(dataFileOf(account).c_str(), O_RDONLY | O_CLOEXEC) : -1);
+    constexpr int flags = O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY;  // whatever stands there, this does not wait
+    const FileDescriptor file(canOpen ? open(dataFileOf(account).c_str(), flags) : -1);
     if (file.get() >= 0)
         (void)lockWithinBound(file.get(), LOCK_SH);
     struct stat status;
@@ -94,12 +101,12 @@ bool isToBeSettled(const std::string &path, const Address &account, const Findin
 
 void examineRedoRecord(const std::string &path, Findings &findings)
 {
-    // Asked before the account is looked for: one that is added after that has a record of its own, which is another file.
-    const ino_t record = inodeOf(path);
+    // Asked before the account is looked for: one that is added after that makes the record its own.
+    const std::optional<RecordIdentity> record = recordAt(path);
     const std::optional<Address> account = accountOfRedoRecord(path);
     if (!account) {
         const auto isStillThere = [&] {
-            return record != 0 && inodeOf(path) == record;
+            return record && recordAt(path) == record;
         };
         if (isStillThere())
             findings.mendable("left-over-record", path, escaped(path) + " is the record of a save whose file is gone",

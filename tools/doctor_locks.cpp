@@ -115,6 +115,12 @@ void examineSet(SharedSet &set, Findings &findings)
     else if (report.state == SemaphoreState::AdmitsSeveral)
         findings.mendable("open-lock", path, lock + " lets " + std::to_string(report.value) + " programs in at once",
                           mend);
+    else if (report.state == SemaphoreState::Refused)
+        findings.problem("foreign-lock", path,
+                         lock +
+                             " was made by another user, so that nothing is read or saved here; have that user or "
+                             "the administrator remove it by 'ipcrm -s " +
+                             std::to_string(report.id) + "' when no program uses it");
     const bool stuck = report.state != SemaphoreState::Free && report.state != SemaphoreState::AdmitsSeveral;
     if (stuck && !(findings.all.size() > before && findings.all.back().mended))
         findings.untouchable.insert(set.accounts.begin(), set.accounts.end());

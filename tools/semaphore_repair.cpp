@@ -99,7 +99,12 @@ std::optional<SemaphoreReport> inspectSemaphore(const std::string &path)
     if (key == -1 && !path.empty())
         return std::nullopt;
     const int id = semget(key, 0, 0);
-    return id > 0 ? inspectSemaphoreSet(id) : std::nullopt;
+    if (id <= 0)
+        return std::nullopt;
+    // Anybody may find a set. Asked for with what an operation needs, the kernel looks at the permissions.
+    if (semget(key, 0, 0600) < 0 && errno == EACCES)
+        return SemaphoreReport{id, SemaphoreState::Refused, 0, 0};
+    return inspectSemaphoreSet(id);
 }
 
 std::vector<int> setsLikeThoseIn(const std::string &directory)

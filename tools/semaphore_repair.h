@@ -22,6 +22,7 @@ enum class SemaphoreState {
     HeldByDead,     ///< the last process to operate on it is gone
     NeverReady,     ///< nobody has operated on it, nor given it its first value
     AdmitsSeveral,  ///< its value is above 1, so that it keeps nobody out
+    Refused,        ///< somebody else made it, and lets this user neither take it nor look at it
 };
 
 struct SemaphoreReport {

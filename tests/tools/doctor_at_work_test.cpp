@@ -59,6 +59,28 @@ TEST_F(DoctorAtWork, OnlyReportsItWithoutRepair)
     EXPECT_TRUE(m_findings.untouchable.contains(m_anna));
 }
 
+TEST_F(DoctorAtWork, ReportsALockThatAnotherUserMadeFirst)
+{
+    // The lock of accounts that are being added has the same key for all users.
+    const int set = semaphoreOf("");
+    semid_ds status{};
+    ASSERT_EQ(semctl(set, 0, IPC_STAT, &status), 0);
+    const auto setMode = [&](unsigned short mode) {
+        status.sem_perm.mode = mode;
+        return semctl(set, 0, IPC_SET, &status);
+    };
+    ASSERT_EQ(setMode(0), 0);
+    // The administrator may use any.
+    ChildProcess otherUser([&] {
+        if (geteuid() == 0 && setuid(65534) != 0)
+            return 2;
+        examineLocks({}, m_findings);
+        return kinds() == std::vector<std::string>{"foreign-lock"} ? 0 : 1;
+    });
+    EXPECT_EQ(otherUser.wait(), 0);
+    EXPECT_EQ(setMode(0600), 0);
+}
+
 TEST_F(DoctorAtWork, GivesALivingHolderUpInTheEnd)
 {
     m_findings.repair = true;
