@@ -54,6 +54,13 @@ FileLock::FileLock(const std::string &name, const Deadline &deadline)
     m_state = !taken ? State::timedOut : error == 0 ? State::held : State::failed;
 }
 
+FileLock::~FileLock()
+{
+    // Explicitly: a child that the host forks meanwhile has the file open too, and would keep the lock.
+    if (m_state == State::held)
+        flock(m_file.get(), LOCK_UN);
+}
+
 StoredFile readWholeFile(const std::string &path, size_t most)
 {
     // Not blocking: what stands there may be a pipe.

@@ -28,6 +28,9 @@ class FileLock {
 public:
     /// Takes the lock on the file of that name in the credential directory, waiting until the deadline.
     FileLock(const std::string &name, const Deadline &deadline);
+    ~FileLock();
+    FileLock(const FileLock &) = delete;
+    FileLock &operator=(const FileLock &) = delete;
 
     enum class State { held, timedOut, failed };
     [[nodiscard]] State state() const noexcept { return m_state; }

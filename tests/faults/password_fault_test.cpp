@@ -99,6 +99,35 @@ TEST_F(PasswordFaults, APasswordFoundByItsNamesIsReplacedOrTheMessagesSayWhyNot)
     checkSetting(false, kAddMessages);
 }
 
+TEST_F(PasswordFaults, APasswordThatNeedsANewVaultIsSetOrTheMessagesSayWhyNot)
+{
+    // Each run makes keys, which takes a while; the other errors end as these do.
+    forEachFault({.errors = {EIO, EINTR}}, [&](FaultInjector &injector) {
+        std::filesystem::remove(vaultPath());
+        useCredentialStoreForTesting(nullptr);
+        const Account account = openAccount("ada");
+        StandardErrorCapture errors;
+        const size_t descriptors = countOpenDescriptors();
+        bool isSet = false;
+        {
+            const Observation observation(injector);
+            isSet = static_cast<bool>(adopt(_CSKavellAccountSetPassword(account.get(), text("new").get())));
+        }
+        const std::string said = errors.take();
+        EXPECT_EQ(countOpenDescriptors(), descriptors);
+        const auto found = adopt(_CSKavellAccountCopyPassword(account.get()));
+        EXPECT_EQ(found ? toStdString(found.get()) : "(none)", isSet ? "new" : "(none)");
+        if (isSet) {
+            EXPECT_EQ(said, "");
+        } else {
+            EXPECT_FALSE(attribute(account, kToken));
+            EXPECT_FALSE(injector.fault().isPassing(injector.failed()->kind));
+            EXPECT_THAT(said, testing::AnyOf("", kAddMessages));
+            EXPECT_TRUE(adopt(_CSKavellAccountSetPassword(account.get(), text("next").get())));
+        }
+    });
+}
+
 TEST_F(PasswordFaults, ReadingGivesThePasswordOrNoneWithoutAWord)
 {
     forEachFault({}, [&](FaultInjector &injector) {

@@ -160,6 +160,82 @@ TEST_F(VaultFaults, APassphraseThatCannotBeReadLeavesTheVaultClosed)
     });
 }
 
+TEST_F(VaultFaults, UnlockingMakesAVaultOrNot)
+{
+    forEachFault({.errors = {EIO, EINTR}}, [&](FaultInjector &injector) {
+        std::filesystem::remove(vaultPath());
+        openStore();
+        const size_t descriptors = countOpenDescriptors();
+        CredentialStatus status = CredentialStatus::absent;
+        {
+            const Observation observation(injector);
+            status = m_store->unlock(nullptr);
+        }
+        EXPECT_EQ(countOpenDescriptors(), descriptors);
+        EXPECT_EQ(std::filesystem::exists(vaultPath()), status == CredentialStatus::stored);
+        if (status != CredentialStatus::stored) {
+            // Without its passphrase nobody can make one.
+            EXPECT_TRUE(status == CredentialStatus::failed || status == CredentialStatus::locked)
+                << credentialStatusName(status);
+            EXPECT_FALSE(injector.fault().isPassing(injector.failed()->kind));
+            EXPECT_EQ(m_store->unlock(nullptr), CredentialStatus::stored);
+        }
+        // With the whole passphrase, not with what was read of it.
+        openStore();
+        expectNextChange();
+    });
+}
+
+TEST_F(VaultFaults, UnlockingOpensTheVaultOrLeavesItClosed)
+{
+    forEachFault({.errors = {EIO, EINTR}}, [&](FaultInjector &injector) {
+        openStore();
+        const size_t descriptors = countOpenDescriptors();
+        CredentialStatus status = CredentialStatus::absent;
+        {
+            const Observation observation(injector);
+            status = m_store->unlock(nullptr);
+        }
+        EXPECT_EQ(countOpenDescriptors(), descriptors);
+        EXPECT_EQ(readFile(vaultPath()), m_before);
+        if (status != CredentialStatus::stored) {
+            EXPECT_TRUE(status == CredentialStatus::failed || status == CredentialStatus::locked)
+                << credentialStatusName(status);
+            EXPECT_FALSE(injector.fault().isPassing(injector.failed()->kind));
+        }
+    });
+}
+
+/// Forks a child when a lock has been taken, which lives on with all that this process has open.
+class ForkAtLock : public SystemCallObserver {
+public:
+    long onCall(SystemCall &call, const std::function<long()> &make) override
+    {
+        const long result = make();
+        if (call.kind == CallKind::Lock && result == 0 && !m_child)
+            m_child = std::make_unique<ChildProcess>([] { return pause(); });
+        return result;
+    }
+
+    [[nodiscard]] bool hasForked() const { return m_child != nullptr; }
+
+private:
+    std::unique_ptr<ChildProcess> m_child;
+};
+
+TEST_F(VaultFaults, AChildThatIsForkedMeanwhileDoesNotKeepTheLock)
+{
+    setenv("KAVELL_CREDENTIAL_TIMEOUT", "500", 1);
+    ForkAtLock forkAtLock;
+    {
+        const Observation observation(forkAtLock);
+        EXPECT_EQ(m_store->replaceSecret(m_ben, "bb"), CredentialStatus::stored);
+    }
+    EXPECT_TRUE(forkAtLock.hasForked());
+    EXPECT_EQ(m_store->replaceSecret(m_ben, "bbb"), CredentialStatus::stored);
+    unsetenv("KAVELL_CREDENTIAL_TIMEOUT");
+}
+
 TEST_F(VaultFaults, ANewVaultIsMadeOrNot)
 {
     // Each run may make a key twice, which takes a while; the other errors end as these do.
