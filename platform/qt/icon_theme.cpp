@@ -9,6 +9,7 @@
 
 #include <QtCore/QDir>
 #include <QtCore/QFileInfo>
+#include <QtCore/QSet>
 #include <QtCore/QSettings>
 #include <QtCore/QStandardPaths>
 #include <QtGui/QIcon>
@@ -20,7 +21,7 @@ namespace kavell {
 namespace {
 
 constexpr int kWantedSize = 64;
-constexpr int kDeepestInheritance = 16;
+constexpr qsizetype kMostThemes = 64;
 const char *const kExtensions[] = {"png", "svg", "xpm"};
 
 struct Candidate {
@@ -51,11 +52,13 @@ void considerDirectory(const QString &path, const QString &icon, int distance, C
     }
 }
 
-/// The best file of one theme in all places where it may be spread, else of the themes that it inherits from.
-QString fileInTheme(const QString &themeName, const QString &icon, int depth)
+/// The best file of one theme in all places where it may be spread, else of the themes that it inherits from. None of a
+/// theme that was looked at before, since themes may inherit from each other, many times over, nor of one too many.
+QString fileInTheme(const QString &themeName, const QString &icon, QSet<QString> &looked)
 {
-    if (themeName.isEmpty() || depth > kDeepestInheritance)
+    if (themeName.isEmpty() || looked.contains(themeName) || looked.size() >= kMostThemes)
         return {};
+    looked.insert(themeName);
     Candidate best;
     QStringList parents;
     QStringList directories;
@@ -76,7 +79,7 @@ QString fileInTheme(const QString &themeName, const QString &icon, int depth)
     }
     for (const QString &parent : parents) {
         if (best.path.isNull())
-            best.path = fileInTheme(parent, icon, depth + 1);
+            best.path = fileInTheme(parent, icon, looked);
     }
     return best.path;
 }
@@ -100,9 +103,10 @@ QString iconFileForName(const QString &icon)
         return QFileInfo::exists(icon) ? icon : QString();
     if (icon.contains(u'/'))
         return {};
-    QString file = fileInTheme(QIcon::themeName(), icon, 0);
+    QSet<QString> looked;
+    QString file = fileInTheme(QIcon::themeName(), icon, looked);
     if (file.isNull())
-        file = fileInTheme(QStringLiteral("hicolor"), icon, 0);
+        file = fileInTheme(QStringLiteral("hicolor"), icon, looked);
     return file.isNull() ? fileInPixmaps(icon) : file;
 }
 

@@ -198,8 +198,8 @@ TEST_F(Workspace, ThemesThatInheritFromEachOtherEnd)
     const QStringList places = QIcon::themeSearchPaths();
     QIcon::setThemeSearchPaths({path("icons")});
     QIcon::setThemeName("one");
-    write("icons/one/index.theme", "[Icon Theme]\nName=One\nInherits=two\nDirectories=\n");
-    write("icons/two/index.theme", "[Icon Theme]\nName=Two\nInherits=one\nDirectories=\n");
+    write("icons/one/index.theme", "[Icon Theme]\nName=One\nInherits=two,one,two,one,two,one\nDirectories=\n");
+    write("icons/two/index.theme", "[Icon Theme]\nName=Two\nInherits=one,two,one,two,one,two\nDirectories=\n");
     EXPECT_TRUE(kavell::iconFileForName("nobody").isNull());
     QIcon::setThemeName({});
     QIcon::setThemeSearchPaths(places);
