@@ -2,12 +2,13 @@
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
 // A redo record of any bytes, with and without a right checksum: it decodes within its bounds or not at all, has one form
-// only, and is finished over a file that was torn at any place.
+// only, is finished over a file that was torn, left over one that somebody else wrote, and void for its own file alone.
 
 #include <algorithm>
 
 #include "platform/checksum.h"
 #include "platform/redo_record.h"
+#include "platform/sibling_path.h"
 #include "tests/fuzz/fuzz_target.h"
 
 using namespace kavell;
@@ -22,11 +23,39 @@ std::string tornContents(std::string_view oldContents, std::string_view newConte
     return std::string(written) + std::string(oldContents.substr(std::min(written.size(), oldContents.size())));
 }
 
+/// The new contents with a first byte that neither they nor the old ones have.
+std::string foreignContents(std::string_view oldContents, std::string_view newContents)
+{
+    const char oldByte = oldContents.empty() ? '\0' : oldContents.front();
+    std::string contents(newContents);
+    while (contents.front() == newContents.front() || contents.front() == oldByte)
+        ++contents.front();
+    return contents;
+}
+
+void tryForeignContents(const RedoRecord &record)
+{
+    if (!record.oldContents)
+        return;  // anything counts as a mix
+    const std::string longer = std::string(std::max(record.oldContents->size(), record.newContents.size()) + 1, '\0');
+    require(judgeRedoRecord(record, record.inode, longer) == RedoVerdict::Discard,
+            "a file that is longer than it ever was is somebody else's");
+    if (record.newContents.empty())
+        return;
+    const std::string foreign = foreignContents(*record.oldContents, record.newContents);
+    require(judgeRedoRecord(record, record.inode, foreign) == RedoVerdict::Discard,
+            "a byte that is neither the old nor the new one is somebody else's");
+}
+
 void tryRecord(std::string_view bytes)
 {
+    require(inodeOfRedoRecord(bytes.substr(0, kVoidRecordLength)) == inodeOfRedoRecord(bytes),
+            "a record is its file's as far as that one is named");
     const auto record = decodeRedoRecord(bytes);
     if (!record)
         return;
+    require(inodeOfRedoRecord(bytes) == record->inode, "a record that becomes void stays its own file's");
+    tryForeignContents(*record);
     require(encodeRedoRecord(*record) == bytes, "a record has one form only");
     require(judgeRedoRecord(*record, record->inode, record->newContents) == RedoVerdict::Finish,
             "new contents that may lack their permissions are finished");
