@@ -92,7 +92,7 @@ int readDirectoryBare(const std::string &directory)
 }
 
 /// What a record is cut off to when it is void.
-constexpr off_t kVoidRecord = 8;
+constexpr off_t kVoidRecord = 16;
 
 void replaceFileBare(const char *path, std::string_view contents, const BareSemaphore &semaphore)
 {
