@@ -69,6 +69,7 @@ std::string LoadJudge::done(Process &process, const LoadEntry &entry, Account &a
     const bool wasSave = process.intention == LoadEvent::WillSave;
     process.intention = LoadEvent::Unused;
     account.perhapsTold.erase(entry.process);
+    account.removing.erase(entry.process);
     // A save is told whatever came of it, a removal only when there was something to remove.
     account.told += wasSave || process.isCarriedOut;
     if (!wasSave)
@@ -239,7 +240,10 @@ std::string LoadJudge::created(const LoadEntry &entry, Process &process, Account
     if (account.inode != 0)
         return "a file was made where there is one";
     ++m_tally.creations;
-    return judgeSave(entry, process, account);
+    const std::string complaint = judgeSave(entry, process, account);
+    if (account.removedEarly.erase(entry.inode) != 0)
+        removeFile(account);
+    return complaint;
 }
 
 std::string LoadJudge::removed(const LoadEntry &entry, Process &process, Account &account)
@@ -249,9 +253,26 @@ std::string LoadJudge::removed(const LoadEntry &entry, Process &process, Account
         return "a file was removed by a process that did not want to";
     process.isCarriedOut = true;
     ++m_tally.removals;
-    if (entry.inode == account.inode)
+    const uint64_t inode = entry.inode != 0 ? entry.inode : latestFile(account);
+    if (account.inode != 0 && inode == account.inode)
         removeFile(account);
+    else if (isBeingMade(inode, account))
+        account.removedEarly.insert(inode);
     return {};
+}
+
+bool LoadJudge::isBeingMade(uint64_t inode, const Account &account)
+{
+    return std::any_of(account.creating.begin(), account.creating.end(),
+                       [&](const auto &each) { return each.second.inode == inode; });
+}
+
+/// The file that a remover unlinked who had found none just before.
+uint64_t LoadJudge::latestFile(const Account &account)
+{
+    if (account.inode != 0 || account.creating.empty())
+        return account.inode;
+    return account.creating.begin()->second.inode;
 }
 
 uint32_t LoadJudge::mostNotifications(size_t account)

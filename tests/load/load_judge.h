@@ -93,6 +93,7 @@ private:
         std::vector<LoadValues> afterKill;      ///< what the saves of killed holders would leave
         std::map<int32_t, LoadEntry> creating;  ///< files that are about to get the name, by process
         std::set<int32_t> removing;
+        std::set<uint64_t> removedEarly;  ///< files whose removal was told before their maker came to tell of them
         uint64_t versionOfLatestFile = 0;
         uint64_t versionOfLatestRemoval = 0;
         std::unordered_map<uint64_t, Knowledge> deleted;  ///< what deleted files said, by inode
@@ -111,6 +112,8 @@ private:
     [[nodiscard]] std::string removed(const LoadEntry &entry, Process &process, Account &account);
     [[nodiscard]] std::string judgeSave(const LoadEntry &entry, Process &process, Account &account);
     void removing(const LoadEntry &entry, Account &account);
+    [[nodiscard]] static bool isBeingMade(uint64_t inode, const Account &account);
+    [[nodiscard]] static uint64_t latestFile(const Account &account);
     void finishKilledCreation(const LoadEntry &entry, Account &account);
     void noteKilledHolder(Account &account, uint32_t number);
     [[nodiscard]] bool settle(const LoadEntry &entry, Account &account);

@@ -174,6 +174,40 @@ TEST_F(LoadJudgeTest, AnAccountIsRemovedAndMadeAnew)
     EXPECT_EQ(judge.leastNotifications(0), 2u);
 }
 
+TEST_F(LoadJudgeTest, AFileMayBeRemovedBeforeItsMakerTellsOfIt)
+{
+    EXPECT_EQ(
+        inTurn({event(kAda, LoadEvent::WillRemove), event(kAda, LoadEvent::Take), event(kAda, LoadEvent::Removing),
+                event(kAda, LoadEvent::Removed), event(kAda, LoadEvent::Release), done(kAda)}),
+        "");
+    EXPECT_EQ(inTurn({willSave(kBob, 6), event(kBob, LoadEvent::Missing),
+                      event(kBob, LoadEvent::Creating, values(0, 6), kNewInode), event(kAda, LoadEvent::WillRemove),
+                      event(kAda, LoadEvent::Removing, values(0, 6), kNewInode),
+                      event(kAda, LoadEvent::Removed, values(0, 6), kNewInode), done(kAda),
+                      event(kBob, LoadEvent::Created, values(0, 6), kNewInode), done(kBob)}),
+              "");
+    EXPECT_EQ(judge.outcomes(0)[0].inode, 0u);
+    EXPECT_EQ(inTurn({event(kBob, LoadEvent::Status), event(kBob, LoadEvent::Missing)}), "");
+}
+
+TEST_F(LoadJudgeTest, AFileMayComeBetweenARemoversLookAndItsRemoval)
+{
+    EXPECT_EQ(inTurn({event(kAda, LoadEvent::WillRemove), event(kAda, LoadEvent::Removing, {}, 0),
+                      event(kBob, LoadEvent::Status), event(kBob, LoadEvent::Missing),
+                      event(kAda, LoadEvent::Removed, {}, 0), done(kAda)}),
+              "");
+    EXPECT_EQ(judge.outcomes(0).size(), 1u);
+    EXPECT_EQ(judge.outcomes(0)[0].inode, 0u);
+    EXPECT_EQ(judge.leastNotifications(0), 1u);
+}
+
+TEST_F(LoadJudgeTest, ARemovalThatFoundNothingExcusesNobodyAfterIt)
+{
+    EXPECT_EQ(inTurn({event(kAda, LoadEvent::WillRemove), event(kAda, LoadEvent::Removing, {}, 0), done(kAda)}), "");
+    EXPECT_EQ(inTurn({event(kBob, LoadEvent::Status), event(kBob, LoadEvent::Missing)}),
+              "a file that is there was not found");
+}
+
 TEST_F(LoadJudgeTest, WhoWaitedForAFileThatIsDeletedReadsTheMomentBefore)
 {
     EXPECT_EQ(

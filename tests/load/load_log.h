@@ -53,7 +53,7 @@ enum class LoadEvent : uint32_t {
     Release,     ///< it is about to be given back; `flag`: there is a redo record
     Creating,    ///< a new file is about to get its name
     Created,     ///< it has it
-    Removing,    ///< the file is about to be unlinked
+    Removing,    ///< the file is about to be unlinked; an inode of 0: one that may come until then
     Removed,     ///< it is gone
 };
 

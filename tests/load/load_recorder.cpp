@@ -204,13 +204,14 @@ extern "C" {
 {
     static auto *const system = systemFunction<int(const char *)>("unlink");
     const auto account = accountOfPath(path);
-    const auto removed = account ? entryAt(path) : std::nullopt;
-    if (removed)
-        recordLoad(LoadEvent::Removing, *account, *removed);
+    // Also where there is no file: one may come until the call is made.
+    const LoadEntry removed = account ? entryAt(path).value_or(LoadEntry{}) : LoadEntry{};
+    if (account)
+        recordLoad(LoadEvent::Removing, *account, removed);
     const int result = system(path);
     const int error = errno;
-    if (removed && result == 0)
-        recordLoad(LoadEvent::Removed, *account, *removed);
+    if (account && result == 0)
+        recordLoad(LoadEvent::Removed, *account, removed);
     errno = error;
     return result;
 }
