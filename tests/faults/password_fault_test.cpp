@@ -57,18 +57,32 @@ protected:
                           failed->kind == CallKind::Rename);
     }
 
+    /// What setting a password came to.
+    struct Setting {
+        bool isSet = false;
+        std::string said;
+    };
+
+    /// Sets the password "new" with a fault, which may leave no descriptor open.
+    static Setting setPassword(FaultInjector &injector, const Account &account)
+    {
+        StandardErrorCapture errors;
+        const size_t descriptors = countOpenDescriptors();
+        Setting setting;
+        {
+            const Observation observation(injector);
+            setting.isSet = static_cast<bool>(adopt(_CSKavellAccountSetPassword(account.get(), text("new").get())));
+        }
+        setting.said = errors.take();
+        EXPECT_EQ(countOpenDescriptors(), descriptors);
+        return setting;
+    }
+
     void checkSetting(bool hasToken, std::string_view message)
     {
         forEachFault({}, [&](FaultInjector &injector) {
             const Account account = freshAccount(hasToken);
-            StandardErrorCapture errors;
-            const size_t descriptors = countOpenDescriptors();
-            bool isSet = false;
-            {
-                const Observation observation(injector);
-                isSet = static_cast<bool>(adopt(_CSKavellAccountSetPassword(account.get(), text("new").get())));
-            }
-            const std::string said = errors.take();
+            const auto [isSet, said] = setPassword(injector, account);
             EXPECT_EQ(password(), isSet ? "new" : "old");
             if (isSet) {
                 EXPECT_EQ(said, "");
@@ -81,7 +95,6 @@ protected:
                     EXPECT_EQ(said, message);
                 }
             }
-            EXPECT_EQ(countOpenDescriptors(), descriptors);
         });
     }
 
@@ -106,15 +119,7 @@ TEST_F(PasswordFaults, APasswordThatNeedsANewVaultIsSetOrTheMessagesSayWhyNot)
         std::filesystem::remove(vaultPath());
         useCredentialStoreForTesting(nullptr);
         const Account account = openAccount("ada");
-        StandardErrorCapture errors;
-        const size_t descriptors = countOpenDescriptors();
-        bool isSet = false;
-        {
-            const Observation observation(injector);
-            isSet = static_cast<bool>(adopt(_CSKavellAccountSetPassword(account.get(), text("new").get())));
-        }
-        const std::string said = errors.take();
-        EXPECT_EQ(countOpenDescriptors(), descriptors);
+        const auto [isSet, said] = setPassword(injector, account);
         const auto found = adopt(_CSKavellAccountCopyPassword(account.get()));
         EXPECT_EQ(found ? toStdString(found.get()) : "(none)", isSet ? "new" : "(none)");
         if (isSet) {

@@ -1,8 +1,8 @@
 // SPDX-FileCopyrightText: 2026 The Kavell Accounts developers
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
-// Makes void redo records, and tells those that stand beside a data file apart: void ones stay after a save, others are of a save that did not
-// come to its end. Any thread may call.
+// Makes void redo records, and tells those that stand beside a data file apart: void ones stay after a save, others are of
+// a save that did not come to its end. Any thread may call.
 
 #ifndef KAVELL_TESTS_SUPPORT_REDO_RECORDS_H
 #define KAVELL_TESTS_SUPPORT_REDO_RECORDS_H
