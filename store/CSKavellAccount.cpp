@@ -74,8 +74,8 @@ Ref<CSKavellStringRef> emptyString()
 OwnedCString makeDataFilePath(std::string_view directory, std::string_view loginName)
 {
     std::string path;
-    path.reserve(directory.size() + loginName.size() + std::size("/.plist"));
-    path.append(directory).append("/").append(loginName).append(".plist");
+    path.reserve(directory.size() + 1 + loginName.size() + kDataFileSuffix.size());
+    path.append(directory).append("/").append(loginName).append(kDataFileSuffix);
     // A name with a NUL in it cannot be a path; the account then lives without a file.
     return path.find('\0') == std::string::npos ? OwnedCString(strdup(path.c_str())) : nullptr;
 }
