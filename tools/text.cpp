@@ -67,7 +67,7 @@ bool isControl(char32_t character)
 char32_t takeCharacter(std::string_view &text)
 {
     const auto lead = static_cast<unsigned char>(text.front());
-    const size_t length = lead < 0x80 ? 1 : lead >= 0xF0 ? 4 : lead >= 0xE0 ? 3 : lead >= 0xC2 ? 2 : 0;
+    const size_t length = lead < 0x80 ? 1 : lead < 0xC2 ? 0 : lead < 0xE0 ? 2 : lead < 0xF0 ? 3 : lead < 0xF5 ? 4 : 0;
     constexpr std::array<char32_t, 5> smallest{0, 0, 0x80, 0x800, 0x10000};
     char32_t character = length == 1 ? lead : lead & (0x7FU >> length);
     bool valid = length > 0 && length <= text.size();

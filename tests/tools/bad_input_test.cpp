@@ -43,11 +43,20 @@ INSTANTIATE_TEST_SUITE_P(
         BadInputCase{{"add", "google", "a\xff"}, "the login name 'a\\xff' is not valid UTF-8" + isFileName},
         BadInputCase{{"add", "google", "a\xed\xa0\x80"},
                      "the login name 'a\\xed\\xa0\\x80' is not valid UTF-8" + isFileName},
+        BadInputCase{{"add", "google", "a\xf8\x99\x99\xa0"},
+                     "the login name 'a\\xf8\\x99\\x99\\xa0' is not valid UTF-8" + isFileName},
         BadInputCase{{"add", "google", std::string(250, 'x')},
                      "the login name has 250 bytes, and at most 249 are possible" + isFileName},
         BadInputCase{{"add", "org.example\n", "a"},
                      "the provider type 'org.example\\n' contains a control character" + isFileName},
         BadInputCase{{"add", "..", "a"}, "the provider type '..' means a directory" + isFileName}));
+
+// The first byte of the key's second character is one of five bytes' length, which Unicode has no more.
+INSTANTIATE_TEST_SUITE_P(Keys, BadInput,
+                         testing::Values(BadInputCase{
+                             {"set", "google", "anna", "a\xf8\x99\x99\xa0=1"},
+                             "the attribute key 'a\\xf8\\x99\\x99\\xa0' has a control character or is not UTF-8; "
+                             "choose another"}));
 
 // U+FFFE is valid UTF-8 and no control character, but no XML file can hold it.
 INSTANTIATE_TEST_SUITE_P(
