@@ -3,6 +3,8 @@
 
 #include "platform/qt/interface_file.h"
 
+#include <optional>
+
 #include <QtCore/QBuffer>
 #include <QtCore/QFile>
 #include <QtCore/QMetaMethod>
@@ -42,7 +44,8 @@ bool isTooDeep(const QByteArray &xml)
     return true;
 }
 
-/// Knows the reader's own classes of widgets besides the toolkit's.
+/// Knows the reader's own classes of widgets besides the toolkit's, and outlives a layout of no known class, which the
+/// toolkit's reader does not.
 class WidgetLoader : public QUiLoader {
 public:
     explicit WidgetLoader(const InterfaceFile::WidgetMakers &makers) : m_makers(makers) {}
@@ -57,12 +60,26 @@ public:
         return widget;
     }
 
+    QLayout *createLayout(const QString &className, QObject *parent, const QString &name) override
+    {
+        if (QLayout *const layout = QUiLoader::createLayout(className, parent, name))
+            return layout;
+        if (!m_unknownLayout)
+            m_unknownLayout = className;
+        // Anything that the toolkit's reader can fill until it is done.
+        return QUiLoader::createLayout(QStringLiteral("QVBoxLayout"), parent, name);
+    }
+
+    /// The first class that a layout has and nobody knows; none when all are known.
+    [[nodiscard]] const std::optional<QString> &unknownLayout() const { return m_unknownLayout; }
+
 private:
     const InterfaceFile::WidgetMakers &m_makers;
+    std::optional<QString> m_unknownLayout;
 };
 
 /// The outermost widget of a file; null, with the reason, when there is none.
-QWidget *readWidgets(QUiLoader &loader, const QString &path, QString &reason)
+QWidget *readWidgets(WidgetLoader &loader, const QString &path, QString &reason)
 {
     QFile file(path);
     if (path.isEmpty() || !file.open(QIODevice::ReadOnly)) {
@@ -75,9 +92,13 @@ QWidget *readWidgets(QUiLoader &loader, const QString &path, QString &reason)
         return nullptr;
     }
     QBuffer buffer(&xml);
-    QWidget *const root = loader.load(&buffer);
+    std::unique_ptr<QWidget> root(loader.load(&buffer));
     reason = loader.errorString();
-    return root;
+    if (root && loader.unknownLayout()) {
+        reason = QStringLiteral("It has a layout of an unknown class, %1.").arg(KADescription(*loader.unknownLayout()));
+        return nullptr;
+    }
+    return root.release();
 }
 
 }  // namespace

@@ -80,3 +80,20 @@ TEST_F(InterfaceFileTest, WhatIsNoInterfaceHasAReason)
         EXPECT_FALSE(problem.isEmpty()) << xml;
     }
 }
+
+// The toolkit's reader would fill a layout that is not there.
+TEST_F(InterfaceFileTest, WhatHasALayoutOfAnUnknownClassIsNotRead)
+{
+    for (const char *layout :
+         {"<layout class=\"QSlider\"/>", "<layout class=\"QSlider\"><item><layout class=\"QDial\"/></item></layout>",
+          "<layout class=\"QHBoxLayout\"><item><layout class=\"QSlider\"><item>"
+          "<widget class=\"QLabel\"/></item></layout></item></layout>",
+          "<layout class=\"QSlider\"><property name=\"margin\"><number>4</number></property>"
+          "<item row=\"1\" column=\"2\"><spacer/></item></layout>"}) {
+        QString problem;
+        const QByteArray xml = QByteArray("<ui version=\"4.0\"><widget class=\"QWidget\">") + layout + "</widget></ui>";
+        EXPECT_FALSE(InterfaceFile::load(write(xml), &problem)) << layout;
+        EXPECT_EQ(problem, "It has a layout of an unknown class, QSlider.") << layout;
+        EXPECT_TRUE(QApplication::allWidgets().isEmpty()) << layout;
+    }
+}
