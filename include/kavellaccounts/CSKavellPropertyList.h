@@ -20,8 +20,9 @@ CSKAVELL_EXPORT CSKavellDictionaryRef CSKavellPropertyListCreateDictionary(const
                                                                            size_t length) CSKAVELL_NODISCARD;
 
 /// The XML text of a dictionary (caller owns). None for none, and when a value is one that a property list cannot hold:
-/// an object of another type, text with control characters, a real that is no number, an integer above INT64_MAX, a
-/// date outside 1932 to 2069, or more than CSKavellPropertyListCreateDictionary would take.
+/// an object of another type, text with a character that XML does not have (XML 1.0, section 2.2), a real that is no
+/// number, an integer above INT64_MAX, a date outside 1932 to 2069, or more than CSKavellPropertyListCreateDictionary
+/// would take.
 CSKAVELL_EXPORT CSKavellDataRef CSKavellPropertyListCopyXML(CSKavellDictionaryRef dictionary) CSKAVELL_NODISCARD;
 
 CSKAVELL_END_DECLS
