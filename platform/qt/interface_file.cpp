@@ -11,6 +11,7 @@
 #include <QtCore/QXmlStreamReader>
 #include <QtUiTools/QUiLoader>
 #include <QtWidgets/QAbstractButton>
+#include <QtWidgets/QLayout>
 
 #include <kavellaccounts/KADescription.h>
 
@@ -44,11 +45,18 @@ bool isTooDeep(const QByteArray &xml)
     return true;
 }
 
-/// Knows the reader's own classes of widgets besides the toolkit's, and outlives a layout of no known class, which the
-/// toolkit's reader does not.
+/// Knows the reader's own classes of widgets besides the toolkit's, and sees to the layouts that the toolkit's reader does
+/// not: one of no known class, which it would fill all the same, and one that it finds no place for, which it forgets.
 class WidgetLoader : public QUiLoader {
 public:
     explicit WidgetLoader(const InterfaceFile::WidgetMakers &makers) : m_makers(makers) {}
+    ~WidgetLoader() override
+    {
+        for (const QPointer<QLayout> &layout : std::as_const(m_layouts)) {
+            if (layout && !layout->parent())
+                delete layout;
+        }
+    }
 
     QWidget *createWidget(const QString &className, QWidget *parent, const QString &name) override
     {
@@ -62,12 +70,14 @@ public:
 
     QLayout *createLayout(const QString &className, QObject *parent, const QString &name) override
     {
-        if (QLayout *const layout = QUiLoader::createLayout(className, parent, name))
-            return layout;
-        if (!m_unknownLayout)
-            m_unknownLayout = className;
-        // Anything that the toolkit's reader can fill until it is done.
-        return QUiLoader::createLayout(QStringLiteral("QVBoxLayout"), parent, name);
+        QLayout *layout = QUiLoader::createLayout(className, parent, name);
+        if (!layout) {
+            if (!m_unknownLayout)
+                m_unknownLayout = className;
+            layout = QUiLoader::createLayout(QStringLiteral("QVBoxLayout"), parent, name);
+        }
+        m_layouts += layout;
+        return layout;
     }
 
     /// The first class that a layout has and nobody knows; none when all are known.
@@ -75,6 +85,7 @@ public:
 
 private:
     const InterfaceFile::WidgetMakers &m_makers;
+    QList<QPointer<QLayout>> m_layouts;
     std::optional<QString> m_unknownLayout;
 };
 

@@ -8,6 +8,7 @@
 #include <QtCore/QFile>
 #include <QtCore/QTemporaryDir>
 #include <QtWidgets/QApplication>
+#include <QtWidgets/QBoxLayout>
 
 #include <gmock/gmock.h>
 
@@ -96,4 +97,15 @@ TEST_F(InterfaceFileTest, WhatHasALayoutOfAnUnknownClassIsNotRead)
         EXPECT_EQ(problem, "It has a layout of an unknown class, QSlider.") << layout;
         EXPECT_TRUE(QApplication::allWidgets().isEmpty()) << layout;
     }
+}
+
+// A dock has a layout of its own already; the sanitizers say whether the other one is left behind.
+TEST_F(InterfaceFileTest, ALayoutThatHasNoPlaceGoesAgain)
+{
+    const auto interface =
+        InterfaceFile::load(write("<ui version=\"4.0\"><widget class=\"QDockWidget\" name=\"dock\">"
+                                  "<layout class=\"QVBoxLayout\"><item><layout class=\"QGridLayout\"/>"
+                                  "</item></layout></widget></ui>"));
+    ASSERT_TRUE(interface);
+    EXPECT_TRUE(interface->root()->findChildren<QVBoxLayout *>().isEmpty());
 }
