@@ -185,7 +185,7 @@ void KAAccountCreator::letGoOfPlugin()
 {
     // To none, whoever the delegate is, but for another creator that is at work: it would wait for ever. One whose turn
     // has only just begun has yet to take this creator's place, to which messages come until it has.
-    while (_plugin && !m_hasLetGo) {
+    while (!_plugin.isNull() && !m_hasLetGo) {
         if (pluginsAtWork().take(_plugin) == PluginsAtWork::Answer::Taken) {
             _plugin->setDelegate(nullptr);
             pluginsAtWork().giveBack(_plugin);
@@ -235,7 +235,7 @@ bool KAAccountCreator::create()
         if (!_enableBrondelService())
             return failed(QStringLiteral("The account's name at the online service is not known."));
     }
-    if (!_plugin) {
+    if (_plugin.isNull()) {
         kavell::log(QStringLiteral("*** KAAccountCreator: _plugin was nil"));
         return failed(QStringLiteral("The application has no plug-in."));
     }
@@ -277,16 +277,21 @@ std::shared_ptr<KAAccountSetupResult> KAAccountCreator::discover(const std::shar
     _plugin->startAccountSetupWithInput(input);
     waitForReport();
     const std::lock_guard lock(m_mutex);
-    return _plugin ? _result : nullptr;
+    return _plugin.isNull() ? nullptr : _result;
 }
 
 bool KAAccountCreator::waitForTurn(const KADataPlugin *plugin)
 {
     EventsMeanwhile events;
-    while (_plugin && !QCoreApplication::closingDown()) {
+    // Not asked for its address, which has no meaning any more when another thread is just destroying it.
+    while (!_plugin.isNull() && !QCoreApplication::closingDown()) {
         const PluginsAtWork::Answer answer = pluginsAtWork().take(plugin);
-        if (answer == PluginsAtWork::Answer::Taken)
-            return true;
+        if (answer == PluginsAtWork::Answer::Taken) {
+            if (!_plugin.isNull())
+                return true;
+            pluginsAtWork().giveBack(plugin);
+            break;
+        }
         if (answer == PluginsAtWork::Answer::BusyBelow)
             return failed(QStringLiteral("The plug-in is at work on another account, which this one would hold up."));
         events.run();
@@ -299,7 +304,7 @@ void KAAccountCreator::waitForReport()
     EventsMeanwhile events;
     while (_waiting) {
         events.run();
-        if (!_plugin)
+        if (_plugin.isNull())
             endWait(QStringLiteral("The plug-in was destroyed while it looked for the account."));
         // Events come no more, and the end of the program waits for the threads of the pool.
         if (QCoreApplication::closingDown())
