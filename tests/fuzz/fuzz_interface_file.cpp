@@ -34,10 +34,10 @@ QApplication &application()
 }  // namespace
 
 /// The toolkit's reader forgets some of what it makes for layouts that are wrong, such as the items of a form that have no
-/// row and column: a hundred bytes for each. Widgets and layouts are not among it. And fontconfig keeps what it has read.
+/// row and column: a hundred bytes for each. Widgets and layouts are not among it.
 extern "C" [[gnu::visibility("default")]] const char *__lsan_default_suppressions()
 {
-    return "leak:libQt6UiTools\nleak:libfontconfig\n";
+    return "leak:libQt6UiTools\n";
 }
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t *data, size_t size)
