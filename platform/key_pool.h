@@ -8,6 +8,7 @@
 #ifndef KAVELL_PLATFORM_KEY_POOL_H
 #define KAVELL_PLATFORM_KEY_POOL_H
 
+#include <cstdint>
 #include <mutex>
 #include <string_view>
 
@@ -24,8 +25,13 @@ public:
     /// A string of text that is UTF-8; none when there is no memory for it.
     [[nodiscard]] Ref<CSKavellStringRef> key(std::string_view text) noexcept;
 
+    /// Whether equal keys of the document are certainly one string, so that two strings are two keys.
+    [[nodiscard]] bool sharesEqualKeys() const noexcept { return m_poolLock.owns_lock() && !m_hasReplaced; }
+
 private:
     std::unique_lock<std::mutex> m_poolLock;
+    uint8_t m_last = 0;          ///< the slot of the key that was made last
+    bool m_hasReplaced = false;  ///< a key of this document may have left the pool
 };
 
 }  // namespace kavell

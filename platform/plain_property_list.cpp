@@ -3,8 +3,10 @@
 
 #include "platform/plain_property_list.h"
 
+#include <algorithm>
 #include <array>
 #include <charconv>
+#include <cstring>
 #include <string>
 #include <utility>
 #include <vector>
@@ -12,12 +14,13 @@
 #include <kavellaccounts/CSKavellArray.h>
 #include <kavellaccounts/CSKavellBoolean.h>
 #include <kavellaccounts/CSKavellData.h>
-#include <kavellaccounts/CSKavellNumber.h>
 
 #include "platform/data_file.h"
 #include "platform/key_pool.h"
 #include "platform/property_list_guard.h"
 #include "runtime/dictionary_p.h"
+#include "runtime/number_p.h"
+#include "runtime/object_block.h"
 #include "runtime/string_p.h"
 #include "runtime/utf8.h"
 
@@ -52,9 +55,15 @@ constexpr std::array<std::pair<std::string_view, char>, 5> kReferences{
 
 constexpr bool isIdentifierCharacter(char character) noexcept
 {
-    return (character >= '-' && character <= ':') || (character >= 'A' && character <= 'Z') ||
-           (character >= 'a' && character <= 'z') || character == ' ';
+    return ((character >= '-') & (character <= ':')) | ((character >= 'A') & (character <= 'Z')) |
+           ((character >= 'a') & (character <= 'z')) | (character == ' ');
 }
+
+/// How much of a document's length its objects usually take: half of it is markup.
+constexpr size_t kUsualSixteenths = 11;
+
+/// Of how many keys each is compared with each.
+constexpr size_t kMostCompared = 16;
 
 constexpr int kNoDigit = -1;
 
@@ -73,7 +82,11 @@ constexpr int base64Digit(char character) noexcept
 /// answers false or none for what is not plain.
 class PlainReader {
 public:
-    explicit PlainReader(std::string_view xml) : m_rest(xml), m_contents(contentsOf(xml)) { m_pairs.reserve(32); }
+    explicit PlainReader(std::string_view xml)
+        : m_rest(xml), m_contents(contentsOf(xml)), m_block(xml.size() / 16 * kUsualSixteenths)
+    {
+        m_pairs.reserve(32);
+    }
 
     [[nodiscard]] Ref<CSKavellMutableDictionaryRef> document()
     {
@@ -89,11 +102,13 @@ public:
 private:
     using Value = Ref<CSKavellTypeRef>;
 
-    bool pass(std::string_view text) noexcept
+    /// Passes a literal, whose length the compiler knows, so that it compares in place.
+    template <size_t Size> bool pass(const char (&literal)[Size]) noexcept
     {
-        if (!m_rest.starts_with(text))
+        constexpr size_t kLength = Size - 1;
+        if (m_rest.size() < kLength || std::memcmp(m_rest.data(), literal, kLength) != 0)
             return false;
-        m_rest.remove_prefix(text.size());
+        m_rest.remove_prefix(kLength);
         return true;
     }
 
@@ -116,15 +131,17 @@ private:
     {
         if (!pass("\""))
             return false;
-        size_t length = 0;
-        while (length < m_rest.size() && isIdentifierCharacter(m_rest[length]))
-            ++length;
+        const size_t length = std::min(m_rest.find('"'), m_rest.size());
+        // In bytes alone, for the same reason as above.
+        uint8_t unfit = 0;
+        for (const char character : m_rest.substr(0, length))
+            unfit |= static_cast<uint8_t>(!isIdentifierCharacter(character));
         m_rest.remove_prefix(length);
-        return pass("\"");
+        return unfit == 0 && pass("\"");
     }
 
     /// What stands up to the element's end; a view into the document or, where references stood in it, into m_decoded.
-    bool text(std::string_view end, std::string_view &result)
+    template <size_t Size> bool text(const char (&end)[Size], std::string_view &result)
     {
         const size_t length = m_rest.find('<');
         if (length == std::string_view::npos)
@@ -189,7 +206,7 @@ private:
     [[nodiscard]] Value string()
     {
         std::string_view characters;
-        return text("</string>", characters) ? adopt<CSKavellTypeRef>(makeValidString(nullptr, characters)) : nullptr;
+        return text("</string>", characters) ? adopt<CSKavellTypeRef>(makeValidString(m_block, characters)) : nullptr;
     }
 
     /// A number as a writer writes it: "0", or digits that do not begin with one.
@@ -202,7 +219,7 @@ private:
         if (error != std::errc() || (*digits == '0' && (end != first + 1 || digits != first)))
             return nullptr;
         m_rest.remove_prefix(static_cast<size_t>(end - first));
-        return pass("</integer>") ? adopt<CSKavellTypeRef>(CSKavellNumberCreateWithInt64(number)) : nullptr;
+        return pass("</integer>") ? adopt<CSKavellTypeRef>(makeInteger(m_block, number)) : nullptr;
     }
 
     /// Whole groups of base64 (RFC 4648, section 4), with blanks between its digits.
@@ -253,16 +270,35 @@ private:
         const size_t first = m_pairs.size();
         if (depth >= kDeepestPlainContainer || !pairs(depth))
             return nullptr;
-        auto result = adopt(CSKavellDictionaryCreateMutable());
         const size_t count = m_pairs.size() - first;
+        // What holds dictionaries is taken apart and let go at once, and would only keep the block's room.
+        const bool isTakenApart =
+            std::any_of(m_pairs.begin() + static_cast<ptrdiff_t>(first), m_pairs.end(),
+                        [](const auto &pair) { return isType(pair.second.get(), kTypeDictionary); });
+        auto result = adopt(CSKavellDictionary::make(kObjectIsMutable, count, isTakenApart ? nullptr : &m_block));
         if (!result || (m_keys += count) > kMostKeys)
             return nullptr;
-        result->reserve(count);
-        for (size_t index = first; index < m_pairs.size(); ++index)
-            result->take(std::move(m_pairs[index].first), std::move(m_pairs[index].second));
+        const bool areDistinct = m_keyMaker.sharesEqualKeys() && count <= kMostCompared && haveDistinctKeys(first);
+        for (size_t index = first; index < m_pairs.size(); ++index) {
+            auto &[key, value] = m_pairs[index];
+            areDistinct ? result->takeNew(std::move(key), std::move(value))
+                        : result->take(std::move(key), std::move(value));
+        }
         m_pairs.resize(first);
         // No writer writes a key twice.
         return result->count == count ? std::move(result) : nullptr;
+    }
+
+    /// Whether no key of the pairs from there on is the same string as another's.
+    [[nodiscard]] bool haveDistinctKeys(size_t first) const noexcept
+    {
+        for (size_t index = first; index < m_pairs.size(); ++index) {
+            for (size_t earlier = first; earlier < index; ++earlier) {
+                if (m_pairs[earlier].first.get() == m_pairs[index].first.get())
+                    return false;
+            }
+        }
+        return true;
     }
 
     /// Adds the pairs up to the dictionary's end to m_pairs.
@@ -289,6 +325,7 @@ private:
     std::vector<std::pair<Value, Value>> m_pairs;
     size_t m_keys = 0;
     KeyMaker m_keyMaker;
+    ObjectBlock m_block;
 };
 
 }  // namespace

@@ -81,10 +81,9 @@ public:
 
     [[nodiscard]] Ref<CSKavellMutableDictionaryRef> dictionary(plist_t node)
     {
-        auto result = adopt(CSKavellDictionaryCreateMutable());
+        auto result = adopt(CSKavellDictionary::make(kObjectIsMutable, plist_dict_get_size(node)));
         if (!result)
             return nullptr;
-        result->reserve(plist_dict_get_size(node));
         plist_dict_iter rawIterator = nullptr;
         plist_dict_new_iter(node, &rawIterator);
         const std::unique_ptr<void, FreeMemory> iterator(rawIterator);

@@ -6,6 +6,10 @@
 
 #include <algorithm>
 #include <bit>
+#include <new>
+#include <string>
+#include <utility>
+#include <vector>
 
 #include "runtime/dictionary_p.h"
 #include "runtime/string_p.h"
@@ -14,6 +18,13 @@ namespace kavell {
 
 namespace {
 
+/// What a dictionary has room for that nobody gave a number for.
+constexpr uint32_t kUsualRoom = 4;
+
+/// Positions, of which each is one more than the entry's, and the slots of the index, which are fewer than four times as
+/// many, must fit into their fields.
+constexpr size_t kMostEntries = UINT32_MAX / 4;
+
 // A stable hash of any key; a string's is cached in it.
 uint32_t keyHash(CSKavellTypeRef key) noexcept
 {
@@ -21,6 +32,25 @@ uint32_t keyHash(CSKavellTypeRef key) noexcept
         return static_cast<CSKavellStringRef>(key)->hash();
     const uint64_t hash = CSKavellHash(key);
     return static_cast<uint32_t>(hash ^ (hash >> 32));
+}
+
+/// The entry of a text among some without gaps.
+const DictionaryEntry *scanFor(const CSKavellString &key, std::span<const DictionaryEntry> entries) noexcept
+{
+    for (const DictionaryEntry &entry : entries) {
+        if (entry.key == &key ||
+            (isType(entry.key, kTypeString) && equalStrings(*static_cast<CSKavellStringRef>(entry.key), key)))
+            return &entry;
+    }
+    return nullptr;
+}
+
+/// The same for a key of another type.
+const DictionaryEntry *scanFor(CSKavellTypeRef key, std::span<const DictionaryEntry> entries) noexcept
+{
+    const auto found =
+        std::ranges::find_if(entries, [key](const DictionaryEntry &entry) { return CSKavellEqual(entry.key, key); });
+    return found != entries.end() ? &*found : nullptr;
 }
 
 bool sameKey(CSKavellTypeRef first, CSKavellTypeRef second) noexcept
@@ -38,13 +68,34 @@ bool sameKey(CSKavellTypeRef first, CSKavellTypeRef second) noexcept
 
 using namespace kavell;
 
+static_assert(sizeof(CSKavellDictionary) % alignof(DictionaryEntry) == 0, "entries stand right behind the structure");
+
+CSKavellDictionary *CSKavellDictionary::make(uint16_t flags, size_t entryCount, ObjectBlock *block) noexcept
+{
+    if (entryCount > kMostEntries)
+        return nullptr;
+    const size_t room = entryCount * sizeof(DictionaryEntry);
+    auto *dictionary = block ? makeObject<CSKavellDictionary>(*block, kTypeDictionary, room)
+                             : makeObject<CSKavellDictionary>(nullptr, kTypeDictionary, room);
+    if (dictionary) {
+        dictionary->flags |= flags;
+        dictionary->capacity = static_cast<uint32_t>(entryCount);
+    }
+    return dictionary;
+}
+
+DictionaryEntry *CSKavellDictionary::mutableEntries() noexcept
+{
+    return const_cast<DictionaryEntry *>(entries().data());
+}
+
 /// The slot that holds the key's position, or the empty slot where it would go. There is always an empty one.
 size_t CSKavellDictionary::slotOf(CSKavellTypeRef key) const noexcept
 {
-    const size_t mask = index.size() - 1;
+    const size_t mask = slotCount - 1;
     size_t slot = keyHash(key) & mask;
     while (index[slot] != 0) {
-        const CSKavellTypeRef other = entries[index[slot] - 1].key;
+        const CSKavellTypeRef other = entries()[index[slot] - 1].key;
         if (other && sameKey(other, key))
             break;
         slot = (slot + 1) & mask;
@@ -54,15 +105,12 @@ size_t CSKavellDictionary::slotOf(CSKavellTypeRef key) const noexcept
 
 const DictionaryEntry *CSKavellDictionary::find(CSKavellTypeRef key) const noexcept
 {
-    if (!index.empty()) {
+    if (slotCount > 0) {
         const uint32_t position = index[slotOf(key)];
-        return position ? &entries[position - 1] : nullptr;
+        return position ? &entries()[position - 1] : nullptr;
     }
-    for (const DictionaryEntry &entry : entries) {
-        if (sameKey(entry.key, key))
-            return &entry;
-    }
-    return nullptr;
+    return isType(key, kTypeString) ? scanFor(*static_cast<CSKavellStringRef>(key), entries())
+                                    : scanFor(key, entries());
 }
 
 void CSKavellDictionary::set(CSKavellTypeRef key, CSKavellTypeRef value)
@@ -72,25 +120,19 @@ void CSKavellDictionary::set(CSKavellTypeRef key, CSKavellTypeRef value)
 
 void CSKavellDictionary::take(Ref<CSKavellTypeRef> key, Ref<CSKavellTypeRef> value)
 {
-    if (auto *existing = const_cast<DictionaryEntry *>(find(key.get()))) {
+    if (auto *existing = const_cast<DictionaryEntry *>(find(key.get())))
         CSKavellRelease(std::exchange(existing->value, value.leak()));
-        return;
-    }
-    if (entries.size() == entries.capacity() && count < entries.size())
-        closeGaps();
-    entries.push_back({key.get(), value.get()});
-    try {
-        if (entries.size() > kMostScanned && (entries.size() + 1) * 4 > index.size() * 3)
-            rebuildIndex();
-        else if (!index.empty())
-            index[slotOf(key.get())] = static_cast<uint32_t>(entries.size());
-    } catch (...) {
-        entries.pop_back();
-        throw;
-    }
+    else
+        takeNew(std::move(key), std::move(value));
+}
+
+void CSKavellDictionary::takeNew(Ref<CSKavellTypeRef> key, Ref<CSKavellTypeRef> value)
+{
+    makeRoom();
+    if (slotCount > 0)
+        index[slotOf(key.get())] = used + 1;
     // The dictionary owns them from here on.
-    static_cast<void>(key.leak());
-    static_cast<void>(value.leak());
+    mutableEntries()[used++] = {key.leak(), value.leak()};
     ++count;
 }
 
@@ -100,48 +142,65 @@ void CSKavellDictionary::remove(CSKavellTypeRef key) noexcept
     if (!found)
         return;
     const DictionaryEntry removed = *found;
-    if (index.empty())
-        entries.erase(entries.begin() + (found - entries.data()));
+    const auto position = static_cast<size_t>(found - entries().data());
+    DictionaryEntry *const all = mutableEntries();
+    if (slotCount > 0)
+        all[position] = {};
     else
-        entries[static_cast<size_t>(found - entries.data())] = {};
-    --count;
-    if (count == 0) {
-        entries.clear();
-        index.clear();
+        std::copy(all + position + 1, all + used--, all + position);
+    if (--count == 0) {
+        used = slotCount = 0;
+        index.reset();
     }
     CSKavellRelease(removed.key);
     CSKavellRelease(removed.value);
 }
 
-void CSKavellDictionary::closeGaps() noexcept
+/// Makes room for one entry more, in the index too. May throw std::bad_alloc, and has then changed nothing that can be seen.
+void CSKavellDictionary::makeRoom()
 {
-    std::erase_if(entries, [](const DictionaryEntry &entry) { return !entry.key; });
-    // Positions have moved; there are fewer of them than before, so the index has room.
-    std::fill(index.begin(), index.end(), 0);
-    for (size_t position = 0; position < entries.size() && !index.empty(); ++position)
-        index[slotOf(entries[position].key)] = static_cast<uint32_t>(position + 1);
+    if (used == capacity && count < used)
+        closeGaps();
+    if (used == capacity) {
+        if (used > kMostEntries / 2)
+            throw std::bad_alloc();
+        const uint32_t larger = std::max(2 * capacity, kUsualRoom);
+        auto moved = std::make_unique_for_overwrite<DictionaryEntry[]>(larger);
+        std::ranges::copy(entries(), moved.get());
+        outgrown = std::move(moved);
+        capacity = larger;
+    }
+    const size_t needed = size_t{used} + 1;
+    if (needed > kMostScanned && (needed + 1) * 4 > size_t{slotCount} * 3) {
+        const size_t slots = std::bit_ceil(needed * 2);
+        index = std::make_unique<uint32_t[]>(slots);
+        slotCount = static_cast<uint32_t>(slots);
+        fillIndex();
+    }
 }
 
-void CSKavellDictionary::rebuildIndex()
+void CSKavellDictionary::closeGaps() noexcept
 {
-    index = std::vector<uint32_t>(std::bit_ceil(entries.size() * 2), 0);
-    for (size_t position = 0; position < entries.size(); ++position) {
-        if (entries[position].key)
-            index[slotOf(entries[position].key)] = static_cast<uint32_t>(position + 1);
+    DictionaryEntry *const all = mutableEntries();
+    used = static_cast<uint32_t>(
+        std::remove_if(all, all + used, [](const DictionaryEntry &entry) { return !entry.key; }) - all);
+    // Positions have moved; there are fewer of them than before, so the index has room.
+    std::fill_n(index.get(), slotCount, 0);
+    fillIndex();
+}
+
+/// Puts the position of each entry into the index, which is empty.
+void CSKavellDictionary::fillIndex() noexcept
+{
+    for (uint32_t position = 0; position < used; ++position) {
+        if (const CSKavellTypeRef key = entries()[position].key)
+            index[slotOf(key)] = position + 1;
     }
 }
 
 namespace kavell {
 
 namespace {
-
-CSKavellDictionary *makeDictionary(uint16_t flags) noexcept
-{
-    auto *dictionary = makeObject<CSKavellDictionary>(nullptr, kTypeDictionary, 0);
-    if (dictionary)
-        dictionary->flags |= flags;
-    return dictionary;
-}
 
 CSKavellTypeRef copyDictionary(const CSKavellAllocator *, CSKavellTypeRef object)
 {
@@ -163,7 +222,7 @@ bool dictionariesEqual(CSKavellTypeRef first, CSKavellTypeRef second)
     const auto *one = static_cast<CSKavellDictionaryRef>(first), *other = static_cast<CSKavellDictionaryRef>(second);
     if (one->count != other->count)
         return false;
-    return std::all_of(one->entries.begin(), one->entries.end(), [other](const DictionaryEntry &entry) {
+    return std::ranges::all_of(one->entries(), [other](const DictionaryEntry &entry) {
         if (!entry.key)
             return true;
         const DictionaryEntry *match = other->find(entry.key);
@@ -215,9 +274,8 @@ CSKavellDictionaryRef CSKavellDictionaryCreate(const CSKavellTypeRef *keys, cons
     };
     if (count > 0 && (hasNone(keys) || hasNone(values)))
         return nullptr;
-    CSKavellDictionary *dictionary = makeDictionary(0);
+    CSKavellDictionary *dictionary = CSKavellDictionary::make(0, count);
     const bool filled = dictionary && guarded(false, [&] {
-                            dictionary->reserve(count);
                             for (size_t position = 0; position < count; ++position)
                                 dictionary->set(keys[position], values[position]);
                             return true;
@@ -231,15 +289,14 @@ CSKavellDictionaryRef CSKavellDictionaryCreate(const CSKavellTypeRef *keys, cons
 
 CSKavellMutableDictionaryRef CSKavellDictionaryCreateMutable(void)
 {
-    return makeDictionary(kObjectIsMutable);
+    return CSKavellDictionary::make(kObjectIsMutable, kUsualRoom);
 }
 
 CSKavellMutableDictionaryRef CSKavellDictionaryCreateMutableCopy(CSKavellDictionaryRef dictionary)
 {
-    CSKavellDictionary *copy = dictionary ? makeDictionary(kObjectIsMutable) : nullptr;
+    CSKavellDictionary *copy = dictionary ? CSKavellDictionary::make(kObjectIsMutable, dictionary->count) : nullptr;
     const bool filled =
         copy && guarded(false, [&] {
-            copy->reserve(dictionary->count);
             dictionary->forEach([copy](CSKavellTypeRef key, CSKavellTypeRef value) { copy->set(key, value); });
             return true;
         });

@@ -7,6 +7,7 @@
 #include <charconv>
 #include <cmath>
 
+#include "runtime/number_p.h"
 #include "runtime/object_p.h"
 
 namespace {
@@ -71,6 +72,11 @@ constinit const TypeOperations numberOperations{"CSKavellNumber", nullptr,    nu
 }  // namespace kavell
 
 using namespace kavell;
+
+CSKavellNumberRef kavell::makeInteger(ObjectBlock &block, int64_t value) noexcept
+{
+    return makeObject<CSKavellNumber>(block, kTypeNumber, 0, NumberKind::Signed, static_cast<uint64_t>(value));
+}
 
 CSKavellTypeID CSKavellNumberGetTypeID(void)
 {

@@ -39,17 +39,32 @@ uint32_t hashOfText(std::string_view text) noexcept
     return folded ? folded : 1;
 }
 
-CSKavellStringRef makeValidString(const CSKavellAllocator *allocator, std::string_view text) noexcept
+namespace {
+
+/// From an allocator or a block.
+template <typename Memory> CSKavellStringRef makeStringIn(Memory &&memory, std::string_view text) noexcept
 {
     if (text.size() > kLongestString)
         return nullptr;
     auto *string =
-        makeObject<CSKavellString>(allocator, kTypeString, text.size() + 1, static_cast<uint32_t>(text.size()), 0u);
+        makeObject<CSKavellString>(memory, kTypeString, text.size() + 1, static_cast<uint32_t>(text.size()), 0u);
     if (!string)
         return nullptr;
     std::memcpy(string->text(), text.data(), text.size());
     string->text()[text.size()] = '\0';
     return string;
+}
+
+}  // namespace
+
+CSKavellStringRef makeValidString(const CSKavellAllocator *allocator, std::string_view text) noexcept
+{
+    return makeStringIn(allocator, text);
+}
+
+CSKavellStringRef makeValidString(ObjectBlock &block, std::string_view text) noexcept
+{
+    return makeStringIn(block, text);
 }
 
 namespace {

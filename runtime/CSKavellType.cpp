@@ -13,7 +13,7 @@
 #include <mutex>
 
 #include "runtime/object_p.h"
-#include "runtime/single_threaded.h"
+#include "runtime/reference_count.h"
 
 namespace kavell {
 
@@ -71,6 +71,10 @@ void *allocateObject(const CSKavellAllocator *allocator, CSKavellTypeID typeID, 
 
 void deallocateObject(Object *object) noexcept
 {
+    if (object->flags >> kObjectDistanceShift != 0) {
+        deallocateInPiece(object);
+        return;
+    }
     if (!(object->flags & kObjectHasAllocator)) {
         std::free(object);
         return;
@@ -83,27 +87,6 @@ void deallocateObject(Object *object) noexcept
 }  // namespace kavell
 
 using namespace kavell;
-
-namespace {
-
-/// Counts a reference more. Answers how many there were before.
-uint32_t countUp(std::atomic<uint32_t> &references, uint32_t current) noexcept
-{
-    if (!isSingleThreaded())
-        return references.fetch_add(1, std::memory_order_relaxed);
-    references.store(current + 1, std::memory_order_relaxed);
-    return current;
-}
-
-uint32_t countDown(std::atomic<uint32_t> &references, uint32_t current) noexcept
-{
-    if (!isSingleThreaded())
-        return references.fetch_sub(1, std::memory_order_acq_rel);
-    references.store(current - 1, std::memory_order_relaxed);
-    return current;
-}
-
-}  // namespace
 
 CSKavellTypeRef CSKavellRetain(CSKavellTypeRef object)
 {

@@ -31,6 +31,10 @@ enum ObjectFlag : uint16_t {
     kObjectIsMutable = 2,     ///< a container that may be changed
 };
 
+/// The flags above these bits are the distance of an object from the start of the piece of memory that it shares with
+/// others (object_block.h), in units of eight bytes; 0 where it shares none.
+inline constexpr unsigned kObjectDistanceShift = 3;
+
 struct Object {
     mutable std::atomic<uint32_t> references;
     uint16_t typeID;
@@ -107,17 +111,27 @@ void deallocateObject(Object *object) noexcept;
 /// Adds the description of any object, none included.
 void describeObject(CSKavellTypeRef object, int depth, std::string &text);
 
-/// Makes an object of type T, which derives from Object, with `extraBytes` of room behind it; its other fields are made
-/// from `arguments`. Null when there is no memory.
+/// The same for an object in a piece of memory that it shares.
+void deallocateInPiece(Object *object) noexcept;
+
+/// Makes an object of type T, which derives from Object, in the memory that an allocation gave; its other fields are made
+/// from `arguments`. Null when it gave none.
 template <typename T, typename... Arguments>
-[[nodiscard]] T *makeObject(const CSKavellAllocator *allocator, CSKavellTypeID typeID, size_t extraBytes,
-                            Arguments &&...arguments) noexcept
+[[nodiscard]] T *initialiseObject(void *memory, CSKavellTypeID typeID, Arguments &&...arguments) noexcept
 {
-    void *memory = allocateObject(allocator, typeID, sizeof(T) + extraBytes, 0);
     if (!memory)
         return nullptr;
     const uint16_t flags = static_cast<Object *>(memory)->flags;
     return new (memory) T{{1, static_cast<uint16_t>(typeID), flags}, std::forward<Arguments>(arguments)...};
+}
+
+/// Makes an object of type T with `extraBytes` of room behind it. Null when there is no memory.
+template <typename T, typename... Arguments>
+[[nodiscard]] T *makeObject(const CSKavellAllocator *allocator, CSKavellTypeID typeID, size_t extraBytes,
+                            Arguments &&...arguments) noexcept
+{
+    return initialiseObject<T>(allocateObject(allocator, typeID, sizeof(T) + extraBytes, 0), typeID,
+                               std::forward<Arguments>(arguments)...);
 }
 
 /// The finaliser of a type whose fields release themselves.

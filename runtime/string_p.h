@@ -12,6 +12,7 @@
 
 #include <kavellaccounts/CSKavellString.h>
 
+#include "runtime/object_block.h"
 #include "runtime/object_p.h"
 
 /// The text follows the structure, with its terminator.
@@ -48,6 +49,7 @@ static_assert(sizeof(CSKavellString) == 16, "the text of a constant follows its 
 
 /// A string of text that is known to be UTF-8; none when there is no memory for it.
 [[nodiscard]] CSKavellStringRef makeValidString(const CSKavellAllocator *allocator, std::string_view text) noexcept;
+[[nodiscard]] CSKavellStringRef makeValidString(ObjectBlock &block, std::string_view text) noexcept;
 
 /// Whether the first and the last bytes of two texts of one length, as many as a Word has, are equal.
 template <typename Word> [[nodiscard]] bool equalEnds(const char *first, const char *second, size_t length) noexcept

@@ -39,7 +39,12 @@ public:
     {
     }
 
-    ~Ref() { CSKavellRelease(m_pointer); }
+    ~Ref()
+    {
+        // Asked here, so that the compiler leaves out what becomes of a Ref that was moved from.
+        if (m_pointer)
+            CSKavellRelease(m_pointer);
+    }
 
     Ref &operator=(Ref other) noexcept
     {

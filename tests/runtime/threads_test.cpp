@@ -9,7 +9,9 @@
 #include <deque>
 #include <set>
 
+#include "runtime/object_block.h"
 #include "runtime/object_p.h"
+#include "runtime/string_p.h"
 #include "tests/runtime/values.h"
 #include "tests/support/threads.h"
 
@@ -117,6 +119,22 @@ TEST(Threads, TheLastOfManyReleasesFreesAContainerOnce)
         });
     }
     EXPECT_EQ(allocator.deallocated(), 200);
+}
+
+TEST(Threads, TheObjectsOfOnePieceOfMemoryGoOnAllThreadsAtOnce)
+{
+    for (int round = 0; round < 200; ++round) {
+        std::array<CSKavellStringRef, kThreads> texts{};
+        {
+            ObjectBlock block(1000);
+            for (CSKavellStringRef &each : texts)
+                each = makeValidString(block, "text");
+        }
+        onAllThreads([&](int index) {
+            const String own = adopt(texts[static_cast<size_t>(index)]);
+            EXPECT_TRUE(same(own.get(), text("text").get()));
+        });
+    }
 }
 
 TEST(Threads, ConstantsAndSharedStringsHashAlikeOnAllThreads)
