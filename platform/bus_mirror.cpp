@@ -175,12 +175,15 @@ Mirror *ownMirror()
 void post(BusSignal signal)
 {
     Mirror *mirror = ownMirror();
-    const std::lock_guard lock(mirror->mutex);
-    if (mirror->queue.size() >= kMostQueued)
-        return;
-    if (!mirror->hasWorker)
-        startWorker(mirror);
-    mirror->queue.push_back(std::move(signal));
+    {
+        const std::lock_guard lock(mirror->mutex);
+        if (mirror->queue.size() >= kMostQueued)
+            return;
+        if (!mirror->hasWorker)
+            startWorker(mirror);
+        mirror->queue.push_back(std::move(signal));
+    }
+    // Not before: the worker would wake up only to wait for the mutex, and to be woken again.
     mirror->filled.notify_one();
 }
 

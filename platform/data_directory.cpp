@@ -73,11 +73,15 @@ void DataDirectory::add(const dirent &entry)
     }
 }
 
-bool DataDirectory::hasNoRecordOf(const char *name) const
+bool DataDirectory::hadNoRecordOf(const char *name) const
+{
+    return m_isTelling && (m_records.empty() || !m_records.contains(siblingPath(name, kRedoRecordPrefix)));
+}
+
+bool DataDirectory::isAsListed() const noexcept
 {
     struct stat status;
-    return m_isTelling && (m_records.empty() || !m_records.contains(siblingPath(name, kRedoRecordPrefix))) &&
-           fstat(descriptor(), &status) == 0 && nanosecondsBetween(m_changed, status.st_ctim) == 0;
+    return !m_isTelling || (fstat(descriptor(), &status) == 0 && nanosecondsBetween(m_changed, status.st_ctim) == 0);
 }
 
 }  // namespace kavell

@@ -2,8 +2,8 @@
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
 // A directory of data files as it was when it was listed, for whoever opens all of them: they are looked up from the open
-// directory and not from the root, and only those whose redo record may stand there have it looked for. One thread at a
-// time.
+// directory and not from the root, and only those whose redo record stood there have it looked for. What came to stand there
+// meanwhile shows in the directory's time, which is asked for once, at the end. One thread at a time.
 
 #ifndef KAVELL_PLATFORM_DATA_DIRECTORY_H
 #define KAVELL_PLATFORM_DATA_DIRECTORY_H
@@ -42,8 +42,14 @@ public:
         }
     }
 
-    /// Whether a data file certainly has no redo record now; asked by whoever has its flock, so that nobody can make one.
-    [[nodiscard]] bool hasNoRecordOf(const char *name) const;
+    /// Whether a data file had no redo record when the directory was listed. Whoever goes by that asks isAsListed later.
+    [[nodiscard]] bool hadNoRecordOf(const char *name) const;
+
+    /// Whether every answer of hadNoRecordOf has been true until now, too.
+    [[nodiscard]] bool isAsListed() const noexcept;
+
+    /// From here on hadNoRecordOf is sure of nothing.
+    void doubtListing() noexcept { m_isTelling = false; }
 
 private:
     struct Closer {

@@ -56,10 +56,9 @@ bool lockFile(int file) noexcept
     return true;
 }
 
-/// Whether the file has a name for certain.
-bool hasName(int file) noexcept
+/// Whether the file has a name for certain, and its status.
+bool hasName(int file, struct stat &status) noexcept
 {
-    struct stat status;
     return fstat(file, &status) == 0 && status.st_nlink > 0;
 }
 
@@ -79,7 +78,7 @@ public:
             m_file = openFile(path, access | kOpenFlags);
             if (m_file && !lockFile(m_file.get()))
                 m_file = FileDescriptor();
-            if (!m_file || access == O_RDONLY || hasName(m_file.get()))
+            if (!m_file || access == O_RDONLY || hasName(m_file.get(), m_status))
                 return;
         }
         m_file = FileDescriptor();
@@ -100,10 +99,13 @@ public:
     LockedFile &operator=(const LockedFile &) = delete;
 
     [[nodiscard]] int get() const noexcept { return m_file.get(); }
+    /// Of a file that was opened for writing, from when its flock had been taken.
+    [[nodiscard]] const struct stat &status() const noexcept { return m_status; }
     explicit operator bool() const noexcept { return static_cast<bool>(m_file); }
 
 private:
     FileDescriptor m_file;
+    struct stat m_status {};
 };
 
 /// Puts the new contents over the old, which are never cut off first: a full disk must not cost them.
@@ -174,7 +176,7 @@ RecordState stateOfRecord(const std::string &recordPath, int directory = AT_FDCW
 /// The same for a data file of a directory that was listed.
 RecordState stateOfRecord(const DataDirectory &directory, const char *name)
 {
-    return directory.hasNoRecordOf(name) ? RecordState::None
+    return directory.hadNoRecordOf(name) ? RecordState::None
                                          : stateOfRecord(siblingPath(name, kRedoRecordPrefix), directory.descriptor());
 }
 
@@ -285,14 +287,20 @@ FileDescriptor makeRecord(const std::string &recordPath, const RedoRecord &conte
     return FileDescriptor();
 }
 
-bool replaceInPlace(int file, const char *path, std::string_view contents, IntactCheck isIntact, FileTime *written)
+bool replaceInPlace(const LockedFile &lockedFile, const char *path, std::string_view contents, IntactCheck isIntact,
+                    FileTime *written)
 {
+    const int file = lockedFile.get();
     const std::string recordPath = siblingPath(path, kRedoRecordPrefix);
-    const RecordState state = settleRecord(file, recordPath);
-    struct stat status;
+    struct stat status = lockedFile.status();
+    RecordState state = stateOfRecord(recordPath);
+    if (state == RecordState::Pending) {
+        state = settleRecord(file, recordPath);
+        if (fstat(file, &status) != 0)
+            return false;
+    }
     FileContents old;
-    if (!isSettled(state) || fstat(file, &status) != 0 || !S_ISREG(status.st_mode) ||
-        !old.read(file, kLargestDataFile, status.st_size))
+    if (!isSettled(state) || !S_ISREG(status.st_mode) || !old.read(file, kLargestDataFile, status.st_size))
         return false;
     const std::string_view oldContents = old.view();
     RedoRecord record;
@@ -450,8 +458,8 @@ bool writeDataFile(const char *path, std::string_view contents, IntactCheck isIn
     return guarded(false, [&] {
         for (int attempt = 0; attempt < kMostAttempts; ++attempt) {
             if (const LockedFile file(path, O_RDWR); file)
-                return replaceInPlace(file.get(), path, contents, isIntact, written);
-            if (errno != ENOENT)
+                return replaceInPlace(file, path, contents, isIntact, written);
+            if (errno != ENOENT || !createDirectoriesAbove(path))
                 return false;
             const Creation creation = createWhole(path, contents, written);
             if (creation != Creation::Exists)

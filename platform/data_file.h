@@ -42,7 +42,7 @@ enum class FileRead {
 };
 
 /// A file that was found in a listing of its directory, opened for reading. Without a file it is of no use and harms
-/// nothing; the directory must stay as long.
+/// nothing; the directory must stay as long. What is read of it is right if the directory is as listed after that.
 struct FoundFile {
     const DataDirectory *directory = nullptr;
     FileDescriptor file{};
@@ -58,8 +58,8 @@ struct FoundFile {
 /// Says whether bytes are what this kind of file should hold.
 using IntactCheck = bool (*)(std::string_view contents) noexcept;
 
-/// Makes `contents` the file's whole contents, durably, with permissions 0600; creates the file if need be, but not its
-/// directory. A file that `isIntact` does not accept is first kept beside it (damagedCopyPath); when that fails, or
+/// Makes `contents` the file's whole contents, durably, with permissions 0600; creates the file if need be, and the
+/// directories above it (createDirectoriesAbove). A file that `isIntact` does not accept is first kept beside it (damagedCopyPath); when that fails, or
 /// anything else, the file is as before and the result is false.
 /// On success `*written`, unless null, is the modification time that this call gave the file; asked for later, it could be
 /// that of another program's save.

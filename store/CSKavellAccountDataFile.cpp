@@ -139,16 +139,15 @@ void deleteDataFile(const CSKavellAccount &account) noexcept
         NotifySendMsg(account);
 }
 
-/// Writes the file under the semaphore, where its directory is on the disk. When the semaphore cannot be taken nothing is
-/// written and nothing more is said.
-void writeUnderSemaphore(CSKavellAccount &account, std::string_view contents, bool hasDirectory) noexcept
+/// Writes the file under the semaphore. When that cannot be taken nothing is written and nothing more is said.
+void writeUnderSemaphore(CSKavellAccount &account, std::string_view contents) noexcept
 {
     struct stat status;
     const bool isNeeded = account.semaphoreID == 0;
     if (!LockDatafileAccess(account, isNeeded && queryStatus(account, status) ? &status : nullptr))
         return;
     // The time is taken while nobody else can write: records of one account may hold different semaphores.
-    if (hasDirectory && writeDataFile(account.dataFilePath.get(), contents, isPropertyList, &account.dataFileModTime)) {
+    if (writeDataFile(account.dataFilePath.get(), contents, isPropertyList, &account.dataFileModTime)) {
         account.hasChanges = false;
     } else {
         writeError("Error: failed to save Kavell Settings datafile\n");
@@ -158,13 +157,9 @@ void writeUnderSemaphore(CSKavellAccount &account, std::string_view contents, bo
 
 void saveDataFile(CSKavellAccount &account, CSKavellDictionaryRef propertyList) noexcept
 {
-    struct stat status;
-    bool hasDirectory = true;
-    if (account.dataFilePath && !queryStatus(account, status))
-        hasDirectory = createDirectoriesAbove(account.dataFilePath.get());
     std::string contents;
     if (writePropertyList(propertyList, contents))
-        writeUnderSemaphore(account, contents, hasDirectory);
+        writeUnderSemaphore(account, contents);
     else
         writeError("Error: unable to create XML property list for Kavell Accounts settings - save failed\n");
     // Announced after every attempt, also one that failed: observers reload, and find what there is.
@@ -190,11 +185,15 @@ bool ReadAccountData(CSKavellAccount &account, FoundFile found) noexcept
     if (modificationTime(status) == account.dataFileModTime)
         return true;
     FileContents contents;
+    const DataDirectory *const directory = found.directory;
     const FileRead result = readUnderSemaphore(account, std::move(found), status, contents);
     if (result == FileRead::Failed)
         return true;
     const auto propertyList = result == FileRead::Done ? parsePropertyList(contents.view()) : nullptr;
     if (!propertyList) {
+        // It may have been torn since the listing, by a program that left a record of what it is to be.
+        if (directory && !directory->isAsListed())
+            return ReadAccountData(account);
         writeError("Error: failed to load Kavell Accounts settings\n");
         return false;
     }

@@ -28,14 +28,19 @@ namespace {
 
 using Guard = std::lock_guard<RecordLock>;
 
+void dropAccounts(CSKavellAccountProvider &provider) noexcept
+{
+    ReleaseAndClear(provider.accounts);
+    ReleaseAndClear(provider.accountsByLoginName);
+}
+
 void finaliseProvider(Object *object)
 {
     auto *provider = static_cast<CSKavellAccountProvider *>(object);
     {
         const Guard guard(provider->lock);
         provider->providerType = nullptr;
-        ReleaseAndClear(provider->accounts);
-        ReleaseAndClear(provider->accountsByLoginName);
+        dropAccounts(*provider);
     }
     provider->~CSKavellAccountProvider();
 }
@@ -107,19 +112,33 @@ Ref<CSKavellAccountRef> takeAccount(CSKavellAccountProvider &provider, CSKavellS
     return account;
 }
 
-/// Makes a record for each data file of the provider's directory, in the directory's own order.
-void CSKavellAccountProviderLoadAccountData(CSKavellAccountProvider &provider)
+/// Makes a record for each data file of a directory, in the directory's own order.
+void addListedAccounts(CSKavellAccountProvider &provider, const DataDirectory &directory, const std::string &path)
 {
-    const std::string path = providerDirectoryPath(provider.providerType.get());
-    if (path.find('\0') != std::string::npos)
-        return;
-    const DataDirectory directory(path.c_str());
     directory.forEachDataFile([&](std::string_view name) {
         // A name that is not UTF-8 cannot be a login name, and answers none here.
         const auto loginName = makeString(name.substr(0, name.size() - kDataFileSuffix.size()));
         if (loginName && !accountOf(provider, loginName.get()))
             addNewAccount(provider, loginName.get(), FoundFile::open(directory, name.data()), path);
     });
+}
+
+/// Makes a record for each data file of the provider's directory.
+void CSKavellAccountProviderLoadAccountData(CSKavellAccountProvider &provider)
+{
+    const std::string path = providerDirectoryPath(provider.providerType.get());
+    if (path.find('\0') != std::string::npos)
+        return;
+    const DataDirectory directory(path.c_str());
+    addListedAccounts(provider, directory, path);
+    if (directory.isAsListed())
+        return;
+    // Another program has come or gone in the directory meanwhile. If it died in the middle of a file, that was read as it
+    // left it, without the record that would mend it.
+    dropAccounts(provider);
+    DataDirectory anew(path.c_str());
+    anew.doubtListing();
+    addListedAccounts(provider, anew, path);
 }
 
 }  // namespace
@@ -217,7 +236,6 @@ void _CSKavellAccountProviderReloadAccountData(CSKavellAccountProviderRef provid
     if (!provider)
         return;
     const Guard guard(provider->lock);
-    ReleaseAndClear(provider->accounts);
-    ReleaseAndClear(provider->accountsByLoginName);
+    dropAccounts(*provider);
     guarded([&] { CSKavellAccountProviderLoadAccountData(*provider); });
 }

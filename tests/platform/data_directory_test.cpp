@@ -10,11 +10,11 @@
 #include <filesystem>
 #include <gtest/gtest.h>
 #include <sys/stat.h>
-#include <thread>
 #include <vector>
 
 #include "platform/data_file.h"
 #include "platform/redo_record.h"
+#include "tests/support/directory_time.h"
 #include "tests/support/process.h"
 
 using namespace kavell;
@@ -23,9 +23,6 @@ using namespace kavell::test;
 namespace {
 
 using Names = std::vector<std::string>;
-
-constexpr int64_t kSecond = 1'000'000'000;
-constexpr int64_t kLongestTick = kSecond / 100;
 
 class DataDirectoryTest : public testing::Test {
 protected:
@@ -43,22 +40,7 @@ protected:
         return siblingPath(m_path + "/" + name, kRedoRecordPrefix);
     }
 
-    /// How many nanoseconds the directory's time is in the past, as far as the clock of files tells.
-    [[nodiscard]] int64_t age() const
-    {
-        struct stat status {};
-        timespec now{};
-        EXPECT_EQ(stat(m_path.c_str(), &status), 0);
-        EXPECT_EQ(clock_gettime(CLOCK_REALTIME_COARSE, &now), 0);
-        return (now.tv_sec - status.st_ctim.tv_sec) * kSecond + (now.tv_nsec - status.st_ctim.tv_nsec);
-    }
-
-    /// Waits until the directory's time is older than any tick of that clock.
-    void letTimePass() const
-    {
-        while (age() <= kLongestTick)
-            std::this_thread::yield();
-    }
+    void letTimePass() const { test::letTimePass(m_path); }
 
     [[nodiscard]] static Names namesIn(const DataDirectory &directory)
     {
@@ -93,14 +75,16 @@ TEST_F(DataDirectoryTest, HasNothingWhereThereIsNoDirectory)
     const DataDirectory directory((m_path + "/missing").c_str());
     EXPECT_EQ(directory.descriptor(), -1);
     EXPECT_EQ(namesIn(directory), Names{});
-    EXPECT_FALSE(directory.hasNoRecordOf("ada.plist"));
+    EXPECT_FALSE(directory.hadNoRecordOf("ada.plist"));
+    EXPECT_TRUE(directory.isAsListed());
 }
 
-TEST_F(DataDirectoryTest, KnowsThatAFileHasNoRecord)
+TEST_F(DataDirectoryTest, KnowsThatAFileHadNoRecord)
 {
     letTimePass();
     const DataDirectory directory(m_path.c_str());
-    EXPECT_TRUE(directory.hasNoRecordOf("ada.plist"));
+    EXPECT_TRUE(directory.hadNoRecordOf("ada.plist"));
+    EXPECT_TRUE(directory.isAsListed());
 }
 
 TEST_F(DataDirectoryTest, KnowsOfARecordThatWasThere)
@@ -108,20 +92,39 @@ TEST_F(DataDirectoryTest, KnowsOfARecordThatWasThere)
     writeFile(recordOf("ada.plist"), "a record");
     letTimePass();
     const DataDirectory directory(m_path.c_str());
-    EXPECT_FALSE(directory.hasNoRecordOf("ada.plist"));
-    EXPECT_TRUE(directory.hasNoRecordOf("grace.plist"));
+    EXPECT_FALSE(directory.hadNoRecordOf("ada.plist"));
+    EXPECT_TRUE(directory.hadNoRecordOf("grace.plist"));
 }
 
-TEST_F(DataDirectoryTest, IsNotSureOnceANameHasComeOrGone)
+TEST_F(DataDirectoryTest, IsNotAsListedOnceANameHasComeOrGone)
 {
     letTimePass();
     const DataDirectory beforeOneCame(m_path.c_str());
     writeFile(recordOf("ada.plist"), "a record");
-    EXPECT_FALSE(beforeOneCame.hasNoRecordOf("ada.plist"));
+    EXPECT_FALSE(beforeOneCame.isAsListed());
     letTimePass();
     const DataDirectory beforeOneWent(m_path.c_str());
     std::filesystem::remove(recordOf("ada.plist"));
-    EXPECT_FALSE(beforeOneWent.hasNoRecordOf("grace.plist"));
+    EXPECT_FALSE(beforeOneWent.isAsListed());
+}
+
+TEST_F(DataDirectoryTest, IsAsListedWhileTheContentsOfItsFilesChange)
+{
+    letTimePass();
+    const DataDirectory directory(m_path.c_str());
+    put("ada.plist");
+    EXPECT_TRUE(directory.isAsListed());
+}
+
+TEST_F(DataDirectoryTest, IsSureOfNothingOnceItsListingIsDoubted)
+{
+    letTimePass();
+    DataDirectory directory(m_path.c_str());
+    directory.doubtListing();
+    EXPECT_FALSE(directory.hadNoRecordOf("ada.plist"));
+    // Nothing was taken on trust.
+    writeFile(recordOf("ada.plist"), "a record");
+    EXPECT_TRUE(directory.isAsListed());
 }
 
 TEST_F(DataDirectoryTest, IsNotSureWhereTheClockCouldNotTell)
@@ -131,8 +134,8 @@ TEST_F(DataDirectoryTest, IsNotSureWhereTheClockCouldNotTell)
     for (int attempt = 0; attempt < 1000; ++attempt) {
         put(std::to_string(attempt) + ".plist");
         const DataDirectory directory(m_path.c_str());
-        const bool isSure = directory.hasNoRecordOf("ada.plist");
-        if (age() <= kLongestTick) {
+        const bool isSure = directory.hadNoRecordOf("ada.plist");
+        if (ageOfDirectory(m_path) <= kLongestTick) {
             EXPECT_FALSE(isSure);
             return;
         }
@@ -160,18 +163,18 @@ TEST(DataDirectoryTimes, TellNothingWhereTheyHaveWholeSecondsOnly)
     EXPECT_FALSE(wouldChangeTell({100, 0}, {200, 0}));
 }
 
-TEST_F(DataDirectoryTest, AFoundFileThatWasTornSinceTheListingIsReadWhole)
+TEST_F(DataDirectoryTest, AFoundFileWhoseRecordWasListedIsReadWhole)
 {
-    letTimePass();
-    const DataDirectory directory(m_path.c_str());
-    FoundFile found = FoundFile::open(directory, "ada.plist");
     const std::string path = m_path + "/ada.plist";
     struct stat status {};
     ASSERT_EQ(stat(path.c_str(), &status), 0);
     writeFile(recordOf("ada.plist"), encodeRedoRecord({status.st_ino, "contents", "CONTENTS"}));
     writeFile(path, "CONTents");
+    letTimePass();
+    const DataDirectory directory(m_path.c_str());
     FileContents contents;
-    EXPECT_EQ(readDataFile(path.c_str(), contents, status.st_size, std::move(found)), FileRead::Done);
+    EXPECT_EQ(readDataFile(path.c_str(), contents, status.st_size, FoundFile::open(directory, "ada.plist")),
+              FileRead::Done);
     EXPECT_EQ(contents.view(), "CONTENTS");
 }
 
