@@ -102,6 +102,18 @@ void readAccounts(Registry *registry, Reading *reading)
     ag_manager_list_free(ids);
 }
 
+void listAccounts(Registry *registry, Reading *reading)
+{
+    GList *ids = ag_manager_list(registry->manager);
+    for (GList *id = ids; id; id = id->next) {
+        AgAccount *account = load(registry->manager, id);
+        takeText(reading, "name", ag_account_get_display_name(account));
+        g_object_unref(account);
+        endAccount(reading);
+    }
+    ag_manager_list_free(ids);
+}
+
 static GVariant *makeValue(Kind kind, const Value *value)
 {
     if (kind == kText)

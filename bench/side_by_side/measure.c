@@ -8,7 +8,7 @@
  *     SIDE read COUNT      opens, reads all values, ends; for cold
  *     SIDE cold COUNT      how long a process of SIDE read takes, from its start to its end
  *     SIDE open COUNT N    opening and reading everything, N times in one process
- *     SIDE walk COUNT N    listing and reading what is open, N times
+ *     SIDE walk COUNT N    listing what is open with its names, and listing and reading all of it, N times each
  *     SIDE edit N          making, changing and removing N accounts while another process watches; from the start of each
  *                          change to that process's callback, too; each account's first change is told from the others
  *     SIDE memory COUNT    resident memory in bytes with everything open and read
@@ -122,6 +122,15 @@ static void walk(size_t count, int rounds)
 {
     Registry *registry = openRegistry();
     readAll(registry, count);
+    for (int round = 0; round < rounds; ++round) {
+        settle();
+        Reading names = {0};
+        const int64_t start = now();
+        listAccounts(registry, &names);
+        report("list", now() - start);
+        if (names.accounts != count || names.values != count)
+            fail("not all accounts were listed");
+    }
     for (int round = 0; round < rounds; ++round) {
         settle();
         const int64_t start = now();

@@ -107,6 +107,9 @@ Registry *openRegistry(void);
 /** Lists the accounts of an open registry and reads all values of each. */
 void readAccounts(Registry *registry, Reading *reading);
 
+/** Lists the accounts of an open registry and reads the name of each. */
+void listAccounts(Registry *registry, Reading *reading);
+
 /** Lets go of everything, so that the next openRegistry reads everything anew. */
 void closeRegistry(Registry *registry);
 

@@ -64,12 +64,27 @@ static void readAccount(ESource *source, Reading *reading)
     endAccount(reading);
 }
 
+/** The sources that every user has from the start are not among those with this extension. */
+static GList *listSources(Registry *registry)
+{
+    return e_source_registry_list_sources(registryOf(registry), E_SOURCE_EXTENSION_WEBDAV_BACKEND);
+}
+
 void readAccounts(Registry *registry, Reading *reading)
 {
-    // The sources that every user has from the start are not among those with this extension.
-    GList *sources = e_source_registry_list_sources(registryOf(registry), E_SOURCE_EXTENSION_WEBDAV_BACKEND);
+    GList *sources = listSources(registry);
     for (GList *each = sources; each; each = each->next)
         readAccount(each->data, reading);
+    g_list_free_full(sources, g_object_unref);
+}
+
+void listAccounts(Registry *registry, Reading *reading)
+{
+    GList *sources = listSources(registry);
+    for (GList *each = sources; each; each = each->next) {
+        takeText(reading, "name", e_source_get_display_name(each->data));
+        endAccount(reading);
+    }
     g_list_free_full(sources, g_object_unref);
 }
 

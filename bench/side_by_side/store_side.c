@@ -96,6 +96,19 @@ void readAccounts(Registry *registry, Reading *reading)
     CSKavellRelease(accounts);
 }
 
+void listAccounts(Registry *registry, Reading *reading)
+{
+    CSKavellArrayRef accounts = _CSKavellAccountProviderCopyAccounts(providerOf(registry));
+    for (size_t index = 0, count = CSKavellArrayGetCount(accounts); index < count; ++index) {
+        CSKavellStringRef name =
+            _CSKavellAccountCopyLoginName((CSKavellAccountRef)CSKavellArrayGetValueAtIndex(accounts, index));
+        takeValue(reading, kText, "login", name);
+        CSKavellRelease(name);
+        endAccount(reading);
+    }
+    CSKavellRelease(accounts);
+}
+
 static CSKavellTypeRef makeValue(Kind kind, const Value *value)
 {
     if (kind == kText)

@@ -60,6 +60,11 @@ void readAccounts(Registry *registry, Reading *reading)
     reading->accounts += registry->count;
 }
 
+void listAccounts(Registry *registry, Reading *reading)
+{
+    readAccounts(registry, reading);
+}
+
 void closeRegistry(Registry *registry)
 {
     for (size_t index = 0; index < registry->count; ++index)
@@ -69,11 +74,11 @@ void closeRegistry(Registry *registry)
     free(registry);
 }
 
-static void writeAndSync(int file)
+static void writeAndSync(int file, size_t size)
 {
-    char contents[kContents];
+    char contents[2 * kContents];
     memset(contents, 'x', sizeof contents);
-    if (file < 0 || pwrite(file, contents, sizeof contents, 0) != sizeof contents || fdatasync(file) != 0)
+    if (file < 0 || pwrite(file, contents, size, 0) != (ssize_t)size || fdatasync(file) != 0)
         fail("write");
     close(file);
 }
@@ -98,7 +103,7 @@ Account *createAccount(Registry *registry, const AccountValues *values)
 {
     Account *account = malloc(sizeof *account);
     snprintf(account->name, sizeof account->name, "%s.bare", values->loginName);
-    writeAndSync(openat(registry->directory, "new", O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0600));
+    writeAndSync(openat(registry->directory, "new", O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0600), kContents);
     if (renameat(registry->directory, "new", registry->directory, account->name) != 0 ||
         fsync(registry->directory) != 0)
         fail("rename");
@@ -106,15 +111,25 @@ Account *createAccount(Registry *registry, const AccountValues *values)
     return account;
 }
 
+/** What has to survive a power cut where it is has to be on the disk elsewhere first: the old contents and the new. */
 void changeAccount(Registry *registry, Account *account, const char *host)
 {
     (void)host;
-    writeAndSync(openat(registry->directory, account->name, O_WRONLY | O_CLOEXEC));
+    char record[sizeof account->name + 8];
+    snprintf(record, sizeof record, "%s-record", account->name);
+    const int flags = O_WRONLY | O_CLOEXEC, made = openat(registry->directory, record, flags | O_CREAT | O_EXCL, 0600);
+    writeAndSync(made >= 0 ? made : openat(registry->directory, record, flags), 2 * kContents);
+    if (made >= 0 && fsync(registry->directory) != 0)
+        fail("fsync");
+    writeAndSync(openat(registry->directory, account->name, flags), kContents);
     tell();
 }
 
 void removeAccount(Registry *registry, Account *account)
 {
+    char record[sizeof account->name + 8];
+    snprintf(record, sizeof record, "%s-record", account->name);
+    unlinkat(registry->directory, record, 0);
     if (unlinkat(registry->directory, account->name, 0) != 0 || fsync(registry->directory) != 0)
         fail("unlink");
     tell();
