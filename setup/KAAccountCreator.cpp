@@ -171,7 +171,7 @@ std::shared_ptr<KAAccountCreator> KAAccountCreator::initWithSettings(const std::
 }
 
 KAAccountCreator::KAAccountCreator(const std::optional<QVariantMap> &settings, KADataPlugin *plugin)
-    : _settings(settings), _plugin(plugin)
+    : _settings(settings), _plugin(plugin), m_pluginAddress(plugin)
 {
     registerMessageTypes();
 }
@@ -186,13 +186,14 @@ void KAAccountCreator::letGoOfPlugin()
     // To none, whoever the delegate is, but for another creator that is at work: it would wait for ever. One whose turn
     // has only just begun has yet to take this creator's place, to which messages come until it has.
     while (!_plugin.isNull() && !m_hasLetGo) {
-        if (pluginsAtWork().take(_plugin) == PluginsAtWork::Answer::Taken) {
-            _plugin->setDelegate(nullptr);
-            pluginsAtWork().giveBack(_plugin);
+        if (pluginsAtWork().take(m_pluginAddress) == PluginsAtWork::Answer::Taken) {
+            if (!_plugin.isNull())
+                _plugin->setDelegate(nullptr);
+            pluginsAtWork().giveBack(m_pluginAddress);
             break;
         }
         // The plug-in itself is not asked: it may be in the midst of a question to the user.
-        if (pluginsAtWork().servesItsDelegate(_plugin))
+        if (pluginsAtWork().servesItsDelegate(m_pluginAddress))
             break;
         std::this_thread::yield();
     }
@@ -245,10 +246,9 @@ bool KAAccountCreator::create()
 
     const PlaceInPoolForOthers place;
     const std::shared_ptr<KAAccountSetupInput> input = _input();
-    const KADataPlugin *const plugin = _plugin;
-    if (!waitForTurn(plugin))
+    if (!waitForTurn())
         return false;
-    const auto turnIsOver = qScopeGuard([plugin] { pluginsAtWork().giveBack(plugin); });
+    const auto turnIsOver = qScopeGuard([this] { pluginsAtWork().giveBack(m_pluginAddress); });
     const std::shared_ptr<KAAccountSetupResult> result = discover(input);
     if (!result)
         return failed(QStringLiteral("The plug-in found nothing to make an account of."));
@@ -273,30 +273,29 @@ std::shared_ptr<KAAccountSetupResult> KAAccountCreator::discover(const std::shar
     _waiting = true;
     const auto waitIsOver = qScopeGuard([this] { _waiting = false; });
     _plugin->setDelegate(this);
-    pluginsAtWork().noteDelegate(_plugin);
+    pluginsAtWork().noteDelegate(m_pluginAddress);
     _plugin->startAccountSetupWithInput(input);
     waitForReport();
     const std::lock_guard lock(m_mutex);
     return _plugin.isNull() ? nullptr : _result;
 }
 
-bool KAAccountCreator::waitForTurn(const KADataPlugin *plugin)
+bool KAAccountCreator::waitForTurn()
 {
     EventsMeanwhile events;
-    // Not asked for its address, which has no meaning any more when another thread is just destroying it.
     while (!_plugin.isNull() && !QCoreApplication::closingDown()) {
-        const PluginsAtWork::Answer answer = pluginsAtWork().take(plugin);
+        const PluginsAtWork::Answer answer = pluginsAtWork().take(m_pluginAddress);
         if (answer == PluginsAtWork::Answer::Taken) {
             if (!_plugin.isNull())
                 return true;
-            pluginsAtWork().giveBack(plugin);
+            pluginsAtWork().giveBack(m_pluginAddress);
             break;
         }
         if (answer == PluginsAtWork::Answer::BusyBelow)
             return failed(QStringLiteral("The plug-in is at work on another account, which this one would hold up."));
         events.run();
     }
-    return failed(QStringLiteral("The plug-in or the program ended while it was at work on another account."));
+    return failed(QStringLiteral("The plug-in or the program ended before the turn of this account came."));
 }
 
 void KAAccountCreator::waitForReport()
@@ -385,7 +384,7 @@ void KAAccountCreator::fillIn(KAAccountSetupInput &input, const QString &descrip
 
 QString KAAccountCreator::pluginIdentifier() const
 {
-    return _plugin ? _plugin->identifier() : QString();
+    return _plugin.isNull() ? QString() : _plugin->identifier();
 }
 
 /// Whether to go on: the account-list plug-in may ask the user first whether calendars or contacts shall move.

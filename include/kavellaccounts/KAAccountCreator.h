@@ -51,7 +51,7 @@ public:
                                                                             KADataPlugin *plugin);
 
     /// Sets the plug-in's delegate to none, whoever that is except another creator at work, so that no late message
-    /// reaches a creator that is gone; waits for one that is under way on another thread.
+    /// reaches a creator that is gone; waits, without a bound, for one that is under way on another thread.
     ~KAAccountCreator() override;
 
     /// @name The provider of the account that is copied, and the account's name at the maker's online service, where it
@@ -64,13 +64,15 @@ public:
     /// @}
 
     /// Makes the account. True when the plug-in made one, and true when the newer online service needs none because its
-    /// calendars or contacts were switched on. False after a failure, which the log tells, and failureReason.
+    /// calendars or contacts were switched on. False after a failure, whose reason failureReason tells.
     ///
     /// Blocks until the plug-in is free and has reported, without a bound, and runs the events of the calling thread
     /// meanwhile, which it asks for again and again without sleeping; a program without an application object has no
     /// events to run. Ends early only when the plug-in is destroyed or the application object goes away. From an event
     /// that a creator of the same plug-in runs while it waits, it fails. A thread of the global thread pool gives its
     /// place there to others for that time. What the plug-in throws comes through.
+    ///
+    /// The plug-in may be destroyed on another thread while it is waited for, but not while it is being called.
     [[nodiscard]] bool create();
 
     /// @name What came of `create`. Any thread
@@ -151,7 +153,7 @@ private:
     [[nodiscard]] bool _warnAboutMigrationSyncIfNecessary() const;
     [[nodiscard]] bool _enableBrondelService();
     [[nodiscard]] std::shared_ptr<KAAccountSetupResult> discover(const std::shared_ptr<KAAccountSetupInput> &input);
-    [[nodiscard]] bool waitForTurn(const KADataPlugin *plugin);
+    [[nodiscard]] bool waitForTurn();
     void waitForReport();
     void endWait(const QString &reason, const KAError &error = {});
     bool failed(const QString &reason, const KAError &error = {});
@@ -168,6 +170,9 @@ private:
     KAError m_failureError;
     QString m_createdAccountUID;
     bool m_hasLetGo = false;  // of the plug-in, on the way out
+    /// What tells its turns apart. _plugin is not asked for it: where another thread is just destroying the plug-in, what
+    /// is left has no address of this class any more.
+    const KADataPlugin *const m_pluginAddress;
 };
 
 /// Makes accounts of the mail client.

@@ -204,7 +204,7 @@ TEST_F(KAAccountCreatorTest, ACreatorWhosePluginIsDestroyedBeforeItsTurnFails)
     const auto first = mailCreator(plugin());
     EXPECT_FALSE(first->create());
     EXPECT_FALSE(created.get());
-    EXPECT_EQ(second.failureReason(), "The plug-in or the program ended while it was at work on another account.");
+    EXPECT_EQ(second.failureReason(), "The plug-in or the program ended before the turn of this account came.");
 }
 
 TEST_F(KAAccountCreatorTest, AReportedFailureCreatesNothing)

@@ -119,7 +119,7 @@ bool createInConsoleProgram()
     ended.set_value();
     worker.join();
     done.get_future().wait();
-    const QString reason = "The plug-in or the program ended while it was at work on another account.";
+    const QString reason = "The plug-in or the program ended before the turn of this account came.";
     std::_Exit(!created && second->failureReason() == reason ? 0 : 1);
 }
 
