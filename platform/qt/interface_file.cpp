@@ -3,7 +3,9 @@
 
 #include "platform/qt/interface_file.h"
 
+#include <memory>
 #include <optional>
+#include <utility>
 
 #include <QtCore/QBuffer>
 #include <QtCore/QFile>
@@ -105,8 +107,9 @@ QWidget *readWidgets(WidgetLoader &loader, const QString &path, QString &reason)
     QBuffer buffer(&xml);
     std::unique_ptr<QWidget> root(loader.load(&buffer));
     reason = loader.errorString();
-    if (root && loader.unknownLayout()) {
-        reason = QStringLiteral("It has a layout of an unknown class, %1.").arg(KADescription(*loader.unknownLayout()));
+    if (const std::optional<QString> &unknown = loader.unknownLayout(); root && unknown) {
+        reason = unknown->isEmpty() ? QStringLiteral("It has a layout without a class.")
+                                    : QStringLiteral("It has a layout of an unknown class, %1.").arg(*unknown);
         return nullptr;
     }
     return root.release();

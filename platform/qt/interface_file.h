@@ -29,8 +29,8 @@ public:
     /// Makes the widgets of classes that are not the toolkit's own, by class name.
     using WidgetMakers = QHash<QString, QWidget *(*)(QWidget *parent)>;
 
-    /// Reads a file; null when it is none, or is larger or nested deeper than any interface, with a line in the log or,
-    /// where `problem` is given, with the reason there. A null path is one that is missing.
+    /// Reads a file; null when it is none, has a layout of a class that the toolkit does not know, or is larger or nested
+    /// deeper than any interface, with a line in the log or, where `problem` is given, with the reason there. A null path is one that is missing.
     [[nodiscard]] static std::unique_ptr<InterfaceFile> load(const QString &path, QString *problem = nullptr,
                                                              const WidgetMakers &makers = {});
 

@@ -99,6 +99,16 @@ TEST_F(InterfaceFileTest, WhatHasALayoutOfAnUnknownClassIsNotRead)
     }
 }
 
+TEST_F(InterfaceFileTest, WhatHasALayoutWithoutAClassIsNotRead)
+{
+    for (const char *layout : {"<layout/>", "<layout class=\"\"/>"}) {
+        QString problem;
+        const QByteArray xml = QByteArray("<ui version=\"4.0\"><widget class=\"QWidget\">") + layout + "</widget></ui>";
+        EXPECT_FALSE(InterfaceFile::load(write(xml), &problem)) << layout;
+        EXPECT_EQ(problem, "It has a layout without a class.") << layout;
+    }
+}
+
 // A dock has a layout of its own already; the sanitizers say whether the other one is left behind.
 TEST_F(InterfaceFileTest, ALayoutThatHasNoPlaceGoesAgain)
 {
