@@ -11,6 +11,7 @@
 #include <cstdlib>
 #include <cstring>
 #include <unistd.h>
+#include <utility>
 
 #include "tools/failure.h"
 
@@ -63,11 +64,21 @@ bool isControl(char32_t character)
     return character < 0x20 || (character >= 0x7F && character <= 0x9F);
 }
 
+/// How many bytes a character has that begins with this one; 0 when none does.
+size_t lengthOfCharacter(unsigned char lead)
+{
+    constexpr std::array<std::pair<unsigned char, size_t>, 5> lengthsBelow{
+        {{0x80, 1}, {0xC2, 0}, {0xE0, 2}, {0xF0, 3}, {0xF5, 4}}};
+    const auto row = std::find_if(lengthsBelow.begin(), lengthsBelow.end(),
+                                  [lead](const auto &lengthBelow) { return lead < lengthBelow.first; });
+    return row != lengthsBelow.end() ? row->second : 0;
+}
+
 /// Takes the next character off the text; `invalid`, and one byte less, where the bytes are not UTF-8 (RFC 3629).
 char32_t takeCharacter(std::string_view &text)
 {
     const auto lead = static_cast<unsigned char>(text.front());
-    const size_t length = lead < 0x80 ? 1 : lead < 0xC2 ? 0 : lead < 0xE0 ? 2 : lead < 0xF0 ? 3 : lead < 0xF5 ? 4 : 0;
+    const size_t length = lengthOfCharacter(lead);
     constexpr std::array<char32_t, 5> smallest{0, 0, 0x80, 0x800, 0x10000};
     char32_t character = length == 1 ? lead : lead & (0x7FU >> length);
     bool valid = length > 0 && length <= text.size();
