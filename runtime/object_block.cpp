@@ -6,7 +6,9 @@
 #include <algorithm>
 #include <cstdlib>
 #include <new>
+#if __has_include(<sanitizer/asan_interface.h>)
 #include <sanitizer/asan_interface.h>
+#endif
 
 #include "runtime/reference_count.h"
 
@@ -25,6 +27,14 @@ constexpr size_t kUnit = 8;
 static_assert(sizeof(Piece) <= kUnit && alignof(Object) <= kUnit);
 
 constexpr size_t kLargestPiece = kUnit * (size_t{UINT16_MAX >> kObjectDistanceShift} + 1);
+
+/// The memory of an object that is gone stays as long as the others', but nobody may take it for an object any more.
+void forbidUse([[maybe_unused]] const Object *object) noexcept
+{
+#ifdef ASAN_POISON_MEMORY_REGION
+    ASAN_POISON_MEMORY_REGION(object, sizeof(Object));
+#endif
+}
 
 void letGo(Piece *piece) noexcept
 {
@@ -62,8 +72,7 @@ void *ObjectBlock::allocateObject(CSKavellTypeID typeID, size_t size) noexcept
 void deallocateInPiece(Object *object) noexcept
 {
     const size_t distance = (object->flags >> kObjectDistanceShift) * kUnit;
-    // Its memory stays as long as the others', but nobody may take it for an object any more.
-    ASAN_POISON_MEMORY_REGION(object, sizeof(Object));
+    forbidUse(object);
     letGo(reinterpret_cast<Piece *>(reinterpret_cast<char *>(object) - distance));
 }
 
