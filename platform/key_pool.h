@@ -30,7 +30,7 @@ public:
 
 private:
     std::unique_lock<std::mutex> m_poolLock;
-    uint8_t m_last = 0;          ///< the slot of the key that was made last
+    uint8_t m_last = 0;          ///< the slot of the key that was made last; before the first, any one does
     bool m_hasReplaced = false;  ///< a key of this document may have left the pool
 };
 

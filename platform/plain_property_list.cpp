@@ -59,8 +59,9 @@ constexpr bool isIdentifierCharacter(char character) noexcept
            ((character >= 'a') & (character <= 'z')) | (character == ' ');
 }
 
-/// How much of a document's length its objects usually take: half of it is markup.
-constexpr size_t kUsualSixteenths = 11;
+/// How much of a document's length its objects usually take, and up to where that is likely: a longer one has long texts
+/// or data in it, which need memory of their own.
+constexpr size_t kUsualSixteenths = 11, kLargestBlock = 8 * 1024;
 
 /// Of how many keys each is compared with each.
 constexpr size_t kMostCompared = 16;
@@ -83,7 +84,7 @@ constexpr int base64Digit(char character) noexcept
 class PlainReader {
 public:
     explicit PlainReader(std::string_view xml)
-        : m_rest(xml), m_contents(contentsOf(xml)), m_block(xml.size() / 16 * kUsualSixteenths)
+        : m_rest(xml), m_contents(contentsOf(xml)), m_block(std::min(xml.size() / 16 * kUsualSixteenths, kLargestBlock))
     {
         m_pairs.reserve(32);
     }
@@ -271,7 +272,7 @@ private:
         if (depth >= kDeepestPlainContainer || !pairs(depth))
             return nullptr;
         const size_t count = m_pairs.size() - first;
-        // What holds dictionaries is taken apart and let go at once, and would only keep the block's room.
+        // What holds dictionaries is mostly taken apart and let go at once, and would only keep the block's room.
         const bool isTakenApart =
             std::any_of(m_pairs.begin() + static_cast<ptrdiff_t>(first), m_pairs.end(),
                         [](const auto &pair) { return isType(pair.second.get(), kTypeDictionary); });

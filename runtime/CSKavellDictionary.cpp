@@ -22,8 +22,8 @@ namespace {
 constexpr uint32_t kUsualRoom = 4;
 
 /// Positions, of which each is one more than the entry's, and the slots of the index, which are fewer than four times as
-/// many, must fit into their fields.
-constexpr size_t kMostEntries = UINT32_MAX / 4;
+/// many, must fit into their fields, and their bytes into a length.
+constexpr size_t kMostEntries = std::min<size_t>(UINT32_MAX / 4, SIZE_MAX / sizeof(DictionaryEntry) / 2);
 
 // A stable hash of any key; a string's is cached in it.
 uint32_t keyHash(CSKavellTypeRef key) noexcept
@@ -34,12 +34,17 @@ uint32_t keyHash(CSKavellTypeRef key) noexcept
     return static_cast<uint32_t>(hash ^ (hash >> 32));
 }
 
+/// Whether a key is this text.
+bool isText(CSKavellTypeRef key, const CSKavellString &text) noexcept
+{
+    return key == &text || (isType(key, kTypeString) && equalStrings(*static_cast<CSKavellStringRef>(key), text));
+}
+
 /// The entry of a text among some without gaps.
 const DictionaryEntry *scanFor(const CSKavellString &key, std::span<const DictionaryEntry> entries) noexcept
 {
     for (const DictionaryEntry &entry : entries) {
-        if (entry.key == &key ||
-            (isType(entry.key, kTypeString) && equalStrings(*static_cast<CSKavellStringRef>(entry.key), key)))
+        if (isText(entry.key, key))
             return &entry;
     }
     return nullptr;
@@ -55,11 +60,8 @@ const DictionaryEntry *scanFor(CSKavellTypeRef key, std::span<const DictionaryEn
 
 bool sameKey(CSKavellTypeRef first, CSKavellTypeRef second) noexcept
 {
-    if (first == second)
-        return true;
-    if (!isType(first, kTypeString) || !isType(second, kTypeString))
-        return CSKavellEqual(first, second);
-    return equalStrings(*static_cast<CSKavellStringRef>(first), *static_cast<CSKavellStringRef>(second));
+    return isType(second, kTypeString) ? isText(first, *static_cast<CSKavellStringRef>(second))
+                                       : CSKavellEqual(first, second);
 }
 
 }  // namespace
@@ -156,7 +158,7 @@ void CSKavellDictionary::remove(CSKavellTypeRef key) noexcept
     CSKavellRelease(removed.value);
 }
 
-/// Makes room for one entry more, in the index too. May throw std::bad_alloc, and has then changed nothing that can be seen.
+/// Makes room for one entry more, in the index too. May throw std::bad_alloc, and has then changed nothing that shows.
 void CSKavellDictionary::makeRoom()
 {
     if (used == capacity && count < used)

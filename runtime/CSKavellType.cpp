@@ -69,13 +69,13 @@ void *allocateObject(const CSKavellAllocator *allocator, CSKavellTypeID typeID, 
         Object{1, static_cast<uint16_t>(typeID), static_cast<uint16_t>(flags | kObjectHasAllocator)};
 }
 
-void deallocateObject(Object *object) noexcept
+void deallocateObject(Object *object, uint16_t flags) noexcept
 {
-    if (object->flags >> kObjectDistanceShift != 0) {
-        deallocateInPiece(object);
+    if (flags >> kObjectDistanceShift != 0) {
+        deallocateInPiece(object, flags);
         return;
     }
-    if (!(object->flags & kObjectHasAllocator)) {
+    if (!(flags & kObjectHasAllocator)) {
         std::free(object);
         return;
     }
@@ -114,9 +114,10 @@ void CSKavellRelease(CSKavellTypeRef object)
     Object *last = const_cast<Object *>(objectOf(object));
     // The finaliser may end the fields' lifetime, the flags among them.
     const TypeOperations &operations = typeOperations(object);
+    const uint16_t flags = last->flags;
     if (operations.finalise)
         operations.finalise(last);
-    deallocateObject(last);
+    deallocateObject(last, flags);
 }
 
 bool CSKavellEqual(CSKavellTypeRef first, CSKavellTypeRef second)

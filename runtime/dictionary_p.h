@@ -8,8 +8,7 @@
 //
 // A handful of entries is scanned, which is faster than an index and a third of its size; attribute sets are that
 // small. A removed entry of an indexed dictionary leaves a gap, which the next growth closes. The entries that a dictionary
-// is made for stand right behind it, in one piece of memory with it; when it outgrows that room, they move into a piece of
-// their own.
+// is made for stand right behind it, in the same memory; when it outgrows that room, they move into memory of their own.
 
 #ifndef KAVELL_RUNTIME_DICTIONARY_P_H
 #define KAVELL_RUNTIME_DICTIONARY_P_H

@@ -6,9 +6,6 @@
 #include <algorithm>
 #include <cstdlib>
 #include <new>
-#if __has_include(<sanitizer/asan_interface.h>)
-#include <sanitizer/asan_interface.h>
-#endif
 
 #include "runtime/reference_count.h"
 
@@ -22,19 +19,11 @@ struct Piece {
 
 namespace {
 
-/// Objects begin at multiples of this, and so far from the start of the piece at the least.
-constexpr size_t kUnit = 8;
-static_assert(sizeof(Piece) <= kUnit && alignof(Object) <= kUnit);
+constexpr size_t kUnit = ObjectBlock::kUnit;
+// The first object stands one unit from the start.
+static_assert(sizeof(Piece) <= kUnit);
 
 constexpr size_t kLargestPiece = kUnit * (size_t{UINT16_MAX >> kObjectDistanceShift} + 1);
-
-/// The memory of an object that is gone stays as long as the others', but nobody may take it for an object any more.
-void forbidUse([[maybe_unused]] const Object *object) noexcept
-{
-#ifdef ASAN_POISON_MEMORY_REGION
-    ASAN_POISON_MEMORY_REGION(object, sizeof(Object));
-#endif
-}
 
 void letGo(Piece *piece) noexcept
 {
@@ -49,6 +38,8 @@ ObjectBlock::ObjectBlock(size_t capacity) noexcept
 {
     void *memory = std::malloc(m_size);
     m_piece = memory ? new (memory) Piece{1} : nullptr;
+    if (memory)
+        poison(static_cast<char *>(memory) + kUnit, m_size - kUnit);
 }
 
 ObjectBlock::~ObjectBlock()
@@ -63,16 +54,17 @@ void *ObjectBlock::allocateObject(CSKavellTypeID typeID, size_t size) noexcept
     if (size > room)
         return kavell::allocateObject(nullptr, typeID, size, 0);
     void *memory = reinterpret_cast<char *>(m_piece) + m_used;
+    unpoison(memory, size);
     const auto distance = static_cast<uint16_t>(m_used / kUnit << kObjectDistanceShift);
-    m_used = std::min(m_used + (size + kUnit - 1) / kUnit * kUnit, m_size);
+    m_used = std::min(m_used + (size + kUnit - 1) / kUnit * kUnit + kGap, m_size);
     countUp(m_piece->living, m_piece->living.load(std::memory_order_relaxed));
     return new (memory) Object{1, static_cast<uint16_t>(typeID), distance};
 }
 
-void deallocateInPiece(Object *object) noexcept
+void deallocateInPiece(Object *object, uint16_t flags) noexcept
 {
-    const size_t distance = (object->flags >> kObjectDistanceShift) * kUnit;
-    forbidUse(object);
+    poisonUpToPoison(object, kLargestPiece);
+    const size_t distance = (flags >> kObjectDistanceShift) * kUnit;
     letGo(reinterpret_cast<Piece *>(reinterpret_cast<char *>(object) - distance));
 }
 

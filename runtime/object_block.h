@@ -8,15 +8,14 @@
 //
 // An object has its distance from the start of the piece in its flags. The last one that goes frees the piece: whoever
 // keeps one of them keeps all that memory. The objects are like any others and may go on any thread; an ObjectBlock
-// serves one thread.
+// serves one thread. For the address sanitizer there is a gap behind each object, and what is free may not be used.
 
 #ifndef KAVELL_RUNTIME_OBJECT_BLOCK_H
 #define KAVELL_RUNTIME_OBJECT_BLOCK_H
 
-#include <atomic>
 #include <cstddef>
-#include <cstdint>
 
+#include "runtime/memory_poison.h"
 #include "runtime/object_p.h"
 
 namespace kavell {
@@ -26,8 +25,12 @@ struct Piece;
 /// What fills a piece with objects.
 class ObjectBlock {
 public:
-    /// A piece with room for objects of so many bytes in all, or of as many as can be told apart. Without memory for it
-    /// there is none, and nothing fits in.
+    /// Objects begin at multiples of this.
+    static constexpr size_t kUnit = 8;
+    static constexpr size_t kGap = kCanPoison ? kUnit : 0;
+
+    /// A piece with room for objects of so many bytes in all, each counted up to a multiple of kUnit, or of as many as can
+    /// be told apart (64 KiB). Without memory for it there is none, and nothing fits in.
     explicit ObjectBlock(size_t capacity) noexcept;
     ~ObjectBlock();
     ObjectBlock(const ObjectBlock &) = delete;
@@ -48,6 +51,7 @@ template <typename T, typename... Arguments>
 [[nodiscard]] T *makeObject(ObjectBlock &block, CSKavellTypeID typeID, size_t extraBytes,
                             Arguments &&...arguments) noexcept
 {
+    static_assert(alignof(T) <= ObjectBlock::kUnit);
     return initialiseObject<T>(block.allocateObject(typeID, sizeof(T) + extraBytes), typeID,
                                std::forward<Arguments>(arguments)...);
 }

@@ -105,14 +105,14 @@ private:
 [[nodiscard]] void *allocateObject(const CSKavellAllocator *allocator, CSKavellTypeID typeID, size_t size,
                                    uint16_t flags) noexcept;
 
-/// Gives the memory of a finalised object back.
-void deallocateObject(Object *object) noexcept;
+/// Gives the memory of a finalised object back, whose flags were these.
+void deallocateObject(Object *object, uint16_t flags) noexcept;
+
+/// The same for an object in a piece of memory that it shares.
+void deallocateInPiece(Object *object, uint16_t flags) noexcept;
 
 /// Adds the description of any object, none included.
 void describeObject(CSKavellTypeRef object, int depth, std::string &text);
-
-/// The same for an object in a piece of memory that it shares.
-void deallocateInPiece(Object *object) noexcept;
 
 /// Makes an object of type T, which derives from Object, in the memory that an allocation gave; its other fields are made
 /// from `arguments`. Null when it gave none.

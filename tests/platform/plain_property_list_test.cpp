@@ -7,11 +7,13 @@
 #include "platform/plain_property_list.h"
 
 #include <string>
+#include <thread>
 
 #include <gtest/gtest.h>
 
 #include <kavellaccounts/KavellStore.h>
 
+#include "platform/key_pool.h"
 #include "platform/property_list.h"
 
 using namespace kavell;
@@ -155,6 +157,26 @@ TEST(PlainPropertyList, LeavesWhatIsNotPlainToTheGeneralReader)
     };
     for (const char *value : values)
         EXPECT_FALSE(isPlainAndRight(document(value))) << value;
+}
+
+// Equal keys are one string, unless another key has pushed the first one out of the pool, or the pool is in use.
+TEST(PlainPropertyList, LeavesAKeyThatStandsTwiceToTheGeneralReaderWhateverStandsBetween)
+{
+    for (int between = 0; between < 3000; ++between) {
+        const std::string key = std::to_string(between);
+        ASSERT_FALSE(parsePlainPropertyList(
+            document("<dict><key>a</key><true/><key>" + key + "</key><true/>" + "<key>a</key><false/></dict>")))
+            << key;
+    }
+}
+
+TEST(PlainPropertyList, LeavesAKeyThatStandsTwiceToTheGeneralReaderWhileAnotherThreadReads)
+{
+    const KeyMaker another;
+    std::jthread([] {
+        EXPECT_TRUE(parsePlainPropertyList(document("<dict><key>a</key><true/><key>b</key><false/></dict>")));
+        EXPECT_FALSE(parsePlainPropertyList(document("<dict><key>a</key><true/><key>a</key><false/></dict>")));
+    }).join();
 }
 
 TEST(PlainPropertyList, ReadsTheNeighboursOfCharactersThatNoDocumentMayHave)

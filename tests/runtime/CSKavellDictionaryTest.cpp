@@ -4,6 +4,7 @@
 #include <chrono>
 
 #include "tests/runtime/values.h"
+#include "tests/support/short_memory.h"
 
 using namespace kavell;
 using namespace kavell::test;
@@ -210,6 +211,31 @@ TEST(CSKavellDictionary, FindsEachOfManyKeysAfterHalfWereRemovedAndSetAgain)
     EXPECT_EQ(order[9999], "key 19999");
     EXPECT_EQ(order[10000], "key 0");
     EXPECT_EQ(order.back(), "key 19996");
+}
+
+TEST(CSKavellDictionary, IsAsBeforeWhereThereIsNoMemoryToGrow)
+{
+    const auto pairs = adopt(CSKavellDictionaryCreateMutable());
+    int held = 0, refusals = 0;
+    for (int round = 0; round < 200; ++round) {
+        const String key = text(std::to_string(held));
+        const auto value = integer(held);
+        {
+            // Its entries, or its index, are too many now; then there is memory again.
+            const ShortMemory memory(0);
+            CSKavellDictionarySetValue(pairs.get(), key.get(), value.get());
+        }
+        const bool isSet = valueOf(pairs.get(), std::to_string(held)) != nullptr;
+        refusals += !isSet;
+        if (!isSet)
+            CSKavellDictionarySetValue(pairs.get(), key.get(), value.get());
+        ++held;
+        ASSERT_EQ(CSKavellDictionaryGetCount(pairs.get()), static_cast<size_t>(held));
+        for (int index = 0; index < held; ++index)
+            ASSERT_TRUE(same(valueOf(pairs.get(), std::to_string(index)), integer(index).get()));
+    }
+    // The room behind it is for 4; entries grow to 8, 16, 32, 64, 128 and 256, and the index at times of its own.
+    EXPECT_GT(refusals, 6);
 }
 
 TEST(CSKavellDictionary, LooksUpAndRemovesInConstantTime)

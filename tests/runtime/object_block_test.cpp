@@ -26,6 +26,8 @@ size_t distanceOf(CSKavellTypeRef object)
     return size_t{8} * (objectOf(object)->flags >> kObjectDistanceShift);
 }
 
+constexpr ptrdiff_t kGap = ObjectBlock::kGap;
+
 ptrdiff_t bytesBetween(CSKavellTypeRef first, CSKavellTypeRef second)
 {
     return static_cast<const char *>(second) - static_cast<const char *>(first);
@@ -40,8 +42,8 @@ TEST(ObjectBlock, ItsObjectsStandSideBySide)
     const auto number = adopt(makeInteger(block, 993));
     EXPECT_EQ(distanceOf(first.get()), 8u);
     // A string is 16 bytes and its text with the terminator, up to a multiple of eight.
-    EXPECT_EQ(bytesBetween(first.get(), second.get()), 24);
-    EXPECT_EQ(bytesBetween(second.get(), number.get()), 24);
+    EXPECT_EQ(bytesBetween(first.get(), second.get()), 24 + kGap);
+    EXPECT_EQ(bytesBetween(second.get(), number.get()), 24 + kGap);
     EXPECT_TRUE(same(first.get(), text("first").get()));
     EXPECT_TRUE(same(second.get(), text("second").get()));
     EXPECT_TRUE(same(number.get(), integer(993).get()));
@@ -71,9 +73,10 @@ TEST(ObjectBlock, HoldsAsManyAsCanBeToldApart)
     std::vector<String> texts;
     for (int index = 0; index < 10000; ++index)
         texts.push_back(textIn(block, std::to_string(index)));
-    // 24 bytes each; the last one that fits in begins 65,528 bytes from the start at the most.
-    EXPECT_EQ(distanceOf(texts[2729].get()), 8u + 24 * 2729);
-    EXPECT_EQ(distanceOf(texts[2731].get()), 0u);
+    // The last one that fits in ends 65,536 bytes from the start at the most, after 16 bytes, four digits and a terminator.
+    constexpr size_t kEach = 24 + ObjectBlock::kGap, kFit = (65536 - 8 - 21) / kEach + 1;
+    EXPECT_EQ(distanceOf(texts[kFit - 1].get()), 8 + kEach * (kFit - 1));
+    EXPECT_EQ(distanceOf(texts[kFit].get()), 0u);
     for (int index = 0; index < 10000; ++index)
         EXPECT_TRUE(same(texts[static_cast<size_t>(index)].get(), text(std::to_string(index)).get()));
 }

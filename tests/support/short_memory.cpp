@@ -49,3 +49,20 @@ void operator delete(void *memory, size_t) noexcept
 {
     std::free(memory);
 }
+
+// The forms for arrays are the sanitizer's own where there is one, which does not go through the forms above.
+
+void *operator new[](size_t size)
+{
+    return operator new(size);
+}
+
+void operator delete[](void *memory) noexcept
+{
+    operator delete(memory);
+}
+
+void operator delete[](void *memory, size_t) noexcept
+{
+    operator delete(memory);
+}
