@@ -13,9 +13,6 @@ namespace kavell {
 
 namespace {
 
-/// The longest tick of the kernel's clock, in nanoseconds.
-constexpr int64_t kLongestTick = 10'000'000;
-
 int64_t nanosecondsBetween(const timespec &from, const timespec &to) noexcept
 {
     return (to.tv_sec - from.tv_sec) * 1'000'000'000 + (to.tv_nsec - from.tv_nsec);

@@ -2,12 +2,13 @@
 // SPDX-License-Identifier: LGPL-2.1-or-later
 //
 // A directory of data files as it was when it was listed, for whoever opens all of them: they are looked up from the open
-// directory and not from the root, and only those whose redo record stood there have it looked for. What came to stand there
-// meanwhile shows in the directory's time, which is asked for once, at the end. One thread at a time.
+// directory and not from the root, and only those whose redo record stood there have it looked for. What came to stand
+// there meanwhile shows in the directory's time, which is asked for once, at the end. One thread at a time.
 
 #ifndef KAVELL_PLATFORM_DATA_DIRECTORY_H
 #define KAVELL_PLATFORM_DATA_DIRECTORY_H
 
+#include <cstdint>
 #include <ctime>
 #include <dirent.h>
 #include <memory>
@@ -16,6 +17,9 @@
 #include <unordered_set>
 
 namespace kavell {
+
+/// The longest tick of the kernel's clock of files, in nanoseconds.
+inline constexpr int64_t kLongestTick = 10'000'000;
 
 /// What the name of a data file ends with; a login name stands before it.
 inline constexpr std::string_view kDataFileSuffix = ".plist";
@@ -45,7 +49,8 @@ public:
     /// Whether a data file had no redo record when the directory was listed. Whoever goes by that asks isAsListed later.
     [[nodiscard]] bool hadNoRecordOf(const char *name) const;
 
-    /// Whether every answer of hadNoRecordOf has been true until now, too.
+    /// Whether every answer of hadNoRecordOf has been true until now, too. Where it was sure of nothing they have, whatever
+    /// became of the directory.
     [[nodiscard]] bool isAsListed() const noexcept;
 
     /// From here on hadNoRecordOf is sure of nothing.

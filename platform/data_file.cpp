@@ -459,7 +459,7 @@ bool writeDataFile(const char *path, std::string_view contents, IntactCheck isIn
         for (int attempt = 0; attempt < kMostAttempts; ++attempt) {
             if (const LockedFile file(path, O_RDWR); file)
                 return replaceInPlace(file, path, contents, isIntact, written);
-            if (errno != ENOENT || !createDirectoriesAbove(path))
+            if (errno != ENOENT)
                 return false;
             const Creation creation = createWhole(path, contents, written);
             if (creation != Creation::Exists)

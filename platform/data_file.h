@@ -58,8 +58,8 @@ struct FoundFile {
 /// Says whether bytes are what this kind of file should hold.
 using IntactCheck = bool (*)(std::string_view contents) noexcept;
 
-/// Makes `contents` the file's whole contents, durably, with permissions 0600; creates the file if need be, and the
-/// directories above it (createDirectoriesAbove). A file that `isIntact` does not accept is first kept beside it (damagedCopyPath); when that fails, or
+/// Makes `contents` the file's whole contents, durably, with permissions 0600; creates the file if need be, but not its
+/// directory. A file that `isIntact` does not accept is first kept beside it (damagedCopyPath); when that fails, or
 /// anything else, the file is as before and the result is false.
 /// On success `*written`, unless null, is the modification time that this call gave the file; asked for later, it could be
 /// that of another program's save.

@@ -139,15 +139,16 @@ void deleteDataFile(const CSKavellAccount &account) noexcept
         NotifySendMsg(account);
 }
 
-/// Writes the file under the semaphore. When that cannot be taken nothing is written and nothing more is said.
-void writeUnderSemaphore(CSKavellAccount &account, std::string_view contents) noexcept
+/// Writes the file under the semaphore, where its directory is on the disk. When the semaphore cannot be taken nothing is
+/// written and nothing more is said.
+void writeUnderSemaphore(CSKavellAccount &account, std::string_view contents, bool hasDirectory) noexcept
 {
     struct stat status;
     const bool isNeeded = account.semaphoreID == 0;
     if (!LockDatafileAccess(account, isNeeded && queryStatus(account, status) ? &status : nullptr))
         return;
     // The time is taken while nobody else can write: records of one account may hold different semaphores.
-    if (writeDataFile(account.dataFilePath.get(), contents, isPropertyList, &account.dataFileModTime)) {
+    if (hasDirectory && writeDataFile(account.dataFilePath.get(), contents, isPropertyList, &account.dataFileModTime)) {
         account.hasChanges = false;
     } else {
         writeError("Error: failed to save Kavell Settings datafile\n");
@@ -157,9 +158,13 @@ void writeUnderSemaphore(CSKavellAccount &account, std::string_view contents) no
 
 void saveDataFile(CSKavellAccount &account, CSKavellDictionaryRef propertyList) noexcept
 {
+    struct stat status;
+    bool hasDirectory = true;
+    if (account.dataFilePath && !queryStatus(account, status))
+        hasDirectory = createDirectoriesAbove(account.dataFilePath.get());
     std::string contents;
     if (writePropertyList(propertyList, contents))
-        writeUnderSemaphore(account, contents);
+        writeUnderSemaphore(account, contents, hasDirectory);
     else
         writeError("Error: unable to create XML property list for Kavell Accounts settings - save failed\n");
     // Announced after every attempt, also one that failed: observers reload, and find what there is.
@@ -191,9 +196,10 @@ bool ReadAccountData(CSKavellAccount &account, FoundFile found) noexcept
         return true;
     const auto propertyList = result == FileRead::Done ? parsePropertyList(contents.view()) : nullptr;
     if (!propertyList) {
-        // It may have been torn since the listing, by a program that left a record of what it is to be.
+        // It may have been torn since the listing, by a program that left a record of what it is to be. Whoever listed the
+        // directory reads all anew then, and has it said if it is still so.
         if (directory && !directory->isAsListed())
-            return ReadAccountData(account);
+            return false;
         writeError("Error: failed to load Kavell Accounts settings\n");
         return false;
     }

@@ -129,16 +129,16 @@ void CSKavellAccountProviderLoadAccountData(CSKavellAccountProvider &provider)
     const std::string path = providerDirectoryPath(provider.providerType.get());
     if (path.find('\0') != std::string::npos)
         return;
-    const DataDirectory directory(path.c_str());
+    DataDirectory directory(path.c_str());
     addListedAccounts(provider, directory, path);
     if (directory.isAsListed())
         return;
-    // Another program has come or gone in the directory meanwhile. If it died in the middle of a file, that was read as it
-    // left it, without the record that would mend it.
+    // A name has come or gone in the directory meanwhile. If it was that of a record, by a program that died in the middle
+    // of a file, the file was read as it was left. Where each record is looked for, that does not happen; a file that
+    // cannot be read may be told of twice.
     dropAccounts(provider);
-    DataDirectory anew(path.c_str());
-    anew.doubtListing();
-    addListedAccounts(provider, anew, path);
+    directory.doubtListing();
+    addListedAccounts(provider, directory, path);
 }
 
 }  // namespace

@@ -7,6 +7,7 @@
 #ifndef KAVELL_TESTS_SUPPORT_DIRECTORY_TIME_H
 #define KAVELL_TESTS_SUPPORT_DIRECTORY_TIME_H
 
+#include <chrono>
 #include <cstdint>
 #include <ctime>
 #include <gtest/gtest.h>
@@ -14,9 +15,9 @@
 #include <sys/stat.h>
 #include <thread>
 
-namespace kavell::test {
+#include "platform/data_directory.h"
 
-inline constexpr int64_t kLongestTick = 10'000'000;
+namespace kavell::test {
 
 /// How many nanoseconds the directory's time is in the past, as far as the clock of files tells.
 [[nodiscard]] inline int64_t ageOfDirectory(const std::string &path)
@@ -31,8 +32,11 @@ inline constexpr int64_t kLongestTick = 10'000'000;
 
 inline void letTimePass(const std::string &path)
 {
-    while (ageOfDirectory(path) <= kLongestTick)
+    const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(20);
+    while (ageOfDirectory(path) <= kLongestTick) {
+        ASSERT_LT(std::chrono::steady_clock::now(), deadline) << "the clock of files stands still, or was set back";
         std::this_thread::yield();
+    }
 }
 
 }  // namespace kavell::test
