@@ -9,18 +9,43 @@ namespace kavell::test {
 
 void LoadJudge::begin(size_t account, uint64_t inode)
 {
+    m_accounts[account].names.begin(inode);
     change(m_accounts[account], inode, {});
 }
 
 std::string LoadJudge::follow(const LoadEntry &entry)
 {
-    Process &process = m_processes[entry.process];
+    if (entry.event == LoadEvent::Unused)  // its process was killed before it could write it
+        return {};
     Account &account = m_accounts[entry.account];
+    account.number = entry.account;
+    const std::string complaint = judge(entry, m_processes[entry.process], account);
+    if (account.inode != 0 && !account.names.mayBe(account.inode))
+        removeFile(account);
+    return complaint;
+}
+
+void LoadJudge::died(int32_t process)
+{
+    m_dead.insert(process);
+    for (auto &[number, account] : m_accounts)
+        account.names.died(process);
+}
+
+std::string LoadJudge::judge(const LoadEntry &entry, Process &process, Account &account)
+{
+    // Whatever comes next of a process whose creation or removal succeeded is its word for that.
+    if (entry.event != LoadEvent::Created && entry.event != LoadEvent::Removed) {
+        account.creating.erase(entry.process);
+        if (!account.names.failed(entry.process))
+            return "what failed was done all the same";
+    }
     switch (entry.event) {
-    case LoadEvent::Unused:  // its process was killed before it could write it
+    case LoadEvent::Unused:
         return {};
     case LoadEvent::Forgot:
         process.known.clear();
+        process.knownBefore.clear();
         return {};
     case LoadEvent::WillSave:
     case LoadEvent::WillRemove:
@@ -40,13 +65,11 @@ std::string LoadJudge::follow(const LoadEntry &entry)
     case LoadEvent::Release:
         return release(entry, process, account);
     case LoadEvent::Creating:
-        account.creating[entry.process] = entry;
-        return {};
+        return creating(entry, account);
     case LoadEvent::Created:
         return created(entry, process, account);
     case LoadEvent::Removing:
-        removing(entry, account);
-        return {};
+        return removing(entry, account);
     case LoadEvent::Removed:
         return removed(entry, process, account);
     }
@@ -69,11 +92,10 @@ std::string LoadJudge::done(Process &process, const LoadEntry &entry, Account &a
     const bool wasSave = process.intention == LoadEvent::WillSave;
     process.intention = LoadEvent::Unused;
     account.perhapsTold.erase(entry.process);
-    account.removing.erase(entry.process);
     // A save is told whatever came of it, a removal only when there was something to remove.
     account.told += wasSave || process.isCarriedOut;
     if (!wasSave)
-        process.known.erase(entry.account);  // the worker lets go of the record
+        learn(process, entry.account, {});  // the worker lets go of the record
     if (wasSave && entry.flag != process.isCarriedOut)
         return entry.flag ? "a save came to its end that is in no file" : "a save is in the file and counts as pending";
     return {};
@@ -84,39 +106,54 @@ std::string LoadJudge::seen(const LoadEntry &entry, Process &process)
     ++m_tally.reads;
     if (!entry.flag)
         return "an account could not be loaded";
-    return entry.values == process.known[entry.account].values ? "" : "a record says what its file did not say";
+    const std::vector<Knowledge> possible = possibleKnowledge(process, entry.account);
+    const bool isPossible = std::any_of(possible.begin(), possible.end(),
+                                        [&](const Knowledge &each) { return each.values == entry.values; });
+    return isPossible ? "" : "a record says what its file did not say";
 }
 
-void LoadJudge::status(Process &process, const LoadEntry &entry, const Account &account)
+void LoadJudge::status(Process &process, const LoadEntry &entry, Account &account)
 {
     process.statusVersion = account.version;
-    if (process.intention != LoadEvent::Unused && process.account == entry.account && process.queries++ == 0)
+    process.statusAt = account.names.look();
+    if (process.intention != LoadEvent::Unused && process.account == entry.account && process.queries++ == 0) {
         process.askedVersion = account.version;
+        process.askedAt = process.statusAt;
+    }
 }
 
-std::string LoadJudge::missing(const LoadEntry &entry, Process &process, const Account &account)
+std::string LoadJudge::missing(const LoadEntry &entry, Process &process, Account &account)
 {
     // What the record holds is settled by a commit's first query; later ones ask whether directories are needed.
     const bool isInCommit = process.intention != LoadEvent::Unused && process.account == entry.account;
     if (!isInCommit || process.queries == 1)
-        process.known[entry.account] = {process.statusVersion, {}};
-    const bool wasThereAllTheTime =
-        account.inode != 0 && account.versionOfLatestFile <= process.statusVersion && account.removing.empty();
-    return wasThereAllTheTime ? "a file that is there was not found" : "";
+        learn(process, entry.account, {process.statusVersion, {}});
+    return account.names.missed(process.statusAt) ? "" : "a file that is there was not found";
 }
 
-void LoadJudge::noteKilledHolder(Account &account, uint32_t number)
+/// What the holder's save would leave, one of these; none when there is no holder, or it has no save under way.
+std::vector<LoadValues> LoadJudge::unfinishedSave(const Account &account)
 {
-    const Process &dead = m_processes[account.holder];
+    std::vector<LoadValues> after;
+    if (account.holder == 0)
+        return after;
+    Process &holder = m_processes[account.holder];
+    if (holder.intention != LoadEvent::WillSave || holder.account != account.number || holder.isCarriedOut)
+        return after;
+    for (const Knowledge &base : possibleKnowledge(holder, account.number)) {
+        after.push_back(base.values);
+        after.back()[holder.worker] = holder.number;
+    }
+    return after;
+}
+
+void LoadJudge::noteKilledHolder(Account &account)
+{
+    const std::vector<LoadValues> after = unfinishedSave(account);
+    account.afterKill.insert(account.afterKill.end(), after.begin(), after.end());
     ++m_tally.killedInHold;
     account.holder = 0;
     account.isUnsettled = true;
-    if (dead.intention != LoadEvent::WillSave || dead.account != number || dead.isCarriedOut)
-        return;
-    const auto known = dead.known.find(number);
-    LoadValues after = known == dead.known.end() ? LoadValues{} : known->second.values;
-    after[dead.worker] = dead.number;
-    account.afterKill.push_back(after);
 }
 
 /// What killed holders left has come to rest. Whether it is as before or as after a save of theirs.
@@ -135,144 +172,194 @@ bool LoadJudge::settle(const LoadEntry &entry, Account &account)
     return true;
 }
 
-void LoadJudge::removing(const LoadEntry &entry, Account &account)
-{
-    if (entry.inode != account.inode)
-        finishKilledCreation(entry, account);
-    account.removing.insert(entry.process);
-}
-
-/// A process was killed between giving a new file its name and saying so.
-void LoadJudge::finishKilledCreation(const LoadEntry &entry, Account &account)
+/// The file has been seen of a process that was killed between giving it its name and saying so.
+std::string LoadJudge::finishSilentCreation(const LoadEntry &entry, Account &account)
 {
     const auto creation = std::find_if(account.creating.begin(), account.creating.end(), [&](const auto &each) {
-        return m_killed.contains(each.first) && each.second.inode == entry.inode;
+        return m_silent.contains(each.first) && each.second.inode == entry.inode;
     });
     if (creation == account.creating.end())
-        return;
-    if (account.inode != 0)  // its remover was killed in the same way, or has not come to say so
-        removeFile(account);
-    change(account, entry.inode, creation->second.values);
+        return {};
+    const auto [process, file] = *creation;
     account.creating.erase(creation);
+    if (!m_dead.contains(process) && !account.names.succeeded(process))
+        return "a file was made where there is one";
     ++m_tally.creations;
+    (void)note(account, file.inode, file.values);
+    return {};
 }
 
 std::string LoadJudge::take(const LoadEntry &entry, Account &account)
 {
-    if (entry.inode != account.inode)
-        finishKilledCreation(entry, account);
-    if (entry.inode != account.inode) {
-        const auto deleted = account.deleted.find(entry.inode);
-        if (deleted == account.deleted.end())
-            return "a file that nobody made was opened";
-        return deleted->second.values == entry.values ? "" : "a deleted file changed";
-    }
-    if (account.holder != 0) {
-        if (!m_killed.contains(account.holder))
+    if (entry.inode == account.inode && account.holder != 0) {
+        if (!m_silent.contains(account.holder))
             return "two processes hold a file at once";
-        noteKilledHolder(account, entry.account);
+        account.names.died(account.holder);  // while it lived, nobody else could take the flock
+        noteKilledHolder(account);
     }
+    account.names.taken(entry.process, entry.inode);
+    if (entry.inode != account.inode) {
+        if (std::string complaint = finishSilentCreation(entry, account); !complaint.empty())
+            return complaint;
+    }
+    if (entry.inode != account.inode)
+        return takeDeleted(entry, account);
     account.holder = entry.process;
     if (entry.flag) {
         ++m_tally.recordsMet;
-        return account.isUnsettled ? "" : "there is a redo record, and nobody was killed";
+        return account.isUnsettled || !account.strays.empty() ? "" : "there is a redo record, and nobody was killed";
     }
     return settle(entry, account) ? "" : "a file changed while nobody held it";
 }
 
+std::string LoadJudge::takeDeleted(const LoadEntry &entry, Account &account)
+{
+    const auto deleted = account.deleted.find(entry.inode);
+    if (deleted == account.deleted.end())
+        return "a file that nobody made was opened";
+    auto &[knowledge, afterKill] = deleted->second;
+    if (entry.values == knowledge.values)
+        return {};
+    // Nobody finishes a save that was killed in it, so that it may be torn for those who waited for it.
+    const bool mayChange = !afterKill.empty() || account.names.mayBe(entry.inode);
+    if (std::find(afterKill.begin(), afterKill.end(), entry.values) != afterKill.end())
+        afterKill.clear();
+    knowledge.values = entry.values;
+    return mayChange ? "" : "a deleted file changed";
+}
+
+/// Of two files that were told of late the other one was taken for the later. The file that is there has not changed since.
+void LoadJudge::noteMistake(Account &account, uint64_t inode)
+{
+    const auto deleted = account.deleted.find(inode);
+    if (deleted == account.deleted.end() || !account.names.mayBe(inode))
+        return;
+    account.versionBeforeMistake = deleted->second.knowledge.version;
+    account.versionAfterMistake = account.version;
+}
+
 std::string LoadJudge::judgeSave(const LoadEntry &entry, Process &process, Account &account)
 {
-    const Knowledge &base = process.known[entry.account];
-    LoadValues expected = base.values;
-    expected[entry.worker] = process.number;
-    if (entry.values != expected)
+    const std::vector<Knowledge> possible = possibleKnowledge(process, entry.account);
+    LoadValues expected{};
+    const auto base = std::find_if(possible.begin(), possible.end(), [&](const Knowledge &each) {
+        expected = each.values;
+        expected[entry.worker] = process.number;
+        return entry.values == expected;
+    });
+    if (base == possible.end())
         return "a change was lost or made up";
+    uint64_t asked = process.askedVersion;
+    if (account.versionBeforeMistake < asked && asked <= account.versionAfterMistake)
+        asked = account.versionBeforeMistake;
     // What was deleted before it could be read is not known either.
-    const bool isLatest = base.version >= process.askedVersion || account.versionOfLatestRemoval > process.askedVersion;
+    const bool isLatest = base->version >= asked || account.names.mayHaveBeenMissing(process.askedAt);
     if (process.queries == 0 || !isLatest)
         return "a save was made without reading what another had saved";
-    for (size_t worker = 0; worker < expected.size(); ++worker)
-        m_tally.overwritten += worker != entry.worker && expected[worker] < account.values[worker];
+    if (entry.inode == account.inode) {
+        for (size_t worker = 0; worker < expected.size(); ++worker)
+            m_tally.overwritten += worker != entry.worker && expected[worker] < account.values[worker];
+    }
     ++m_tally.saves;
     process.isCarriedOut = true;
-    change(account, entry.inode, entry.values);
-    process.known[entry.account] = {account.version, account.values};
+    learn(process, entry.account, note(account, entry.inode, entry.values));
     return {};
 }
 
 std::string LoadJudge::release(const LoadEntry &entry, Process &process, Account &account)
 {
+    const bool isOwnSave = process.intention == LoadEvent::WillSave && process.account == entry.account &&
+                           entry.values[entry.worker] == process.number;
+    account.strays.erase(entry.process);
+    if (!account.names.released(entry.process, isOwnSave))
+        return "a save went into a file that had been deleted";
     if (entry.inode != account.inode) {
-        // The moment before is as good for reading. Who wants to write lets go of it and looks anew.
-        if (!entry.isForReading)
-            return {};
-        const auto deleted = account.deleted.find(entry.inode);
-        if (deleted == account.deleted.end())
-            return "a file that nobody made was released";
-        process.known[entry.account] = deleted->second;
-        return {};
+        if (!isOwnSave)
+            return releaseDeleted(entry, process, account);
+        noteMistake(account, entry.inode);
+        return judgeSave(entry, process, account);
     }
     if (account.holder != entry.process)
         return "a file was released by a process that did not hold it";
     account.holder = 0;
-    const bool isOwnSave = process.intention == LoadEvent::WillSave && process.account == entry.account &&
-                           entry.values[entry.worker] == process.number;
-    if (isOwnSave) {
-        // A killed remover's file would have no name by now, and nobody writes to such a one.
-        std::erase_if(account.removing, [&](int32_t remover) { return m_killed.contains(remover); });
+    if (isOwnSave)
         return judgeSave(entry, process, account);
-    }
     if (entry.flag)  // the record is settled in a hold of its own
-        return account.isUnsettled ? "" : "a redo record was left by a process that lives";
+        return account.isUnsettled || !account.strays.empty() ? "" : "a redo record was left by a process that lives";
     if (!settle(entry, account))
         return "a hold changed a file without a save";
-    process.known[entry.account] = {account.version, account.values};
+    std::erase_if(account.strays, [&](int32_t stray) { return m_dead.contains(stray); });
+    // Who wants to write and finds that the file has no name looks anew, too.
+    const bool mayLookAnew = !entry.isForReading && account.names.possible().size() > 1;
+    learn(process, entry.account, {account.version, account.values}, mayLookAnew);
     return {};
+}
+
+/// The moment before is as good for reading. Who wants to write lets go of the file and looks anew.
+std::string LoadJudge::releaseDeleted(const LoadEntry &entry, Process &process, Account &account)
+{
+    if (!entry.isForReading)
+        return {};
+    const auto deleted = account.deleted.find(entry.inode);
+    if (deleted == account.deleted.end())
+        return "a file that nobody made was released";
+    // A redo record is of the file that came after it. Who comes upon it reads that one, which may be gone by then, too.
+    learn(process, entry.account, deleted->second.knowledge, entry.flag);
+    return {};
+}
+
+/// `isPerhaps`: or else it knows what it knew before.
+void LoadJudge::learn(Process &process, uint32_t account, const Knowledge &knowledge, bool isPerhaps)
+{
+    if (isPerhaps)
+        process.knownBefore[account].push_back(process.known[account]);
+    else
+        process.knownBefore.erase(account);
+    process.known[account] = knowledge;
+}
+
+std::vector<LoadJudge::Knowledge> LoadJudge::possibleKnowledge(Process &process, uint32_t account)
+{
+    std::vector<Knowledge> possible{process.known[account]};
+    if (const auto before = process.knownBefore.find(account); before != process.knownBefore.end())
+        possible.insert(possible.end(), before->second.begin(), before->second.end());
+    return possible;
+}
+
+std::string LoadJudge::creating(const LoadEntry &entry, Account &account)
+{
+    // Its number was free, so that a file which had it is gone.
+    std::erase_if(account.creating, [&](const auto &each) { return each.second.inode == entry.inode; });
+    account.deleted.erase(entry.inode);
+    account.creating[entry.process] = entry;
+    return account.names.creating(entry.process, entry.inode) ? "" : "a new file is the one that is there";
 }
 
 std::string LoadJudge::created(const LoadEntry &entry, Process &process, Account &account)
 {
     account.creating.erase(entry.process);
-    std::erase_if(account.creating, [&](const auto &each) { return m_killed.contains(each.first); });
-    // Whoever removed the last file has not come to say so.
-    if (account.inode != 0 && !account.removing.empty())
-        removeFile(account);
-    if (account.inode != 0)
+    if (!account.names.succeeded(entry.process))
         return "a file was made where there is one";
     ++m_tally.creations;
-    const std::string complaint = judgeSave(entry, process, account);
-    if (account.removedEarly.erase(entry.inode) != 0)
-        removeFile(account);
+    return judgeSave(entry, process, account);
+}
+
+std::string LoadJudge::removing(const LoadEntry &entry, Account &account)
+{
+    std::string complaint = entry.inode == account.inode ? "" : finishSilentCreation(entry, account);
+    account.names.removing(entry.process);
     return complaint;
 }
 
 std::string LoadJudge::removed(const LoadEntry &entry, Process &process, Account &account)
 {
-    account.removing.erase(entry.process);
+    if (!account.names.succeeded(entry.process))
+        return "a file was removed where there is none";
     if (process.intention != LoadEvent::WillRemove)
         return "a file was removed by a process that did not want to";
     process.isCarriedOut = true;
     ++m_tally.removals;
-    const uint64_t inode = entry.inode != 0 ? entry.inode : latestFile(account);
-    if (account.inode != 0 && inode == account.inode)
-        removeFile(account);
-    else if (isBeingMade(inode, account))
-        account.removedEarly.insert(inode);
     return {};
-}
-
-bool LoadJudge::isBeingMade(uint64_t inode, const Account &account)
-{
-    return std::any_of(account.creating.begin(), account.creating.end(),
-                       [&](const auto &each) { return each.second.inode == inode; });
-}
-
-/// The file that a remover unlinked who had found none just before.
-uint64_t LoadJudge::latestFile(const Account &account)
-{
-    if (account.inode != 0 || account.creating.empty())
-        return account.inode;
-    return account.creating.begin()->second.inode;
 }
 
 uint32_t LoadJudge::mostNotifications(size_t account)
@@ -284,22 +371,42 @@ std::vector<LoadJudge::Outcome> LoadJudge::outcomes(size_t number)
 {
     Account &account = m_accounts[number];
     if (account.holder != 0)
-        noteKilledHolder(account, static_cast<uint32_t>(number));
-    std::vector<Outcome> all{{account.inode, account.values}};
+        noteKilledHolder(account);
+    std::vector<Outcome> all;
+    for (const uint64_t inode : account.names.possible()) {
+        if (inode == 0 || inode == account.inode)
+            all.push_back({inode, inode == 0 ? LoadValues{} : account.values});
+        else if (const auto deleted = account.deleted.find(inode); deleted != account.deleted.end())
+            all.push_back({inode, deleted->second.knowledge.values});
+    }
     for (const LoadValues &values : account.afterKill)
         all.push_back({account.inode, values});
-    for (const auto &[process, creation] : account.creating)
-        all.push_back({creation.inode, creation.values});
-    if (!account.removing.empty())
-        all.emplace_back();
+    for (const auto &[process, creation] : account.creating) {
+        if (account.names.mayBe(creation.inode))
+            all.push_back({creation.inode, creation.values});
+    }
     return all;
+}
+
+/// A file has been given its contents. Where it may have the name it is the account's, else it is gone before it was told
+/// of. What is known of it then.
+LoadJudge::Knowledge LoadJudge::note(Account &account, uint64_t inode, const LoadValues &values)
+{
+    if (!account.names.mayBe(inode)) {
+        DeletedFile &deleted = account.deleted[inode];
+        deleted.knowledge.values = values;
+        deleted.afterKill.clear();
+        return deleted.knowledge;
+    }
+    if (account.inode != 0 && account.inode != inode)
+        removeFile(account);
+    change(account, inode, values);
+    return {account.version, account.values};
 }
 
 void LoadJudge::change(Account &account, uint64_t inode, const LoadValues &values)
 {
     ++account.version;
-    if (account.inode != inode)
-        account.versionOfLatestFile = account.version;
     account.inode = inode;
     account.values = values;
     account.isUnsettled = false;
@@ -308,9 +415,14 @@ void LoadJudge::change(Account &account, uint64_t inode, const LoadValues &value
 
 void LoadJudge::removeFile(Account &account)
 {
-    account.deleted[account.inode] = {account.version, account.values};
+    DeletedFile &deleted = account.deleted[account.inode];
+    deleted = {{account.version, account.values}, account.afterKill};
+    // A remover that found no file has no flock, and may come upon one that is being saved.
+    const std::vector<LoadValues> after = unfinishedSave(account);
+    deleted.afterKill.insert(deleted.afterKill.end(), after.begin(), after.end());
+    if (!after.empty())
+        account.strays.insert(account.holder);
     change(account, 0, {});
-    account.versionOfLatestRemoval = account.version;
     account.holder = 0;
 }
 

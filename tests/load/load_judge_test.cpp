@@ -4,80 +4,20 @@
 // The judge of the load test, with logs written by hand: it must let pass what the store may do, and notice each thing
 // that it may not do.
 
-#include <gtest/gtest.h>
-
-#include "tests/load/load_judge.h"
+#include "tests/load/load_judge_fixture.h"
 
 namespace kavell::test {
 
 namespace {
 
-constexpr uint64_t kInode = 100, kNewInode = 200;
-constexpr int32_t kAda = 1, kBob = 2;
-
-/// Values of the first two workers.
-LoadValues values(uint32_t first, uint32_t second = 0)
-{
-    LoadValues all{};
-    all[0] = first;
-    all[1] = second;
-    return all;
-}
-
-/// The first complaint of several events. A list is worked off in its order, unlike the operands of "+".
-std::string inTurn(std::initializer_list<std::string> complaints)
-{
-    for (const std::string &complaint : complaints) {
-        if (!complaint.empty())
-            return complaint;
-    }
-    return {};
-}
-
-class LoadJudgeTest : public testing::Test {
-protected:
-    LoadJudgeTest() : LoadJudgeTest(std::set<int32_t>()) {}
-    explicit LoadJudgeTest(std::set<int32_t> killed) : judge(std::move(killed)) { judge.begin(0, kInode); }
-
-    /// Follows an event of a process, which is the worker of the number before its own.
-    std::string event(int32_t process, LoadEvent kind, const LoadValues &values = {}, uint64_t inode = kInode,
-                      bool flag = false, uint32_t number = 0)
-    {
-        LoadEntry entry;
-        entry.event = kind;
-        entry.flag = flag;
-        entry.worker = static_cast<uint16_t>(process - 1);
-        entry.process = process;
-        entry.number = number;
-        entry.isForReading = isReading;
-        entry.inode = inode;
-        entry.values = values;
-        return judge.follow(entry);
-    }
-
-    std::string willSave(int32_t process, uint32_t number)
-    {
-        return inTurn({event(process, LoadEvent::WillSave, {}, 0, false, number), event(process, LoadEvent::Status)});
-    }
-    std::string hold(int32_t process, const LoadValues &before, const LoadValues &after)
-    {
-        return inTurn({event(process, LoadEvent::Take, before), event(process, LoadEvent::Release, after)});
-    }
-    std::string done(int32_t process) { return event(process, LoadEvent::Done, {}, 0, true); }
-
-    bool isReading = true;  ///< whether files are opened for nothing else from now on
-    LoadJudge judge;
-};
-
 class LoadJudgeAfterKills : public LoadJudgeTest {
 protected:
-    LoadJudgeAfterKills() : LoadJudgeTest({kAda}) {}
-
     /// Ada is killed while she writes 5 over nothing.
     void killWriter()
     {
         EXPECT_EQ(
             inTurn({willSave(kAda, 5), hold(kAda, values(0), values(0)), event(kAda, LoadEvent::Take, values(0))}), "");
+        judge.fellSilent(kAda);
     }
 };
 
@@ -309,10 +249,47 @@ TEST_F(LoadJudgeAfterKills, AFileThatItsMakerWasKilledOverIsThereOrNot)
     EXPECT_EQ(inTurn({willSave(kAda, 5), event(kAda, LoadEvent::Missing),
                       event(kAda, LoadEvent::Creating, values(5), kNewInode)}),
               "");
+    judge.fellSilent(kAda);
     EXPECT_EQ(judge.outcomes(0).size(), 2u);
     EXPECT_EQ(event(kBob, LoadEvent::Take, values(5), kNewInode), "");
     EXPECT_EQ(judge.outcomes(0).size(), 1u);
     EXPECT_EQ(judge.outcomes(0)[0].inode, kNewInode);
+}
+
+TEST_F(LoadJudgeAfterKills, AMakerThatIsKilledLaterStillTellsOfItsFile)
+{
+    EXPECT_EQ(
+        inTurn({event(kBob, LoadEvent::WillRemove), event(kBob, LoadEvent::Take), event(kBob, LoadEvent::Removing),
+                event(kBob, LoadEvent::Removed), event(kBob, LoadEvent::Release), done(kBob)}),
+        "");
+    EXPECT_EQ(inTurn({willSave(kAda, 5), event(kAda, LoadEvent::Missing),
+                      event(kAda, LoadEvent::Creating, values(5), kNewInode), event(kBob, LoadEvent::WillRemove),
+                      event(kBob, LoadEvent::Removing, values(5), kNewInode),
+                      event(kBob, LoadEvent::Removed, values(5), kNewInode), done(kBob),
+                      event(kAda, LoadEvent::Created, values(5), kNewInode), done(kAda)}),
+              "");
+    judge.fellSilent(kAda);
+    EXPECT_EQ(judge.outcomes(0)[0].inode, 0u);
+    EXPECT_EQ(inTurn({event(kBob, LoadEvent::Status), event(kBob, LoadEvent::Missing)}), "");
+}
+
+TEST_F(LoadJudgeAfterKills, NoticesAFileInUseWhoseMakerIsYetToTellOfIt)
+{
+    EXPECT_EQ(
+        inTurn({event(kBob, LoadEvent::WillRemove), event(kBob, LoadEvent::Take), event(kBob, LoadEvent::Removing),
+                event(kBob, LoadEvent::Removed), event(kBob, LoadEvent::Release), done(kBob)}),
+        "");
+    EXPECT_EQ(inTurn({willSave(kAda, 5), event(kAda, LoadEvent::Missing),
+                      event(kAda, LoadEvent::Creating, values(5), kNewInode)}),
+              "");
+    EXPECT_EQ(event(kBob, LoadEvent::Take, values(5), kNewInode), "a file that nobody made was opened");
+}
+
+TEST_F(LoadJudgeAfterKills, NoticesTwoHoldersWhoseFirstIsKilledLater)
+{
+    EXPECT_EQ(event(kAda, LoadEvent::Take, values(0)), "");
+    EXPECT_EQ(event(kBob, LoadEvent::Take, values(0)), "two processes hold a file at once");
+    judge.fellSilent(kAda);
 }
 
 }  // namespace kavell::test
