@@ -478,6 +478,10 @@ bool removeDataFile(const char *path) noexcept
         // settled, not only deleted: a power cut may undo the deletion of the file and keep that of the record.
         const std::string recordPath = siblingPath(path, kRedoRecordPrefix);
         const LockedFile file(path, O_RDWR);
+        struct stat status;
+        // One that comes from here on is not the one that was to be removed, and is its maker's to hold.
+        if (!file && errno == ENOENT && lstat(path, &status) != 0)
+            return false;
         const RecordState state = file ? settleRecord(file.get(), recordPath) : RecordState::Unknown;
         // While the file has its name: what stands there after it may be a new file's.
         if (state == RecordState::Void)
