@@ -19,6 +19,21 @@ protected:
             inTurn({willSave(kAda, 5), hold(kAda, values(0), values(0)), event(kAda, LoadEvent::Take, values(0))}), "");
         judge.fellSilent(kAda);
     }
+
+    /// A removal from its beginning to its end.
+    std::string removal(int32_t process)
+    {
+        return inTurn({event(process, LoadEvent::WillRemove), event(process, LoadEvent::Take),
+                       event(process, LoadEvent::Removing), event(process, LoadEvent::Removed),
+                       event(process, LoadEvent::Release), done(process)});
+    }
+
+    /// What comes before a new file with a 5 of Ada's has its name.
+    std::string beginningOfNewFile()
+    {
+        return inTurn({willSave(kAda, 5), event(kAda, LoadEvent::Missing),
+                       event(kAda, LoadEvent::Creating, values(5), kNewInode)});
+    }
 };
 
 }  // namespace
@@ -242,13 +257,8 @@ TEST_F(LoadJudgeAfterKills, NoticesARecordThatIsSettledToAnotherThing)
 
 TEST_F(LoadJudgeAfterKills, AFileThatItsMakerWasKilledOverIsThereOrNot)
 {
-    EXPECT_EQ(
-        inTurn({event(kBob, LoadEvent::WillRemove), event(kBob, LoadEvent::Take), event(kBob, LoadEvent::Removing),
-                event(kBob, LoadEvent::Removed), event(kBob, LoadEvent::Release), done(kBob)}),
-        "");
-    EXPECT_EQ(inTurn({willSave(kAda, 5), event(kAda, LoadEvent::Missing),
-                      event(kAda, LoadEvent::Creating, values(5), kNewInode)}),
-              "");
+    EXPECT_EQ(removal(kBob), "");
+    EXPECT_EQ(beginningOfNewFile(), "");
     judge.fellSilent(kAda);
     EXPECT_EQ(judge.outcomes(0).size(), 2u);
     EXPECT_EQ(event(kBob, LoadEvent::Take, values(5), kNewInode), "");
@@ -258,12 +268,8 @@ TEST_F(LoadJudgeAfterKills, AFileThatItsMakerWasKilledOverIsThereOrNot)
 
 TEST_F(LoadJudgeAfterKills, AMakerThatIsKilledLaterStillTellsOfItsFile)
 {
-    EXPECT_EQ(
-        inTurn({event(kBob, LoadEvent::WillRemove), event(kBob, LoadEvent::Take), event(kBob, LoadEvent::Removing),
-                event(kBob, LoadEvent::Removed), event(kBob, LoadEvent::Release), done(kBob)}),
-        "");
-    EXPECT_EQ(inTurn({willSave(kAda, 5), event(kAda, LoadEvent::Missing),
-                      event(kAda, LoadEvent::Creating, values(5), kNewInode), event(kBob, LoadEvent::WillRemove),
+    EXPECT_EQ(removal(kBob), "");
+    EXPECT_EQ(inTurn({beginningOfNewFile(), event(kBob, LoadEvent::WillRemove),
                       event(kBob, LoadEvent::Removing, values(5), kNewInode),
                       event(kBob, LoadEvent::Removed, values(5), kNewInode), done(kBob),
                       event(kAda, LoadEvent::Created, values(5), kNewInode), done(kAda)}),
@@ -275,13 +281,8 @@ TEST_F(LoadJudgeAfterKills, AMakerThatIsKilledLaterStillTellsOfItsFile)
 
 TEST_F(LoadJudgeAfterKills, NoticesAFileInUseWhoseMakerIsYetToTellOfIt)
 {
-    EXPECT_EQ(
-        inTurn({event(kBob, LoadEvent::WillRemove), event(kBob, LoadEvent::Take), event(kBob, LoadEvent::Removing),
-                event(kBob, LoadEvent::Removed), event(kBob, LoadEvent::Release), done(kBob)}),
-        "");
-    EXPECT_EQ(inTurn({willSave(kAda, 5), event(kAda, LoadEvent::Missing),
-                      event(kAda, LoadEvent::Creating, values(5), kNewInode)}),
-              "");
+    EXPECT_EQ(removal(kBob), "");
+    EXPECT_EQ(beginningOfNewFile(), "");
     EXPECT_EQ(event(kBob, LoadEvent::Take, values(5), kNewInode), "a file that nobody made was opened");
 }
 
