@@ -134,6 +134,12 @@ constexpr std::array kScalarElements{
     ScalarElement{"data", isBase64Text},
 };
 
+/// Whether double quotes stand in pairs. The parser passes over what stands between two, the end of the markup included.
+bool quotesArePaired(std::string_view markup) noexcept
+{
+    return std::ranges::count(markup, '"') % 2 == 0;
+}
+
 /// Walks the markup of a document, counting depth the way the parser recurses. It never takes for a comment or a
 /// section what the parser does not, so that no nesting stays hidden from it.
 class MarkupWalk {
@@ -161,11 +167,21 @@ private:
     bool passMarkup() noexcept
     {
         const char first = m_rest.empty() ? '\0' : m_rest.front();
-        // A declaration is legal before the first element only, where quotes cannot make the parser and this code disagree
-        // about depth; a subset of declarations inside a document type is not needed by any property list.
+        // A declaration is legal before the first element only; a subset of declarations inside a document type is not
+        // needed by any property list.
         if (first == '?')
-            return !m_sawElement && passThrough("?>", 1);
+            return !m_sawElement && passInstruction();
         return first == '!' ? passDeclaration() : passTag();
+    }
+
+    /// An instruction of nothing, "<?>", ends there for the parser, and in XML it does not end there.
+    bool passInstruction() noexcept
+    {
+        const size_t end = m_rest.find("?>");
+        if (end == 0 || end == std::string_view::npos || !quotesArePaired(m_rest.substr(0, end)))
+            return false;
+        m_rest.remove_prefix(end + 2);
+        return true;
     }
 
     bool passDeclaration() noexcept
@@ -189,7 +205,9 @@ private:
     bool passDocumentType() noexcept
     {
         const size_t end = m_rest.find('>');
-        if (end == std::string_view::npos || m_rest.substr(0, end).find_first_of("[<") != std::string_view::npos)
+        const std::string_view declaration = m_rest.substr(0, end);
+        if (end == std::string_view::npos || declaration.find_first_of("[<") != std::string_view::npos ||
+            !quotesArePaired(declaration))
             return false;
         m_rest.remove_prefix(end + 1);
         return true;
@@ -202,6 +220,8 @@ private:
         if (end == std::string_view::npos)
             return false;
         const std::string_view tag = m_rest.substr(0, end);
+        if (!quotesArePaired(tag))
+            return false;
         m_rest.remove_prefix(end + 1);
         if (tag.starts_with('/'))
             return --m_depth >= 0;

@@ -109,6 +109,26 @@ TEST_F(DamagedFile, AMillionLevelsAreRefused)
     expectRefused(propertyList("<key>a</key>" + repeated("<array>", 1000000) + repeated("</array>", 1000000)));
 }
 
+TEST_F(DamagedFile, AMillionLevelsHiddenByWhereMarkupEndsAreRefused)
+{
+    // The parser goes on to where the quotes end, or stops at once, and sees all the levels; who ends the markup elsewhere
+    // sees a comment, a section or an instruction around them.
+    const std::string levels = "<dict><key>a</key>" + repeated("<array>", 1000000);
+    expectRefused("<?a \"?><!--\" ?><plist>" + levels + "--><dict/>");
+    expectRefused("<?><plist>" + levels + "?><dict/>");
+    expectRefused("<!DOCTYPE plist \"><!--\"><plist>" + levels + "--><dict/>");
+    expectRefused("<plist a=\"><b><![CDATA[\">" + levels + "]]></b></plist>");
+}
+
+TEST_F(DamagedFile, QuotesInPairsHideNothing)
+{
+    writeFile(fileOf("ada"), "<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n<!DOCTYPE plist PUBLIC \"a\" \"b\">\n"
+                             "<plist version=\"1.0\" a=\"\"><dict a=\"b\"><key>AccountSettings</key>"
+                             "<dict><key>c</key><string>\"</string></dict></dict></plist>");
+    ASSERT_TRUE(CSKavellAccountLoadData(m_account.get()));
+    EXPECT_TRUE(same(attributes(m_account), dictionary({{"c", text("\"")}})));
+}
+
 TEST_F(DamagedFile, AnEntityThatGrowsWithoutBoundIsRefused)
 {
     std::string entities = "<?xml version=\"1.0\"?>\n<!DOCTYPE plist [\n<!ENTITY a0 \"aaaaaaaaaa\">\n";
