@@ -29,33 +29,46 @@ std::string_view trimmed(std::string_view text) noexcept
     return text.substr(first, text.find_last_not_of(kBlanks) - first + 1);
 }
 
-/// A decimal integer from -2^63 to 2^63 - 1: what can be read and written again unchanged.
-bool isIntegerText(std::string_view text) noexcept
+/// A number's text without the blanks around it and the plus before it.
+std::string_view numberText(std::string_view text) noexcept
 {
     text = trimmed(text);
-    if (text.starts_with('+'))
+    if (text.starts_with('+') && !text.starts_with("+-"))
         text.remove_prefix(1);
-    int64_t value;
+    return text;
+}
+
+template <typename Number> bool isNumber(std::string_view text, Number &value) noexcept
+{
     const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), value);
     return error == std::errc() && end == text.data() + text.size();
 }
 
-bool isRealText(std::string_view text) noexcept
+/// A decimal integer from -2^63 to 2^63 - 1: what can be read and written again unchanged. For the parser, one is octal that
+/// has a zero before its other digits.
+bool isIntegerText(std::string_view text) noexcept
 {
-    text = trimmed(text);
-    if (text.starts_with('+'))
-        text.remove_prefix(1);
-    double value;
-    const auto [end, error] = std::from_chars(text.data(), text.data() + text.size(), value);
-    return error == std::errc() && end == text.data() + text.size() && value - value == 0;
+    text = numberText(text);
+    const std::string_view digits = text.substr(text.starts_with('-') ? 1 : 0);
+    int64_t value;
+    return (digits == "0" || !digits.starts_with('0')) && isNumber(text, value);
 }
 
-/// YYYY-MM-DDTHH:MM:SSZ, an existing date within the range.
+bool isRealText(std::string_view text) noexcept
+{
+    double value;
+    return isNumber(numberText(text), value) && value - value == 0;
+}
+
+/// YYYY-MM-DDTHH:MM:SSZ, an existing date within the range. With many blanks behind it, it is 1970 for the parser.
 bool isDateText(std::string_view text) noexcept
 {
     constexpr std::string_view kForm = "dddd-dd-ddTdd:dd:ddZ";
+    constexpr size_t kLongestWithBlanks = 31;  // behind it, not before it
+    text.remove_prefix(std::min(text.find_first_not_of(kBlanks), text.size()));
+    const bool isShort = text.size() <= kLongestWithBlanks;
     text = trimmed(text);
-    if (text.size() != kForm.size())
+    if (!isShort || text.size() != kForm.size())
         return false;
     for (size_t place = 0; place < kForm.size(); ++place) {
         if (kForm[place] == 'd' ? !isDigit(text[place]) : text[place] != kForm[place])

@@ -184,6 +184,35 @@ TEST_F(DamagedFile, ControlCharactersNeitherCrashNorEmptyTheAccount)
     }
 }
 
+TEST_F(DamagedFile, AValueThatTheParserTakesForAnotherIsRefused)
+{
+    const std::string blanks(12, ' ');
+    for (const std::string &value :
+         {std::string("<integer>0993</integer>"), std::string("<integer>010</integer>"),
+          std::string("<integer> -010 </integer>"), std::string("<integer>+08</integer>"),
+          std::string("<integer>+-5</integer>"), std::string("<integer>-+5</integer>"), std::string("<real>+-5</real>"),
+          std::string("<real>1,5</real>"), "<date>2026-01-31T10:00:00Z" + blanks + "</date>"}) {
+        SCOPED_TRACE(value);
+        expectRefused(accountFile("<key>a</key>" + value));
+    }
+}
+
+TEST_F(DamagedFile, ZerosSignsAndBlanksThatChangeNoValueAreRead)
+{
+    writeFile(
+        fileOf("ada"),
+        accountFile("<key>a</key><integer> 0 </integer><key>b</key><integer>-0</integer><key>c</key><integer>\n+10\n"
+                    "</integer><key>d</key><integer>100</integer><key>e</key><real> +007.50 </real>"
+                    "<key>f</key><date>\n  1970-01-01T00:00:09Z\n  </date>"));
+    ASSERT_TRUE(CSKavellAccountLoadData(m_account.get()));
+    EXPECT_TRUE(same(attributes(m_account), dictionary({{"a", integer(0)},
+                                                        {"b", integer(0)},
+                                                        {"c", integer(10)},
+                                                        {"d", integer(100)},
+                                                        {"e", real(7.5)},
+                                                        {"f", date(9)}})));
+}
+
 TEST_F(DamagedFile, AReferenceToACharacterThatCouldNotBeWrittenAgainIsRefused)
 {
     for (const char *reference : {"&#16;", "&#x1B;", "&#0;", "&#xFFFE;", "&#xFFFF;", "&#xD800;", "&#x110000;", "&#16",
