@@ -66,6 +66,8 @@ constexpr size_t kUsualSixteenths = 11, kLargestBlock = 8 * 1024;
 /// Of how many keys each is compared with each.
 constexpr size_t kMostCompared = 16;
 
+constexpr size_t kKeyTags = sizeof("<key></key>") - 1;
+
 constexpr int kNoDigit = -1;
 
 constexpr int base64Digit(char character) noexcept
@@ -277,7 +279,7 @@ private:
             std::any_of(m_pairs.begin() + static_cast<ptrdiff_t>(first), m_pairs.end(),
                         [](const auto &pair) { return isType(pair.second.get(), kTypeDictionary); });
         auto result = adopt(CSKavellDictionary::make(kObjectIsMutable, count, isTakenApart ? nullptr : &m_block));
-        if (!result || (m_keys += count) > kMostKeys)
+        if (!result || (m_keys += count) > kMostKeys || m_keyText > kMostKeyText)
             return nullptr;
         const bool areDistinct = m_keyMaker.sharesEqualKeys() && count <= kMostCompared && haveDistinctKeys(first);
         for (size_t index = first; index < m_pairs.size(); ++index) {
@@ -307,8 +309,10 @@ private:
     {
         for (passBlanks(); !pass("</dict>"); passBlanks()) {
             std::string_view keyText;
+            const size_t before = m_rest.size();
             if (!pass("<key>") || !text("</key>", keyText))
                 return false;
+            m_keyText += before - m_rest.size() - kKeyTags;
             Value key(m_keyMaker.key(keyText));
             passBlanks();
             Value pairValue = value(depth);
@@ -324,7 +328,7 @@ private:
     std::string m_decoded;
     /// Those of all dictionaries that are not closed yet, so that each is made with exactly the room that it needs.
     std::vector<std::pair<Value, Value>> m_pairs;
-    size_t m_keys = 0;
+    size_t m_keys = 0, m_keyText = 0;
     KeyMaker m_keyMaker;
     ObjectBlock m_block;
 };

@@ -35,7 +35,10 @@ public:
         static_cast<void>(line(depth, "<dict>"));
         bool isPlain = true;
         dictionary->forEach([&](CSKavellTypeRef key, CSKavellTypeRef each) {
-            isPlain = isPlain && element(depth + 1, "<key>", key, "</key>") && value(each, depth + 1);
+            const size_t before = m_xml.size();
+            isPlain = isPlain && element(depth + 1, "<key>", key, "</key>");
+            m_keyText += m_xml.size() - before;
+            isPlain = isPlain && m_keyText <= kMostKeyText && value(each, depth + 1);
         });
         return isPlain && line(depth, "</dict>");
     }
@@ -120,7 +123,7 @@ private:
     }
 
     std::string &m_xml;
-    size_t m_keys = 0;
+    size_t m_keys = 0, m_keyText = 0;
 };
 
 }  // namespace

@@ -175,7 +175,7 @@ public:
         if (!whole)
             return nullptr;
         dictionary->forEach([&](CSKavellTypeRef key, CSKavellTypeRef value) {
-            whole = whole && ++m_keys <= kMostKeys && isPlainText(key);
+            whole = whole && ++m_keys <= kMostKeys && isPlainText(key) && hasRoomFor(key);
             PlistNode node = whole ? object(value, depth) : nullptr;
             whole = whole && node;
             if (whole)
@@ -256,6 +256,17 @@ private:
         return PlistNode(plist_new_data(reinterpret_cast<const char *>(CSKavellDataGetBytes(data)), length));
     }
 
+    /// Whether the keys, as they will be written, stay within kMostKeyText with this one.
+    [[nodiscard]] bool hasRoomFor(CSKavellTypeRef key) noexcept
+    {
+        constexpr size_t kLongestReference = sizeof("&amp;") - 1;
+        const std::string_view text = static_cast<CSKavellStringRef>(key)->view();
+        const auto references =
+            std::ranges::count_if(text, [](char each) { return each == '&' || each == '<' || each == '>'; });
+        m_keyText += text.size() + static_cast<size_t>(references) * (kLongestReference - 1);
+        return m_keyText <= kMostKeyText;
+    }
+
     [[nodiscard]] static bool isPlainText(CSKavellTypeRef value) noexcept
     {
         if (!isType(value, kTypeString))
@@ -265,16 +276,63 @@ private:
     }
 
     size_t m_values = 0;
-    size_t m_keys = 0;
+    size_t m_keys = 0, m_keyText = 0;
 };
 
 // The top-level dictionary stands in the document's root element.
 constexpr int kRootDepth = 2;
 
-PlistNode parsedTree(std::string_view xml) noexcept
+/// How long the piece of markup is that a checked document begins with.
+size_t lengthOfMarkup(std::string_view xml) noexcept
+{
+    const std::string_view end = xml.starts_with("<!--")  ? "-->"
+                                 : xml.starts_with("<![") ? "]]>"
+                                 : xml.starts_with("<?")  ? "?>"
+                                                          : ">";
+    const size_t begin = end == ">" ? 1 : end == "-->" ? 4 : 2;
+    return std::min(xml.find(end, begin), xml.size() - end.size()) + end.size();
+}
+
+/// How much of a text, which its end or markup ends, the parser shall see as one part.
+size_t lengthOfPart(std::string_view text) noexcept
+{
+    constexpr int kMostReferences = 256;
+    size_t place = 0;
+    for (int references = 0; references < kMostReferences; ++references) {
+        const size_t next = text.find('&', place);
+        if (next == std::string_view::npos)
+            return text.size();
+        place = text.find(';', next) + 1;
+    }
+    return place;
+}
+
+/// A checked document with empty comments that part its texts behind every so many references. For each reference, the
+/// parser moves what follows it in its part of the text, which would take an hour for the largest text of them.
+std::string withTextsInParts(std::string_view xml)
+{
+    std::string parted;
+    parted.reserve(xml.size() + xml.size() / 64);
+    while (!xml.empty()) {
+        const bool isMarkup = xml.front() == '<';
+        const std::string_view text = xml.substr(0, xml.find('<'));
+        const size_t length = isMarkup ? lengthOfMarkup(xml) : lengthOfPart(text);
+        parted.append(xml.substr(0, length));
+        if (!isMarkup && length < text.size())
+            parted.append("<!---->");
+        xml.remove_prefix(length);
+    }
+    return parted;
+}
+
+PlistNode parsedTree(std::string_view xml)
 {
     if (xml.empty() || xml.size() > kLargestDataFile || !isSafePropertyList(xml))
         return nullptr;
+    constexpr ptrdiff_t kManyReferences = 1024;
+    std::string parted;
+    if (std::ranges::count(xml, '&') > kManyReferences)
+        xml = parted = withTextsInParts(xml);
     const CLocaleScope locale;
     plist_t root = nullptr;
     plist_from_xml(xml.data(), static_cast<uint32_t>(xml.size()), &root);

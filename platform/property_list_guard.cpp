@@ -116,23 +116,37 @@ constexpr bool isXMLCharacter(uint32_t character) noexcept
            (character >= 0xE000 && character <= 0xFFFD) || (character >= 0x10000 && character <= 0x10FFFF);
 }
 
-constexpr std::string_view kReference = "&#";
+/// Whether a text refers to a character that XML has, by its number; what the parser made of others could not be written
+/// again.
+bool isCharacterReference(std::string_view text) noexcept
+{
+    if (!text.starts_with('#'))
+        return false;
+    const bool isHexadecimal = text.starts_with("#x");
+    text.remove_prefix(isHexadecimal ? 2 : 1);
+    uint32_t character = 0;
+    const auto [end, error] =
+        std::from_chars(text.data(), text.data() + text.size(), character, isHexadecimal ? 16 : 10);
+    return error == std::errc() && end != text.data() + text.size() && *end == ';' && isXMLCharacter(character);
+}
 
-/// Whether all references to characters by number are well-formed and to such characters. What the parser made of others
-/// could not be written again.
+/// Whether each ampersand begins a reference. For the parser, one goes on to the next semicolon, however far that is.
 bool referencesAreSound(std::string_view text) noexcept
 {
-    for (size_t next; (next = text.find(kReference)) != std::string_view::npos;) {
-        text.remove_prefix(next + kReference.size());
-        const bool isHexadecimal = text.starts_with('x');
-        text.remove_prefix(isHexadecimal ? 1 : 0);
-        uint32_t character = 0;
-        const auto [end, error] =
-            std::from_chars(text.data(), text.data() + text.size(), character, isHexadecimal ? 16 : 10);
-        if (error != std::errc() || end == text.data() + text.size() || *end != ';' || !isXMLCharacter(character))
+    constexpr std::array<std::string_view, 5> kNames{"amp;", "lt;", "gt;", "quot;", "apos;"};
+    for (size_t next; (next = text.find('&')) != std::string_view::npos;) {
+        text.remove_prefix(next + 1);
+        const bool isName =
+            std::ranges::any_of(kNames, [text](std::string_view name) { return text.starts_with(name); });
+        if (!isName && !isCharacterReference(text))
             return false;
     }
     return true;
+}
+
+bool isBlank(std::string_view text) noexcept
+{
+    return text.find_first_not_of(kBlanks) == std::string_view::npos;
 }
 
 struct ScalarElement {
@@ -141,41 +155,55 @@ struct ScalarElement {
 };
 
 constexpr std::array kScalarElements{
-    ScalarElement{"integer", isIntegerText},
-    ScalarElement{"real", isRealText},
-    ScalarElement{"date", isDateText},
-    ScalarElement{"data", isBase64Text},
+    ScalarElement{"integer", isIntegerText}, ScalarElement{"real", isRealText}, ScalarElement{"date", isDateText},
+    ScalarElement{"data", isBase64Text},     ScalarElement{"true", isBlank},    ScalarElement{"false", isBlank},
 };
 
-/// Whether double quotes stand in pairs. The parser passes over what stands between two, the end of the markup included.
+constexpr bool isContainer(std::string_view name) noexcept
+{
+    return name == "dict" || name == "array";
+}
+
+/// Whether quotes stand in pairs. The parser passes over what stands between two double ones, the end of the markup
+/// included; XML does so for single ones too.
 bool quotesArePaired(std::string_view markup) noexcept
 {
-    return std::ranges::count(markup, '"') % 2 == 0;
+    return std::ranges::count(markup, '"') % 2 == 0 && std::ranges::count(markup, '\'') % 2 == 0;
 }
 
 /// Walks the markup of a document, counting depth the way the parser recurses. It never takes for a comment or a
-/// section what the parser does not, so that no nesting stays hidden from it.
+/// section what the parser does not, so that no nesting stays hidden from it, and it lets no element stand where the parser
+/// would leave it out or take it for another.
 class MarkupWalk {
 public:
     explicit MarkupWalk(std::string_view xml) noexcept
-        : m_rest(xml), m_hasReferences(xml.find(kReference) != std::string_view::npos)
+        : m_rest(xml), m_hasReferences(xml.find('&') != std::string_view::npos)
     {
     }
 
     [[nodiscard]] bool isSafe() noexcept
     {
         for (size_t next; (next = m_rest.find('<')) != std::string_view::npos;) {
-            if (m_hasReferences && !referencesAreSound(m_rest.substr(0, next)))
+            if (!isSound(m_rest.substr(0, next)))
                 return false;
             m_rest.remove_prefix(next + 1);
             if (!passMarkup())
                 return false;
         }
         // The parser would make do with a file that was cut off; here it must have been closed to its last element.
-        return m_sawElement && m_depth == 0;
+        return m_sawRoot && m_depth == 0 && isBlank(m_rest);
     }
 
 private:
+    /// What an open element may have in it next.
+    enum class Next : uint8_t { Anything, Key, Value };
+
+    /// Whether a text between two pieces of markup may stand there.
+    [[nodiscard]] bool isSound(std::string_view text) const noexcept
+    {
+        return (m_depth > m_depthOfRoot || isBlank(text)) && (!m_hasReferences || referencesAreSound(text));
+    }
+
     /// Passes what begins after a "<".
     bool passMarkup() noexcept
     {
@@ -228,44 +256,92 @@ private:
 
     bool passTag() noexcept
     {
-        m_sawElement = true;
         const size_t end = m_rest.find('>');
         if (end == std::string_view::npos)
             return false;
-        const std::string_view tag = m_rest.substr(0, end);
+        std::string_view tag = m_rest.substr(0, end);
         if (!quotesArePaired(tag))
             return false;
-        m_rest.remove_prefix(end + 1);
+        const bool isFirst = !m_sawElement;
+        m_sawElement = true;
         if (tag.starts_with('/'))
-            return --m_depth >= 0;
-        if (tag.ends_with('/'))
-            return true;
+            return passEnd(tag);
+        m_rest.remove_prefix(end + 1);
+        const bool isEmpty = tag.ends_with('/');
+        tag.remove_suffix(isEmpty ? 1 : 0);
         const std::string_view name = tag.substr(0, tag.find_first_of(kBlanks));
-        if (name == "key" && ++m_keys > kMostKeys)
-            return false;
-        return ++m_depth <= kDeepestPropertyList && scalarIsWellFormed(name);
+        if (name == "plist") {
+            m_depth = m_depthOfRoot = 1;
+            return isFirst && !isEmpty;
+        }
+        return mayStandHere(name) && (isEmpty ? mayBeEmpty(name) : open(name));
     }
 
-    /// Whether the text that follows an opened element fits it.
-    [[nodiscard]] bool scalarIsWellFormed(std::string_view name) const noexcept
+    bool passEnd(std::string_view tag) noexcept
     {
-        // Most elements are keys and strings.
-        if (name == "key" || name == "string")
-            return true;
+        if (m_depth == 0 || m_next[m_depth] == Next::Value || (m_depth == m_depthOfRoot && trimmed(tag) != "/plist"))
+            return false;
+        if (m_key)
+            m_keyText += static_cast<size_t>(tag.data() - m_key);
+        m_key = nullptr;
+        m_rest.remove_prefix(tag.size() + 1);
+        --m_depth;
+        return m_keyText <= kMostKeyText;
+    }
+
+    /// Whether an element may stand in the one that is open: there is one root, a dictionary has keys and values by turns,
+    /// and the writer could write it at this depth.
+    [[nodiscard]] bool mayStandHere(std::string_view name) noexcept
+    {
+        const bool isKey = name == "key", isRoot = m_depth == m_depthOfRoot;
+        Next &next = m_next[m_depth];
+        if ((isRoot && m_sawRoot) || isKey != (next == Next::Key) || (isKey && ++m_keys > kMostKeys))
+            return false;
+        m_sawRoot = true;
+        if (next != Next::Anything)
+            next = isKey ? Next::Value : Next::Key;
+        // A document may do without its outermost element, which the writer writes.
+        const int depth = m_depth + 2 - m_depthOfRoot;
+        return depth < kDeepestPropertyList || (depth == kDeepestPropertyList && !isContainer(name));
+    }
+
+    [[nodiscard]] static const ScalarElement *scalarOf(std::string_view name) noexcept
+    {
         const auto *element = std::find_if(kScalarElements.begin(), kScalarElements.end(),
                                            [name](const ScalarElement &each) { return each.name == name; });
-        if (element == kScalarElements.end())
+        return element == kScalarElements.end() ? nullptr : element;
+    }
+
+    /// The parser makes a number or a date up for an empty element, and takes an empty key for a value.
+    [[nodiscard]] static bool mayBeEmpty(std::string_view name) noexcept
+    {
+        const ScalarElement *const scalar = scalarOf(name);
+        return name != "key" && (!scalar || scalar->isText({}));
+    }
+
+    /// Opens an element, and answers whether the text that follows fits it.
+    [[nodiscard]] bool open(std::string_view name) noexcept
+    {
+        m_next[++m_depth] = name == "dict" ? Next::Key : Next::Anything;
+        if (name == "key")
+            m_key = m_rest.data();
+        // Most elements are keys and strings.
+        const ScalarElement *const scalar = name == "key" || name == "string" ? nullptr : scalarOf(name);
+        if (!scalar)
             return true;
         const size_t end = m_rest.find('<');
         return end != std::string_view::npos && m_rest.substr(end).starts_with("</") &&
-               element->isText(m_rest.substr(0, end));
+               scalar->isText(m_rest.substr(0, end));
     }
 
     std::string_view m_rest;
     const bool m_hasReferences;  // hardly any document has some
     int m_depth = 0;
-    size_t m_keys = 0;
-    bool m_sawElement = false;
+    int m_depthOfRoot = 0;  // of what the root stands in
+    std::array<Next, kDeepestPropertyList + 1> m_next{};
+    const char *m_key = nullptr;  // the text of an open one
+    size_t m_keys = 0, m_keyText = 0;
+    bool m_sawElement = false, m_sawRoot = false;
 };
 
 bool hasControlCharacter(std::string_view text) noexcept

@@ -21,9 +21,11 @@ inline constexpr size_t kLargestPropertyList = size_t{32} << 20;
 /// leaves room on the smallest thread stacks in use.
 inline constexpr int kDeepestPropertyList = 256;
 
-/// How many keys all dictionaries of a document may have together. The parser looks keys up by a hash that is easy to make
-/// collide, in time that grows with the square of their number; this many take a second at the worst.
+/// How many keys all dictionaries of a document may have together, and how many bytes as they are written. The parser looks
+/// keys up by a hash that is easy to make collide, in time that grows with the square of their number and with their length;
+/// these take two seconds at the worst.
 inline constexpr size_t kMostKeys = 10000;
+inline constexpr size_t kMostKeyText = size_t{1} << 20;
 
 /// The first and the last second since 1970 that a property list keeps: 32-bit seconds around 2001-01-01.
 inline constexpr int64_t kPropertyListEpoch = 978307200;
@@ -31,8 +33,9 @@ inline constexpr int64_t kEarliestDate = kPropertyListEpoch + INT32_MIN;
 inline constexpr int64_t kLatestDate = kPropertyListEpoch + INT32_MAX;
 
 /// Whether the text may be handed to the parser: UTF-8 of characters that can be written again (isXMLText), be they
-/// written out or references, elements that are all closed and no deeper than kDeepestPropertyList, at most kMostKeys keys,
-/// no document-type subset, and only well-formed references, numbers, dates and data within their ranges.
+/// written out or references, one root, elements that are all closed, in their places and no deeper than
+/// kDeepestPropertyList, at most kMostKeys keys of kMostKeyText bytes, no document-type subset, and only well-formed
+/// references, numbers, dates and data within their ranges. What passes can be written again, unless it grows too large.
 [[nodiscard]] bool isSafePropertyList(std::string_view xml) noexcept;
 
 /// Whether a string can stand in an XML document: without control characters but for tab, line feed and carriage

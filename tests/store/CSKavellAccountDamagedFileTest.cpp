@@ -197,6 +197,101 @@ TEST_F(DamagedFile, AValueThatTheParserTakesForAnotherIsRefused)
     }
 }
 
+TEST_F(DamagedFile, AnAmpersandThatBeginsNoReferenceIsRefused)
+{
+    for (const char *characters : {"Tom &amp Jerry; x", "&ampere;", "&lthello;", "&unknown;", "a &", "&;", "& amp;",
+                                   "&<!-- -->lt;", "&am<!-- -->p;", "&AMP;"}) {
+        SCOPED_TRACE(characters);
+        expectRefused(accountFile("<key>a</key><string>" + std::string(characters) + "</string>"));
+        expectRefused(accountFile("<key>a" + std::string(characters) + "</key><string>x</string>"));
+    }
+}
+
+TEST_F(DamagedFile, WhatWouldBeLeftOutIsRefused)
+{
+    const std::string dictionary = "<dict><key>UUID</key><string>x</string></dict>";
+    for (const std::string &document : std::vector<std::string>{
+             "<plist><dict/><key>a</key><string>b</string></plist>",
+             "<plist><dict/></plist><key>a</key><string>b</string>",
+             "<plist>" + dictionary + dictionary + "</plist>",
+             dictionary + dictionary,
+             "<plist>" + dictionary + "</plist>" + dictionary,
+             "<plist>" + dictionary + "x</plist>",
+             "<plist>" + dictionary + "</plist>x",
+             "x<plist>" + dictionary + "</plist>",
+             "<plist>" + dictionary + "</foo>",
+             "<plist><plist>" + dictionary + "</plist></plist>",
+         }) {
+        SCOPED_TRACE(document);
+        expectRefused(document);
+    }
+    for (const char *entries :
+         {"<key>a</key>", "<key>a</key><key>b</key><string>x</string>", "<string>x</string>", "<key>a</key><key/>",
+          "<key>a</key><array><key>z</key></array>", "<key/><string>x</string>", "<key>a</key><true>false</true>",
+          "<key>a</key><true><![CDATA[x]]></true>", "<key>a</key><plist><string>x</string></plist>",
+          "<key>a</key><integer/>", "<key>a</key><integer value=\"7\" />", "<key>a</key><real/>", "<key>a</key><date/>",
+          "<key>a</key><string b='>'>x</string>"}) {
+        SCOPED_TRACE(entries);
+        expectRefused(accountFile(entries));
+    }
+}
+
+TEST_F(DamagedFile, ADepthThatCouldNotBeWrittenAgainIsRefused)
+{
+    // The root, AccountSettings and the arrays are containers of levels 2 to 255; one more could hold nothing.
+    const auto contents = [](int arrays, std::string_view deepest) {
+        return accountFile("<key>a</key>" + repeated("<array>", arrays) + std::string(deepest) +
+                           repeated("</array>", arrays));
+    };
+    for (const char *deepest : {"<dict/>", "<array/>", "<dict></dict>", "<array><true/></array>"}) {
+        SCOPED_TRACE(deepest);
+        expectRefused(contents(252, deepest));
+    }
+    writeFile(fileOf("ada"), contents(252, "<true/>"));
+    ASSERT_TRUE(CSKavellAccountLoadData(m_account.get()));
+    setAttribute(m_account, "b", integer(4));
+    commit(m_account);
+    EXPECT_FALSE(hasPendingChanges(m_account));
+    EXPECT_TRUE(same(attribute(openAccount("ada"), "b"), integer(4)));
+}
+
+TEST_F(DamagedFile, ManyReferencesInOneTextAreReadAsOne)
+{
+    // Four million of them would be ten minutes' work for the parser, were they one part of the text for it.
+    const std::string lesses = repeated("&lt;", 1 << 22);
+    writeFile(fileOf("ada"),
+              accountFile("<key>a</key><real>1.5</real><!-- > &amp; --><key>b</key><string>" + lesses +
+                          "<![CDATA[ > &amp; ]]>" + repeated("&#65;b&gt;", 1000) + "<!-- & -->z</string>"));
+    ASSERT_TRUE(CSKavellAccountLoadData(m_account.get()));
+    EXPECT_TRUE(
+        same(attribute(m_account, "b"), text(std::string(1 << 22, '<') + " > &amp; " + repeated("Ab>", 1000) + "z")));
+}
+
+TEST_F(DamagedFile, KeysOfMoreThanAMebibyteAreNeitherReadNorWritten)
+{
+    const std::string half(1 << 19, 'k');
+    for (const char *value : {"<true/>", "<real>1</real>"}) {
+        SCOPED_TRACE(value);
+        expectRefused(accountFile("<key>a" + half + "</key>" + value + "<key>b" + half + "</key>" + value));
+        writeFile(fileOf("ada"), accountFile("<key>" + half + "</key>" + value));
+        ASSERT_TRUE(CSKavellAccountLoadData(m_account.get()));
+        setAttribute(m_account, "b" + half, integer(1));
+        StandardErrorCapture capture;
+        commit(m_account);
+        EXPECT_NE(capture.take(), "");
+        EXPECT_TRUE(hasPendingChanges(m_account));
+        setAttribute(m_account, "b" + half, nullptr);
+        setAttribute(m_account, "c", integer(1));
+        commit(m_account);
+        EXPECT_FALSE(hasPendingChanges(m_account));
+        EXPECT_TRUE(same(attribute(openAccount("ada"), "c"), integer(1)));
+        writeFile(fileOf("ada"),
+                  accountFile("<key>a</key><integer>1</integer>",
+                              "<key>com.corvane.service.Mail</key><dict><key>port</key><integer>25</integer></dict>"));
+        m_account = openAccount("ada");
+    }
+}
+
 TEST_F(DamagedFile, ZerosSignsAndBlanksThatChangeNoValueAreRead)
 {
     writeFile(
