@@ -7,8 +7,6 @@
 #ifndef KAVELL_TESTS_SUPPORT_LOG_CAPTURE_H
 #define KAVELL_TESTS_SUPPORT_LOG_CAPTURE_H
 
-#include <mutex>
-
 #include <QtCore/QStringList>
 #include <QtCore/QtGlobal>
 
@@ -28,7 +26,6 @@ public:
 private:
     static void take(QtMsgType type, const QMessageLogContext &context, const QString &message);
     QtMessageHandler m_previous;
-    mutable std::mutex m_mutex;
     QStringList m_messages;
 };
 
