@@ -282,7 +282,7 @@ private:
         if (m_depth == 0 || m_next[m_depth] == Next::Value || (m_depth == m_depthOfRoot && trimmed(tag) != "/plist"))
             return false;
         if (m_key)
-            m_keyText += static_cast<size_t>(tag.data() - m_key);
+            m_keyText += static_cast<size_t>(tag.data() - m_key) - 1;  // without the "<" of this tag
         m_key = nullptr;
         m_rest.remove_prefix(tag.size() + 1);
         --m_depth;

@@ -4,6 +4,7 @@
 // Damaged and hostile data files: no crash, no hang, no account emptied, and no damaged file lost to a save.
 
 #include <fcntl.h>
+#include <filesystem>
 #include <functional>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -289,6 +290,27 @@ TEST_F(DamagedFile, KeysOfMoreThanAMebibyteAreNeitherReadNorWritten)
                   accountFile("<key>a</key><integer>1</integer>",
                               "<key>com.corvane.service.Mail</key><dict><key>port</key><integer>25</integer></dict>"));
         m_account = openAccount("ada");
+    }
+}
+
+TEST_F(DamagedFile, TheLongestKeyThatIsWrittenIsRead)
+{
+    const StandardErrorCapture capture;
+    for (const Value &value : {Value(integer(1)), Value(real(1.5))}) {
+        const auto isWritten = [&](size_t length) {
+            std::filesystem::remove(fileOf("long"));
+            const Account account = openAccount("long");
+            setAttribute(account, std::string(length, 'k'), value);
+            commit(account);
+            return !hasPendingChanges(account);
+        };
+        size_t refused = size_t{1} << 20, written = refused - 1024;  // the account has other keys
+        while (refused - written > 1) {
+            const size_t middle = (written + refused) / 2;
+            (isWritten(middle) ? written : refused) = middle;
+        }
+        ASSERT_TRUE(isWritten(written));
+        EXPECT_TRUE(same(attribute(openAccount("long"), std::string(written, 'k')), value));
     }
 }
 
