@@ -256,7 +256,7 @@ private:
         return PlistNode(plist_new_data(reinterpret_cast<const char *>(CSKavellDataGetBytes(data)), length));
     }
 
-    /// Whether the keys, as they will be written, stay within kMostKeyText with this one.
+    /// Whether the keys stay within kMostKeyText with this one, however its characters will be written.
     [[nodiscard]] bool hasRoomFor(CSKavellTypeRef key) noexcept
     {
         constexpr size_t kLongestReference = sizeof("&amp;") - 1;
@@ -282,7 +282,7 @@ private:
 // The top-level dictionary stands in the document's root element.
 constexpr int kRootDepth = 2;
 
-/// How long the piece of markup is that a checked document begins with.
+/// How long the piece of markup is that the rest of a checked document begins with; 0 when there is none left.
 size_t lengthOfMarkup(std::string_view xml) noexcept
 {
     const std::string_view end = xml.starts_with("<!--")  ? "-->"
@@ -290,10 +290,11 @@ size_t lengthOfMarkup(std::string_view xml) noexcept
                                  : xml.starts_with("<?")  ? "?>"
                                                           : ">";
     const size_t begin = end == ">" ? 1 : end == "-->" ? 4 : 2;
-    return std::min(xml.find(end, begin), xml.size() - end.size()) + end.size();
+    const size_t found = xml.find(end, begin);
+    return found == std::string_view::npos ? xml.size() : found + end.size();
 }
 
-/// How much of a text, which its end or markup ends, the parser shall see as one part.
+/// How much of a text the parser shall see as one part.
 size_t lengthOfPart(std::string_view text) noexcept
 {
     constexpr int kMostReferences = 256;
@@ -314,13 +315,13 @@ std::string withTextsInParts(std::string_view xml)
     std::string parted;
     parted.reserve(xml.size() + xml.size() / 64);
     while (!xml.empty()) {
-        const bool isMarkup = xml.front() == '<';
-        const std::string_view text = xml.substr(0, xml.find('<'));
-        const size_t length = isMarkup ? lengthOfMarkup(xml) : lengthOfPart(text);
-        parted.append(xml.substr(0, length));
-        if (!isMarkup && length < text.size())
-            parted.append("<!---->");
-        xml.remove_prefix(length);
+        std::string_view text = xml.substr(0, xml.find('<'));
+        xml.remove_prefix(text.size());
+        for (size_t length; (length = lengthOfPart(text)) < text.size(); text.remove_prefix(length))
+            parted.append(text.substr(0, length)).append("<!---->");
+        const size_t markup = lengthOfMarkup(xml);
+        parted.append(text).append(xml.substr(0, markup));
+        xml.remove_prefix(markup);
     }
     return parted;
 }

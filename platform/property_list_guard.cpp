@@ -262,11 +262,11 @@ private:
         std::string_view tag = m_rest.substr(0, end);
         if (!quotesArePaired(tag))
             return false;
+        m_rest.remove_prefix(end + 1);
         const bool isFirst = !m_sawElement;
         m_sawElement = true;
         if (tag.starts_with('/'))
-            return passEnd(tag);
-        m_rest.remove_prefix(end + 1);
+            return close(tag);
         const bool isEmpty = tag.ends_with('/');
         tag.remove_suffix(isEmpty ? 1 : 0);
         const std::string_view name = tag.substr(0, tag.find_first_of(kBlanks));
@@ -274,28 +274,28 @@ private:
             m_depth = m_depthOfRoot = 1;
             return isFirst && !isEmpty;
         }
-        return mayStandHere(name) && (isEmpty ? mayBeEmpty(name) : open(name));
+        return place(name) && (isEmpty ? mayBeEmpty(name) : open(name));
     }
 
-    bool passEnd(std::string_view tag) noexcept
+    /// Closes the element that is open.
+    [[nodiscard]] bool close(std::string_view tag) noexcept
     {
         if (m_depth == 0 || m_next[m_depth] == Next::Value || (m_depth == m_depthOfRoot && trimmed(tag) != "/plist"))
             return false;
         if (m_key)
             m_keyText += static_cast<size_t>(tag.data() - m_key) - 1;  // without the "<" of this tag
         m_key = nullptr;
-        m_rest.remove_prefix(tag.size() + 1);
         --m_depth;
         return m_keyText <= kMostKeyText;
     }
 
-    /// Whether an element may stand in the one that is open: there is one root, a dictionary has keys and values by turns,
-    /// and the writer could write it at this depth.
-    [[nodiscard]] bool mayStandHere(std::string_view name) noexcept
+    /// Puts an element into the one that is open, and answers whether it may stand there: there is one root, a dictionary has
+    /// keys and values by turns, and the writer could write it at this depth.
+    [[nodiscard]] bool place(std::string_view name) noexcept
     {
-        const bool isKey = name == "key", isRoot = m_depth == m_depthOfRoot;
+        const bool isKey = name == "key";
         Next &next = m_next[m_depth];
-        if ((isRoot && m_sawRoot) || isKey != (next == Next::Key) || (isKey && ++m_keys > kMostKeys))
+        if ((m_sawRoot && m_depth <= m_depthOfRoot) || isKey != (next == Next::Key) || (isKey && ++m_keys > kMostKeys))
             return false;
         m_sawRoot = true;
         if (next != Next::Anything)

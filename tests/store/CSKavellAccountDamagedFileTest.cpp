@@ -21,7 +21,9 @@ namespace {
 /// A record that has read a good file, whose file is then damaged.
 class DamagedFile : public StoreTest {
 protected:
-    DamagedFile()
+    DamagedFile() { openGoodFile(); }
+
+    void openGoodFile()
     {
         writeFile(fileOf("ada"),
                   accountFile("<key>a</key><integer>1</integer>",
@@ -217,6 +219,7 @@ TEST_F(DamagedFile, WhatWouldBeLeftOutIsRefused)
              "<plist>" + dictionary + dictionary + "</plist>",
              dictionary + dictionary,
              "<plist>" + dictionary + "</plist>" + dictionary,
+             "<plist>" + dictionary + "</plist><dict/>",
              "<plist>" + dictionary + "x</plist>",
              "<plist>" + dictionary + "</plist>x",
              "x<plist>" + dictionary + "</plist>",
@@ -286,10 +289,7 @@ TEST_F(DamagedFile, KeysOfMoreThanAMebibyteAreNeitherReadNorWritten)
         commit(m_account);
         EXPECT_FALSE(hasPendingChanges(m_account));
         EXPECT_TRUE(same(attribute(openAccount("ada"), "c"), integer(1)));
-        writeFile(fileOf("ada"),
-                  accountFile("<key>a</key><integer>1</integer>",
-                              "<key>com.corvane.service.Mail</key><dict><key>port</key><integer>25</integer></dict>"));
-        m_account = openAccount("ada");
+        openGoodFile();
     }
 }
 
