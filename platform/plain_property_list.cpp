@@ -4,7 +4,6 @@
 #include "platform/plain_property_list.h"
 
 #include <algorithm>
-#include <array>
 #include <charconv>
 #include <cstring>
 #include <string>
@@ -48,10 +47,6 @@ Contents contentsOf(std::string_view xml) noexcept
     const bool haveOtherThanASCII = (all & 0x80) != 0;
     return {unfit != 0 || (haveOtherThanASCII && !isXMLText(xml)), references != 0, haveOtherThanASCII};
 }
-
-/// The references by name (XML 1.0, section 4.6).
-constexpr std::array<std::pair<std::string_view, char>, 5> kReferences{
-    {{"&amp;", '&'}, {"&lt;", '<'}, {"&gt;", '>'}, {"&quot;", '"'}, {"&apos;", '\''}}};
 
 constexpr bool isIdentifierCharacter(char character) noexcept
 {
@@ -175,7 +170,7 @@ private:
 
     bool decodeReference(std::string_view &encoded)
     {
-        for (const auto &[reference, character] : kReferences) {
+        for (const auto &[reference, character] : kNamedReferences) {
             if (encoded.starts_with(reference)) {
                 m_decoded += character;
                 encoded.remove_prefix(reference.size());

@@ -36,9 +36,8 @@ public:
         bool isPlain = true;
         dictionary->forEach([&](CSKavellTypeRef key, CSKavellTypeRef each) {
             const size_t before = m_xml.size();
-            isPlain = isPlain && element(depth + 1, "<key>", key, "</key>");
-            m_keyText += m_xml.size() - before;
-            isPlain = isPlain && m_keyText <= kMostKeyText && value(each, depth + 1);
+            isPlain = isPlain && element(depth + 1, "<key>", key, "</key>") &&
+                      (m_keyText += m_xml.size() - before) <= kMostKeyText && value(each, depth + 1);
         });
         return isPlain && line(depth, "</dict>");
     }

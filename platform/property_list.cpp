@@ -3,11 +3,14 @@
 
 #include "platform/property_list.h"
 
+#include <algorithm>
+#include <array>
 #include <clocale>
 #include <cmath>
 #include <cstdlib>
 #include <locale.h>
 #include <memory>
+#include <utility>
 
 #include <plist/plist.h>
 
@@ -285,13 +288,13 @@ constexpr int kRootDepth = 2;
 /// How long the piece of markup is that the rest of a checked document begins with; 0 when there is none left.
 size_t lengthOfMarkup(std::string_view xml) noexcept
 {
-    const std::string_view end = xml.starts_with("<!--")  ? "-->"
-                                 : xml.starts_with("<![") ? "]]>"
-                                 : xml.starts_with("<?")  ? "?>"
-                                                          : ">";
-    const size_t begin = end == ">" ? 1 : end == "-->" ? 4 : 2;
-    const size_t found = xml.find(end, begin);
-    return found == std::string_view::npos ? xml.size() : found + end.size();
+    constexpr std::array<std::pair<std::string_view, std::string_view>, 4> kForms{
+        {{"<!--", "-->"}, {"<![CDATA[", "]]>"}, {"<?", "?>"}, {"<", ">"}}};
+    for (const auto &[begin, end] : kForms) {
+        if (xml.starts_with(begin))
+            return xml.find(end, begin.size()) + end.size();
+    }
+    return 0;
 }
 
 /// How much of a text the parser shall see as one part.

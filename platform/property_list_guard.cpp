@@ -116,14 +116,14 @@ constexpr bool isXMLCharacter(uint32_t character) noexcept
            (character >= 0xE000 && character <= 0xFFFD) || (character >= 0x10000 && character <= 0x10FFFF);
 }
 
-/// Whether a text refers to a character that XML has, by its number; what the parser made of others could not be written
-/// again.
+/// Whether a text begins with a reference to a character that XML has, by its number; what the parser made of others could
+/// not be written again.
 bool isCharacterReference(std::string_view text) noexcept
 {
-    if (!text.starts_with('#'))
+    if (!text.starts_with("&#"))
         return false;
-    const bool isHexadecimal = text.starts_with("#x");
-    text.remove_prefix(isHexadecimal ? 2 : 1);
+    const bool isHexadecimal = text.starts_with("&#x");
+    text.remove_prefix(isHexadecimal ? 3 : 2);
     uint32_t character = 0;
     const auto [end, error] =
         std::from_chars(text.data(), text.data() + text.size(), character, isHexadecimal ? 16 : 10);
@@ -133,12 +133,11 @@ bool isCharacterReference(std::string_view text) noexcept
 /// Whether each ampersand begins a reference. For the parser, one goes on to the next semicolon, however far that is.
 bool referencesAreSound(std::string_view text) noexcept
 {
-    constexpr std::array<std::string_view, 5> kNames{"amp;", "lt;", "gt;", "quot;", "apos;"};
-    for (size_t next; (next = text.find('&')) != std::string_view::npos;) {
-        text.remove_prefix(next + 1);
-        const bool isName =
-            std::ranges::any_of(kNames, [text](std::string_view name) { return text.starts_with(name); });
-        if (!isName && !isCharacterReference(text))
+    for (size_t next; (next = text.find('&')) != std::string_view::npos; text.remove_prefix(1)) {
+        text.remove_prefix(next);
+        const bool isNamed = std::ranges::any_of(
+            kNamedReferences, [text](const auto &reference) { return text.starts_with(reference.first); });
+        if (!isNamed && !isCharacterReference(text))
             return false;
     }
     return true;

@@ -8,9 +8,11 @@
 #ifndef KAVELL_PLATFORM_PROPERTY_LIST_GUARD_H
 #define KAVELL_PLATFORM_PROPERTY_LIST_GUARD_H
 
+#include <array>
 #include <cstddef>
 #include <cstdint>
 #include <string_view>
+#include <utility>
 
 namespace kavell {
 
@@ -26,6 +28,10 @@ inline constexpr int kDeepestPropertyList = 256;
 /// these take two seconds at the worst.
 inline constexpr size_t kMostKeys = 10000;
 inline constexpr size_t kMostKeyText = size_t{1} << 20;
+
+/// The references by name (XML 1.0, section 4.6), and what they stand for.
+inline constexpr std::array<std::pair<std::string_view, char>, 5> kNamedReferences{
+    {{"&amp;", '&'}, {"&lt;", '<'}, {"&gt;", '>'}, {"&quot;", '"'}, {"&apos;", '\''}}};
 
 /// The first and the last second since 1970 that a property list keeps: 32-bit seconds around 2001-01-01.
 inline constexpr int64_t kPropertyListEpoch = 978307200;
